@@ -1,0 +1,22 @@
+# The project's warning set, as errors, for every target of its own.
+add_library(vantel_warnings INTERFACE)
+target_compile_options(
+  vantel_warnings
+  INTERFACE -Wall
+            -Wextra
+            -Wpedantic
+            -Wshadow
+            -Wconversion
+            -Wsign-conversion
+            -Wcast-align
+            -Wcast-qual
+            -Wformat=2
+            -Wundef
+            -Wmissing-declarations
+            $<$<COMPILE_LANGUAGE:CXX>:-Wold-style-cast>
+            $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor>
+            $<$<COMPILE_LANGUAGE:CXX>:-Woverloaded-virtual>
+            $<$<CXX_COMPILER_ID:GNU>:-Wduplicated-cond>
+            $<$<CXX_COMPILER_ID:GNU>:-Wlogical-op>
+            $<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wuseless-cast>
+            -Werror)

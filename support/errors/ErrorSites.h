@@ -1,0 +1,71 @@
+/// @file
+/// Every error that the plug-in raises, as data: code, constant, and the source unit and line that
+/// the host reads in the error text. The lines are part of the interface; they do not follow the
+/// code when it moves.
+#pragma once
+
+#include <cstdint>
+
+namespace zeerr {
+
+struct ErrorSite {
+    std::int32_t code;
+    const char* constant; ///< "error_constant"
+    const char* file;     ///< "file"
+    int line;             ///< "line"
+};
+
+/// "component" of every error.
+inline constexpr char component[] = "vantel_bc";
+
+namespace code {
+inline constexpr std::int32_t memoryFull = -52000;
+inline constexpr std::int32_t softwareFault = -52003;
+inline constexpr std::int32_t typeMismatch = -52004;
+inline constexpr std::int32_t invalidParameter = -52005;
+inline constexpr std::int32_t resourceNotFound = -52006;
+inline constexpr std::int32_t operationTimedOut = -52007;
+inline constexpr std::int32_t osFault = -52008;
+inline constexpr std::int32_t resourceNotInitialized = -52010;
+inline constexpr std::int32_t endOfData = -52012;
+inline constexpr std::int32_t bufferTooSmall = -52019;
+inline constexpr std::int32_t communicationsFault = -52024;
+inline constexpr std::int32_t resourceBusy = -52031;
+} // namespace code
+
+namespace site {
+
+// Conversion of foreign exceptions.
+inline constexpr ErrorSite badAlloc{code::memoryFull, "zeoskerr_memoryFull", "exception_errStatus",
+                                    62};
+inline constexpr ErrorSite standardException{
+    code::softwareFault, "zeoskerr_softwareFaultOSKInternalUseOnly", "exception_errStatus", 69};
+inline constexpr ErrorSite unknownException{
+    code::softwareFault, "zeoskerr_softwareFaultOSKInternalUseOnly", "exception_errStatus", 74};
+
+// JSON access. Several names share one number, because each tells a host of its own cause.
+inline constexpr ErrorSite jsonTypeMismatch{code::typeMismatch, "jsonErrorsTypeMismatch",
+                                            "cJSONUtils", 305};
+inline constexpr ErrorSite jsonNotAnArray{code::typeMismatch, "jsonErrorsNotAnArray", "cJSONUtils",
+                                          83};
+inline constexpr ErrorSite jsonInvalid{code::invalidParameter, "jsonErrorsInvalidJSON", "CppJson",
+                                       34};
+inline constexpr ErrorSite jsonOutOfBounds{code::resourceNotFound, "jsonErrorsArrayItemOutOfBounds",
+                                           "ArrayIterator", 102};
+
+// Protocol configuration.
+// The constant is the literal word "errCode": hosts tell the enriched error from the plain one by
+// it.
+inline constexpr ErrorSite parameterTypeMismatch{code::typeMismatch, "errCode",
+                                                 "jsonHelperFunctions", 50};
+inline constexpr ErrorSite keyNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
+                                       "tPtp4lTimeRef", 337};
+inline constexpr ErrorSite placeholderNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
+                                               "tPtp4lTimeRef", 345};
+inline constexpr ErrorSite configFileNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
+                                              "tPtp4lTimeRef", 387};
+inline constexpr ErrorSite interfaceNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
+                                             "tPtp4lTimeRef", 394};
+
+} // namespace site
+} // namespace zeerr
