@@ -67,5 +67,39 @@ inline constexpr ErrorSite configFileNotFound{code::invalidParameter, "zeoskerr_
 inline constexpr ErrorSite interfaceNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
                                              "tPtp4lTimeRef", 394};
 
+// Datagram buffer.
+inline constexpr ErrorSite bufferTooSmall{code::bufferTooSmall, "zeoskerr_bufferTooSmall",
+                                          "tMsgBuffer", 60};
+inline constexpr ErrorSite bufferReadPastEnd{code::endOfData, "zeoskerr_endOfData", "tMsgBuffer",
+                                             73};
+inline constexpr ErrorSite bufferWritePastEnd{code::endOfData, "zeoskerr_endOfData", "tMsgBuffer",
+                                              102};
+
+// Unix-domain transport.
+inline constexpr ErrorSite socketAlreadyOpen{code::resourceBusy, "zeoskerr_resourceBusy",
+                                             "tUdsMsgInterface", 40};
+// Memory-full and not an OS fault: hosts react to this pairing.
+inline constexpr ErrorSite socketFailed{code::memoryFull, "zeoskerr_memoryFull", "tUdsMsgInterface",
+                                        48};
+// Resource-not-found and not an OS fault: hosts react to this pairing.
+inline constexpr ErrorSite bindFailed{code::resourceNotFound, "zeoskerr_resourceNotFound",
+                                      "tUdsMsgInterface", 65};
+inline constexpr ErrorSite sendWhileClosed{
+    code::resourceNotInitialized, "zeoskerr_resourceNotInitialized", "tUdsMsgInterface", 96};
+inline constexpr ErrorSite sendFailed{code::communicationsFault, "zeoskerr_communicationsFault",
+                                      "tUdsMsgInterface", 109};
+inline constexpr ErrorSite receiveWhileClosed{
+    code::resourceNotInitialized, "zeoskerr_resourceNotInitialized", "tUdsMsgInterface", 138};
+inline constexpr ErrorSite receiveTimedOut{code::operationTimedOut, "zeoskerr_operationTimedOut",
+                                           "tUdsMsgInterface", 160};
+inline constexpr ErrorSite receiveFailed{code::communicationsFault, "zeoskerr_communicationsFault",
+                                         "tUdsMsgInterface", 176};
+
+// Management node.
+inline constexpr ErrorSite answerOfOtherLength{code::endOfData, "zeoskerr_endOfData",
+                                               "tPtpMgmtNode", 71};
+inline constexpr ErrorSite answerTooShort{code::endOfData, "zeoskerr_endOfData", "tPtpMgmtNode",
+                                          120};
+
 } // namespace site
 } // namespace zeerr

@@ -1,0 +1,125 @@
+#include "tUdsMsgInterface.h"
+
+#include <sys/select.h>
+#include <sys/time.h>
+#include <unistd.h>
+
+#include "errors/ErrnoText.h"
+#include "errors/Exception.h"
+
+namespace zekelVantel {
+namespace {
+
+constexpr std::uint32_t sendTimeoutMs = 2000;
+
+timeval toTimeval(std::uint32_t milliseconds) {
+    const std::uint64_t microseconds = std::uint64_t{milliseconds} * 1000;
+    timeval time{};
+    time.tv_sec = static_cast<decltype(time.tv_sec)>(microseconds / 1000000);
+    time.tv_usec = static_cast<decltype(time.tv_usec)>(microseconds % 1000000);
+    return time;
+}
+
+} // namespace
+
+tUdsMsgInterface::tUdsMsgInterface() : localAddress_("") {}
+
+tUdsMsgInterface::~tUdsMsgInterface() {
+    tUdsMsgInterface::close();
+}
+
+void tUdsMsgInterface::open(const std::string& localPath, zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    if (isOpen()) {
+        zeerr::setError(status, zeerr::site::socketAlreadyOpen);
+        return;
+    }
+    socket_ = tFileDescriptor(socket(AF_UNIX, SOCK_DGRAM, 0));
+    if (!isOpen()) {
+        const zeerr::ErrnoText error;
+        zeerr::setErrorWithInfo(status, zeerr::site::socketFailed,
+                                "Failed to open socket with errno %d (%s)", error.number(),
+                                error.text());
+        return;
+    }
+    // A stopped ptp4l does not read: without a limit, a send would then never return.
+    const timeval timeout = toTimeval(sendTimeoutMs);
+    setsockopt(socket_.get(), SOL_SOCKET, SO_SNDTIMEO, &timeout, sizeof(timeout));
+    localAddress_ = tUdsMsgAddress(localPath);
+    unlink(localAddress_.path().c_str());
+    if (bind(socket_.get(), localAddress_.sendAddress(), localAddress_.length()) != 0) {
+        const zeerr::ErrnoText error;
+        zeerr::setErrorWithInfo(status, zeerr::site::bindFailed,
+                                "Failed to bind socket with errno %d (%s)", error.number(),
+                                error.text());
+        socket_.close();
+    }
+}
+
+int tUdsMsgInterface::close() {
+    if (!isOpen()) {
+        return 0;
+    }
+    unlink(localAddress_.path().c_str());
+    return socket_.close();
+}
+
+void tUdsMsgInterface::send(const tMsgBuffer& buffer, const iMsgAddress& remoteAddress,
+                            zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    if (!isOpen()) {
+        zeerr::setError(status, zeerr::site::sendWhileClosed);
+        return;
+    }
+    const ssize_t sent = sendto(socket_.get(), buffer.data(), buffer.getLength(), 0,
+                                remoteAddress.sendAddress(), remoteAddress.length());
+    if (sent != static_cast<ssize_t>(buffer.getLength())) {
+        zeerr::setError(status, zeerr::site::sendFailed);
+    }
+}
+
+void tUdsMsgInterface::receive(tMsgBuffer& buffer, std::uint32_t timeoutMs, zeerr::Status& status) {
+    tUdsMsgAddress ignoredSource("");
+    receive(buffer, ignoredSource, timeoutMs, status);
+}
+
+void tUdsMsgInterface::receive(tMsgBuffer& buffer, iMsgAddress& sourceAddress,
+                               std::uint32_t timeoutMs, zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    if (!isOpen()) {
+        zeerr::setError(status, zeerr::site::receiveWhileClosed);
+        return;
+    }
+    if (!waitForDatagram(timeoutMs)) {
+        zeerr::setError(status, zeerr::site::receiveTimedOut);
+        return;
+    }
+    socklen_t sourceLength = sourceAddress.length();
+    const ssize_t received = recvfrom(socket_.get(), buffer.data(), tMsgBuffer::capacity(), 0,
+                                      sourceAddress.receiveAddress(), &sourceLength);
+    if (received < 0) {
+        zeerr::setError(status, zeerr::site::receiveFailed);
+        return;
+    }
+    buffer.setLength(static_cast<std::uint32_t>(received), status);
+}
+
+bool tUdsMsgInterface::waitForDatagram(std::uint32_t timeoutMs) const {
+    // The set has room for descriptors below FD_SETSIZE; a host may have more open than that.
+    if (socket_.get() >= FD_SETSIZE) {
+        return false;
+    }
+    fd_set readable;
+    FD_ZERO(&readable);
+    FD_SET(socket_.get(), &readable);
+    timeval timeout = toTimeval(timeoutMs);
+    return select(socket_.get() + 1, &readable, nullptr, nullptr, &timeout) >= 1;
+}
+
+} // namespace zekelVantel
