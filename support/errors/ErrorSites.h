@@ -101,5 +101,17 @@ inline constexpr ErrorSite answerOfOtherLength{code::endOfData, "zeoskerr_endOfD
 inline constexpr ErrorSite answerTooShort{code::endOfData, "zeoskerr_endOfData", "tPtpMgmtNode",
                                           120};
 
+// Metadata.
+inline constexpr ErrorSite portListsDiffer{code::communicationsFault,
+                                           "zeoskerr_communicationsFault", "tPtp4lMetaData", 99};
+
+// Shared FIFO.
+inline constexpr ErrorSite fifoCreationFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 35};
+inline constexpr ErrorSite fifoEmpty{code::endOfData, "zeoskerr_endOfData", "tSharedFifo", 82};
+inline constexpr ErrorSite fifoReadFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 86};
+inline constexpr ErrorSite fifoNotFound{code::resourceNotFound, "zeoskerr_resourceNotFound",
+                                        "tSharedFifo", 139};
+inline constexpr ErrorSite fifoOpenFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 143};
+
 } // namespace site
 } // namespace zeerr

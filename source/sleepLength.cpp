@@ -1,0 +1,22 @@
+#include "sleepLength.h"
+
+namespace zekelVantel {
+namespace {
+
+constexpr std::uint32_t aimAfterSync = 128000;
+constexpr std::uint32_t shortestSleep = 16000;
+
+} // namespace
+
+std::uint32_t sleepLength(std::uint64_t now, std::uint64_t ingressTime) {
+    const auto elapsed = static_cast<std::uint32_t>((now - ingressTime) / 1000);
+    // Unsigned on purpose: when the aim has passed, or the clocks disagree, there is no Sync to
+    // wait for and the long sleep is right.
+    const std::uint32_t rest = aimAfterSync - elapsed;
+    if (rest < shortestSleep) {
+        return shortestSleep;
+    }
+    return rest < longestSleep ? rest : longestSleep;
+}
+
+} // namespace zekelVantel

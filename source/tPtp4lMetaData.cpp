@@ -1,0 +1,202 @@
+#include "tPtp4lMetaData.h"
+
+#include <array>
+#include <initializer_list>
+#include <tuple>
+
+#include "errors/ErrorText.h"
+#include "errors/Exception.h"
+
+namespace zekelVantel {
+namespace {
+
+/// clockAccuracy, IEEE 1588-2008 table 6.
+const std::map<std::uint8_t, const char*> accuracyNames = {
+    {0x20, "WITHIN_25NS"},      {0x21, "WITHIN_100NS"}, {0x22, "WITHIN_250NS"},
+    {0x23, "WITHIN_1US"},       {0x24, "WITHIN_2.5US"}, {0x25, "WITHIN_10US"},
+    {0x26, "WITHIN_25US"},      {0x27, "WITHIN_100US"}, {0x28, "WITHIN_250US"},
+    {0x29, "WITHIN_1MS"},       {0x2A, "WITHIN_2.5MS"}, {0x2B, "WITHIN_10MS"},
+    {0x2C, "WITHIN_25MS"},      {0x2D, "WITHIN_100MS"}, {0x2E, "WITHIN_250MS"},
+    {0x2F, "WITHIN_1S"},        {0x30, "WITHIN_10S"},   {0x31, "GREATER_THAN_10S"},
+    {0xFE, "ACCURACY_UNKNOWN"},
+};
+
+/// portState, linuxptp `enum port_state`.
+constexpr std::array<const char*, 11> portStateNames = {
+    "",
+    "PTP_INITIALIZING",
+    "PTP_FAULTY",
+    "PTP_DISABLED",
+    "PTP_LISTENING",
+    "PTP_PRE_MASTER",
+    "PTP_MASTER",
+    "PTP_PASSIVE",
+    "PTP_UNCALIBRATED",
+    "PTP_SLAVE",
+    "PTP_GRAND_MASTER",
+};
+
+const char* accuracyName(std::uint8_t clockAccuracy) {
+    const auto found = accuracyNames.find(clockAccuracy);
+    return found == accuracyNames.end() ? "ACCURACY_UNKNOWN" : found->second;
+}
+
+const char* portStateName(std::uint8_t portState) {
+    return portState < portStateNames.size() ? portStateNames[portState] : "";
+}
+
+std::string octetText(const tPtpClockIdentity& identity,
+                      std::initializer_list<std::size_t> chosen) {
+    constexpr char digits[] = "0123456789ABCDEF";
+    std::string text;
+    text.reserve(chosen.size() * 3);
+    for (const std::size_t index : chosen) {
+        const std::uint8_t octet = identity.octets()[index];
+        if (!text.empty()) {
+            text += ':';
+        }
+        text += digits[octet >> 4];
+        text += digits[octet & 0x0f];
+    }
+    return text;
+}
+
+std::string clockIdText(const tPtpClockIdentity& identity) {
+    return octetText(identity, {0, 1, 2, 3, 4, 5, 6, 7});
+}
+
+// The middle octets are dropped whatever they are: hosts expect six, also from an identity that was
+// not made from a MAC address.
+std::string macText(const tPtpClockIdentity& identity) {
+    return octetText(identity, {0, 1, 2, 5, 6, 7});
+}
+
+/// A JSON object under construction.
+class tJsonObject {
+public:
+    void add(const char* key, const std::string& value) {
+        addRaw(key, '"' + zeerr::escaped(value) + '"');
+    }
+
+    void add(const char* key, std::int64_t value) { addRaw(key, std::to_string(value)); }
+
+    void addRaw(const std::string& key, const std::string& value) {
+        text_ += text_.empty() ? '{' : ',';
+        text_ += '"' + key + "\":" + value;
+    }
+
+    std::string finish() && {
+        text_ += '}';
+        return std::move(text_);
+    }
+
+private:
+    std::string text_;
+};
+
+std::string portJson(const tPortMetaData& port) {
+    tJsonObject json;
+    json.add("portState", port.portState);
+    json.addRaw("asCapable", port.asCapable);
+    // The sync interval stands before the announce interval: the order that hosts know.
+    json.add("logSyncInterval", port.logSyncInterval);
+    json.add("logAnnounceInterval", port.logAnnounceInterval);
+    json.add("logPdelayInterval", port.logPdelayInterval);
+    json.add("interface", port.interface);
+    json.add("neighborPropDelayThreshold", port.neighborPropDelayThreshold);
+    return std::move(json).finish();
+}
+
+} // namespace
+
+bool tPortMetaData::operator==(const tPortMetaData& other) const {
+    const auto fields = [](const tPortMetaData& port) {
+        return std::tie(port.portState, port.asCapable, port.logAnnounceInterval,
+                        port.logSyncInterval, port.logPdelayInterval,
+                        port.neighborPropDelayThreshold, port.interface);
+    };
+    return fields(*this) == fields(other);
+}
+
+tPtp4lMetaData::~tPtp4lMetaData() = default;
+
+void tPtp4lMetaData::takeGrandmaster(const tParentDataSet& parent) {
+    gmClockId_ = clockIdText(parent.grandmasterIdentity);
+    gmMacAddress_ = macText(parent.grandmasterIdentity);
+    gmClockClass_ = parent.grandmasterClockQuality.clockClass();
+    gmClockAccuracy_ = accuracyName(parent.grandmasterClockQuality.clockAccuracy());
+    gmOffsetLogVariance_ = parent.grandmasterClockQuality.offsetScaledLogVariance();
+    gmPriority1_ = parent.grandmasterPriority1;
+    gmPriority2_ = parent.grandmasterPriority2;
+}
+
+void tPtp4lMetaData::takeLocalClock(const tDefaultDataSet& local) {
+    localClockId_ = clockIdText(local.clockIdentity);
+    clockClass_ = local.clockQuality.clockClass();
+    clockAccuracy_ = accuracyName(local.clockQuality.clockAccuracy());
+    offsetLogVariance_ = local.clockQuality.offsetScaledLogVariance();
+    priority1_ = local.priority1;
+    priority2_ = local.priority2;
+    domainNumber_ = local.domainNumber;
+}
+
+void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
+                               const std::vector<tPortDataSetNp>& portDataSetsNp,
+                               const std::vector<tPortProperties>& portProperties,
+                               zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    ports_.clear();
+    if (portDataSets.size() != portDataSetsNp.size() ||
+        portDataSets.size() != portProperties.size()) {
+        zeerr::setError(status, zeerr::site::portListsDiffer);
+        return;
+    }
+    for (std::size_t i = 0; i < portDataSets.size(); ++i) {
+        const tPortDataSet& dataSet = portDataSets[i];
+        tPortMetaData& port = ports_["Port" + std::to_string(dataSet.portIdentity.portNumber())];
+        port.portState = portStateName(dataSet.portState);
+        port.asCapable = portDataSetsNp[i].asCapable != 0 ? "true" : "false";
+        port.logAnnounceInterval = dataSet.logAnnounceInterval;
+        port.logSyncInterval = dataSet.logSyncInterval;
+        port.logPdelayInterval = dataSet.logMinPdelayReqInterval;
+        port.neighborPropDelayThreshold = portDataSetsNp[i].neighborPropDelayThresh;
+        port.interface = portProperties[i].interface.text();
+    }
+}
+
+bool tPtp4lMetaData::operator==(const tPtp4lMetaData& other) const {
+    const auto fields = [](const tPtp4lMetaData& data) {
+        return std::tie(data.gmClockId_, data.gmMacAddress_, data.gmClockClass_,
+                        data.gmClockAccuracy_, data.gmOffsetLogVariance_, data.gmPriority1_,
+                        data.gmPriority2_, data.localClockId_, data.clockClass_,
+                        data.clockAccuracy_, data.offsetLogVariance_, data.priority1_,
+                        data.priority2_, data.domainNumber_, data.ports_);
+    };
+    return fields(*this) == fields(other);
+}
+
+std::string tPtp4lMetaData::toJson() const {
+    tJsonObject json;
+    json.add("gmClockId", gmClockId_);
+    json.add("gmMacAddress", gmMacAddress_);
+    json.add("localClockId", localClockId_);
+    json.add("clockClass", clockClass_);
+    json.add("clockAccuracy", clockAccuracy_);
+    json.add("offsetLogVariance", offsetLogVariance_);
+    json.add("priority1", priority1_);
+    json.add("priority2", priority2_);
+    json.add("domainNumber", domainNumber_);
+    json.add("gmClockClass", gmClockClass_);
+    json.add("gmClockAccuracy", gmClockAccuracy_);
+    json.add("gmOffsetLogVariance", gmOffsetLogVariance_);
+    json.add("gmPriority1", gmPriority1_);
+    json.add("gmPriority2", gmPriority2_);
+    for (const auto& [name, port] : ports_) {
+        json.addRaw(name, portJson(port));
+    }
+    return std::move(json).finish();
+}
+
+} // namespace zekelVantel

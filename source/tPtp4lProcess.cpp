@@ -1,0 +1,99 @@
+#include "tPtp4lProcess.h"
+
+#include <chrono>
+#include <csignal>
+#include <thread>
+
+#include <sys/wait.h>
+#include <syslog.h>
+#include <unistd.h>
+
+#include "errors/ErrnoText.h"
+#include "errors/Exception.h"
+
+namespace zekelVantel {
+namespace {
+
+constexpr int terminationPolls = 1000;
+constexpr std::chrono::milliseconds terminationPollInterval{10};
+
+/// Holds all signals back while it lives: after vfork, a handler of the host would run in the
+/// child, on the host's memory.
+class tSignalBlock {
+public:
+    tSignalBlock() {
+        sigset_t all;
+        sigfillset(&all);
+        pthread_sigmask(SIG_SETMASK, &all, &previous_);
+    }
+    ~tSignalBlock() { pthread_sigmask(SIG_SETMASK, &previous_, nullptr); }
+    tSignalBlock(const tSignalBlock&) = delete;
+    tSignalBlock& operator=(const tSignalBlock&) = delete;
+
+private:
+    sigset_t previous_{};
+};
+
+/// The child, on the memory of its parent: nothing here may return or allocate.
+[[noreturn]] void becomePtp4l(char* const* arguments) {
+    // A host may block or ignore SIGTERM; ptp4l must still be ended by it.
+    struct sigaction byDefault {};
+    byDefault.sa_handler = SIG_DFL;
+    sigaction(SIGTERM, &byDefault, nullptr);
+    sigaction(SIGCHLD, &byDefault, nullptr);
+    sigset_t none;
+    sigemptyset(&none);
+    sigprocmask(SIG_SETMASK, &none, nullptr);
+    // A failure is not logged here: the watchdog reports the death.
+    _exit(execve(arguments[0], arguments, nullptr));
+}
+
+} // namespace
+
+void tPtp4lProcess::spawn(const std::string& program, const std::string& configFile,
+                          const std::vector<std::string>& interfaces) {
+    std::vector<const char*> arguments = {program.c_str(), "-f", configFile.c_str()};
+    for (const std::string& interface : interfaces) {
+        arguments.insert(arguments.end(), {"-i", interface.c_str()});
+    }
+    arguments.push_back(nullptr);
+
+    const tSignalBlock block;
+    reaped_ = false;
+    pid_ = vfork();
+    if (pid_ == 0) {
+        becomePtp4l(const_cast<char* const*>(arguments.data()));
+    }
+    if (pid_ < 0) {
+        const zeerr::ErrnoText error;
+        syslog(LOG_ERR, "Unable to fork subprocess in vantel, got errno: %s", error.text());
+        zeerr::throwError({zeerr::code::osFault, "zeoskerr_osFault", "tPtp4lTimeRef", __LINE__});
+    }
+}
+
+bool tPtp4lProcess::hasDied() {
+    if (!reaped_) {
+        reaped_ = pid_ == -1 || waitpid(pid_, nullptr, WNOHANG) != 0;
+    }
+    return reaped_;
+}
+
+void tPtp4lProcess::terminate() {
+    if (pid_ == -1) {
+        return;
+    }
+    if (!hasDied()) {
+        kill(pid_, SIGTERM);
+    }
+    for (int poll = 0; poll < terminationPolls && !hasDied(); ++poll) {
+        std::this_thread::sleep_for(terminationPollInterval);
+    }
+    if (!hasDied()) {
+        syslog(LOG_ERR, "Killing ptp4l subprocess (pid %ld) using SIGKILL.x",
+               static_cast<long>(pid_));
+        kill(pid_, SIGKILL);
+    }
+    pid_ = -1;
+}
+
+} // namespace zekelVantel
