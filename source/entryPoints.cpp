@@ -62,6 +62,7 @@ VANTEL_EXPORT void zekeltr_initialize(void** sessionSlot, const char* protocolCo
     });
 }
 
+// [oddity slot-stays] The slot keeps its value: it is the host's, which also compares it.
 VANTEL_EXPORT void zekeltr_finalize(void** sessionSlot) {
     delete sessionIn(sessionSlot);
 }

@@ -2,7 +2,8 @@
 
 namespace zekelVantel {
 
-// priority1 ends at 254: with 255 (IEEE 802.1AS) the clock would not be grandmaster-capable.
+// [oddity priority1-range] priority1 ends at 254: with 255 (IEEE 802.1AS) the clock would not be
+// grandmaster-capable.
 const char parameterSchema[] = R"schema({
    "neighborPropDelayThreshold": {
       "dataType": "int",

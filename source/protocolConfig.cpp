@@ -62,6 +62,8 @@ std::string format(const std::string& value) {
 }
 
 /// The value of an item that may be null, which gives the kind's empty value.
+// [oddity no-schema-range] Ranges and defaults of the schema are the host's to apply: a host may
+// know a newer ptp4l than we do.
 template <typename Kind>
 Kind getParameter(const tConfigText& config, const char* key, const cJSON* item) {
     if (isNull(item)) {
@@ -101,7 +103,8 @@ void readInterfaces(tProtocolConfig& session, const tConfigText& config) {
     session.interfaces = toStringList(item);
 }
 
-// Without O_NONBLOCK, a FIFO that somebody put at this path would hold the host for ever.
+// [oddity unchecked-file] Nothing is reported: ptp4l names its file and the reason better than we
+// can. Without O_NONBLOCK, a FIFO that somebody put at this path would hold the host for ever.
 void writeFile(const std::string& path, const std::string& text) {
     const tFileDescriptor file(
         open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_NONBLOCK | O_CLOEXEC, 0666));
@@ -129,9 +132,12 @@ void readParameter(tProtocolConfig& session, const tConfigText& config, const st
     const std::string placeholder = "$" + key;
     const std::size_t position = templateText.find(placeholder);
     if (position == std::string::npos) {
+        // [oddity paramater] Spelt so since the first release; log filters in the field match it.
         syslog(LOG_ERR, "Invalid paramater %s in configuration file for vantel", key.c_str());
         zeerr::throwError(zeerr::site::placeholderNotFound);
     }
+    // [oddity placeholder-in-value] A value is searched like the template: integrators build one
+    // value from another with it.
     templateText.replace(position, placeholder.size(), value);
     if (key == "udsAddress") {
         session.udsAddress = value;

@@ -2,8 +2,8 @@
 
 namespace zekelVantel {
 
-// $neighborPropDelayThreshold stands beside ptp4l's shorter neighborPropDelayThresh: the
-// placeholder carries the protocol's name of the parameter.
+// [oddity placeholder-name] $neighborPropDelayThreshold stands beside ptp4l's shorter
+// neighborPropDelayThresh: the placeholder carries the protocol's name of the parameter.
 const char ptp4lConfigTemplate[] = R"template([global]
 #
 # Default Data Set

@@ -10,8 +10,8 @@ constexpr std::uint32_t shortestSleep = 16000;
 
 std::uint32_t sleepLength(std::uint64_t now, std::uint64_t ingressTime) {
     const auto elapsed = static_cast<std::uint32_t>((now - ingressTime) / 1000);
-    // Unsigned on purpose: when the aim has passed, or the clocks disagree, there is no Sync to
-    // wait for and the long sleep is right.
+    // [oddity unsigned-sleep] Unsigned on purpose: when the aim has passed, or the clocks disagree,
+    // there is no Sync to wait for and the long sleep is right.
     const std::uint32_t rest = aimAfterSync - elapsed;
     if (rest < shortestSleep) {
         return shortestSleep;

@@ -34,6 +34,8 @@ void tGetDataFromPtp4l::openOnDemand() {
         return;
     }
     zeerr::LocalStatus status;
+    // [oddity path-per-process] The path is the process's, not the session's: one boundary clock a
+    // host.
     interface_.open(localSocketPrefix + std::to_string(getpid()), status);
     zeerr::throwIfError(status);
 }
@@ -69,8 +71,9 @@ std::vector<typename Tlv::Data> tGetDataFromPtp4l::getFromPorts(std::uint16_t nu
     return answers;
 }
 
-// Older daemons answer a request whose messageLength leaves the pad octet out, newer ones drop it
-// without a word. So the first time-out makes us count it for good, which both kinds answer.
+// [oddity pad-octet] Older daemons answer a request whose messageLength leaves the pad octet out,
+// newer ones drop it without a word. So the first time-out makes us count it for good, which both
+// kinds answer.
 std::vector<tPortProperties> tGetDataFromPtp4l::getPortProperties(std::uint16_t numberPorts) {
     zeerr::LocalStatus status;
     std::vector<tPortProperties> answers;

@@ -47,7 +47,8 @@ void tMsgBuffer::writeU8(std::uint8_t value, zeerr::Status& status) {
         return;
     }
     if (writePos_ >= maximumLength) {
-        // End-of-data and not buffer-too-small: for those who read the code, both ends are one.
+        // [oddity write-past-end] End-of-data and not buffer-too-small: for those who read the
+        // code, both ends are one.
         zeerr::setError(status, zeerr::site::bufferWritePastEnd);
         return;
     }

@@ -65,8 +65,8 @@ std::string clockIdText(const tPtpClockIdentity& identity) {
     return octetText(identity, {0, 1, 2, 3, 4, 5, 6, 7});
 }
 
-// The middle octets are dropped whatever they are: hosts expect six, also from an identity that was
-// not made from a MAC address.
+// [oddity mac-of-clock-id] The middle octets are dropped whatever they are: hosts expect six, also
+// from an identity that was not made from a MAC address.
 std::string macText(const tPtpClockIdentity& identity) {
     return octetText(identity, {0, 1, 2, 5, 6, 7});
 }
@@ -98,7 +98,8 @@ std::string portJson(const tPortMetaData& port) {
     tJsonObject json;
     json.add("portState", port.portState);
     json.addRaw("asCapable", port.asCapable);
-    // The sync interval stands before the announce interval: the order that hosts know.
+    // [oddity port-member-order] The sync interval stands before the announce interval: the order
+    // that hosts know.
     json.add("logSyncInterval", port.logSyncInterval);
     json.add("logAnnounceInterval", port.logAnnounceInterval);
     json.add("logPdelayInterval", port.logPdelayInterval);

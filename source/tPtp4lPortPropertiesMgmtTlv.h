@@ -24,8 +24,8 @@ struct tPortProperties {
 
 /// PORT_PROPERTIES_NP: 19 octets and the interface name. Its data is read all or nothing.
 ///
-/// A TLV has an even length: behind a name of even length stands a pad octet. It is written and
-/// counted in the lengthField, but not read and not part of size().
+/// [oddity pad-not-read] A TLV has an even length: behind a name of even length stands a pad octet.
+/// It is written and counted in the lengthField, but not read and not part of size().
 class tPtp4lPortPropertiesMgmtTlv : public tPtpMgmtTlv {
 public:
     using Data = tPortProperties;

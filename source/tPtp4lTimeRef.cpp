@@ -44,6 +44,7 @@ tPtp4lTimeRef::tPtp4lTimeRef(void** context, const std::string& protocolConfig)
         config_.udsAddress, static_cast<std::uint8_t>(config_.transportSpecific & 0xff));
 }
 
+// [oddity finalize-waits] A session that was never stopped is waited for: its threads use it.
 tPtp4lTimeRef::~tPtp4lTimeRef() {
     waitForThreads();
 }
@@ -81,6 +82,8 @@ void tPtp4lTimeRef::runWatchdog() {
     while (!stopRequested_) {
         try {
             std::this_thread::sleep_for(std::chrono::seconds(1));
+            // [oddity gone-is-dead] A child that waitpid does not know counts as dead, too: it
+            // cannot be told apart from one that was reaped, and retries rely on it.
             if (ptp4l_.hasDied()) {
                 host_.setQuality(tQuality::unusable, processHasDied);
                 return;
@@ -128,10 +131,11 @@ void tPtp4lTimeRef::runPass(tHistory& history) {
     history.timeStatus = timeStatus;
 }
 
-// The history stays as it is: after a recovery the host is told only what differs from the last
-// good poll, so it keeps "unusable" until the next change of role.
+// [oddity silent-recovery] The history stays as it is: after a recovery the host is told only what
+// differs from the last good poll, so it keeps "unusable" until the next change of role.
 void tPtp4lTimeRef::reportUnreachable(std::int32_t code) const {
-    // LOG_INFO: while ptp4l starts or is being replaced this is expected.
+    // [oddity unreachable-is-info] LOG_INFO: while ptp4l starts or is being replaced this is
+    // expected.
     syslog(
         LOG_INFO,
         "Unable to communicate with PTP sub process while attempting to retrieve data,got error: "
@@ -162,6 +166,8 @@ void tPtp4lTimeRef::drainEpochOffsets(tHistory& history) {
             break;
         }
     }
+    // [oddity no-fifo-no-pairs] A missing FIFO is an error: without the epoch, a pair would be
+    // wrong.
     if (status.code != zeerr::code::endOfData) {
         zeerr::throwIfError(status);
     }

@@ -27,6 +27,7 @@ void tPtpMgmtNode::prepareRequest(tPtpMgmtMsg& message, std::uint16_t messageLen
 void tPtpMgmtNode::sendRequest(iMsgInterface& interface, const iMsgAddress& remoteAddress,
                                tMsgBuffer& buffer, const tPtpMgmtMsg& message,
                                const tPtpMgmtTlv& tlv, zeerr::Status& status) {
+    // [oddity full-request] The request carries the whole data field: one object asks and receives.
     buffer.clear();
     message.serialize(buffer, status);
     tlv.serialize(buffer, status);
@@ -49,8 +50,8 @@ void tPtpMgmtNode::getSingle(iMsgInterface& interface, const iMsgAddress& remote
     const std::uint32_t expected = message.size() + tlv.size();
     request(interface, remoteAddress, buffer, message, tlv, tPadOctet::uncounted, status);
     receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);
-    // The length alone decides: ptp4l answers one request at a time, and what is late is dropped
-    // so.
+    // [oddity length-only] The length alone decides: ptp4l answers one request at a time, and what
+    // is late is dropped so.
     if (!zeerr::isError(status) && buffer.getLength() != expected) {
         zeerr::setError(status, zeerr::site::answerOfOtherLength);
     }
@@ -69,7 +70,8 @@ bool tPtpMgmtNode::receiveAtLeast(std::uint32_t expected, iMsgInterface& interfa
                                   tMsgBuffer& buffer, tPtpMgmtMsg& message, tPtpMgmtTlv& tlv,
                                   zeerr::Status& status) {
     receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);
-    // A minimum, unlike the single answer's equality: names make the answers of ports longer.
+    // [oddity minimum-length] A minimum, unlike the single answer's equality: names make the
+    // answers of ports longer.
     if (!zeerr::isError(status) && buffer.getLength() < expected) {
         zeerr::setError(status, zeerr::site::answerTooShort);
     }

@@ -46,7 +46,8 @@ void tSharedFifo::open(zeerr::Status& status) {
     if (zeerr::isError(status)) {
         return;
     }
-    // The owner opens for writing too: its end then never reads as if the other had gone.
+    // [oddity fifo-ends] The owner opens for writing too: its end then never reads as if the other
+    // had gone.
     descriptor_ = tFileDescriptor(::open(path_.c_str(), (owner_ ? O_RDWR : O_RDONLY) | O_NONBLOCK));
     if (!isOpen()) {
         const zeerr::ErrnoText error;

@@ -47,6 +47,8 @@ void tUdsMsgInterface::open(const std::string& localPath, zeerr::Status& status)
     // A stopped ptp4l does not read: without a limit, a send would then never return.
     const timeval timeout = toTimeval(sendTimeoutMs);
     setsockopt(socket_.get(), SOL_SOCKET, SO_SNDTIMEO, &timeout, sizeof(timeout));
+    // [oddity stale-path] Whatever stands at the path goes: it is ours by name, left by a former
+    // run.
     localAddress_ = tUdsMsgAddress(localPath);
     unlink(localAddress_.path().c_str());
     if (bind(socket_.get(), localAddress_.sendAddress(), localAddress_.length()) != 0) {
@@ -119,6 +121,8 @@ bool tUdsMsgInterface::waitForDatagram(std::uint32_t timeoutMs) const {
     FD_ZERO(&readable);
     FD_SET(socket_.get(), &readable);
     timeval timeout = toTimeval(timeoutMs);
+    // [oddity signal-is-timeout] An interrupted wait is not resumed: the next poll asks again
+    // anyway.
     return select(socket_.get() + 1, &readable, nullptr, nullptr, &timeout) >= 1;
 }
 

@@ -43,7 +43,9 @@ inline constexpr ErrorSite standardException{
 inline constexpr ErrorSite unknownException{
     code::softwareFault, "zeoskerr_softwareFaultOSKInternalUseOnly", "exception_errStatus", 74};
 
-// JSON access. Several names share one number, because each tells a host of its own cause.
+// JSON access.
+// [oddity shared-codes] Several names share one number: hosts act on the number, people read the
+// name.
 inline constexpr ErrorSite jsonTypeMismatch{code::typeMismatch, "jsonErrorsTypeMismatch",
                                             "cJSONUtils", 305};
 inline constexpr ErrorSite jsonNotAnArray{code::typeMismatch, "jsonErrorsNotAnArray", "cJSONUtils",
@@ -54,8 +56,8 @@ inline constexpr ErrorSite jsonOutOfBounds{code::resourceNotFound, "jsonErrorsAr
                                            "ArrayIterator", 102};
 
 // Protocol configuration.
-// The constant is the literal word "errCode": hosts tell the enriched error from the plain one by
-// it.
+// [oddity err-code] The constant is the literal word "errCode": hosts tell the enriched error from
+// the plain one by it.
 inline constexpr ErrorSite parameterTypeMismatch{code::typeMismatch, "errCode",
                                                  "jsonHelperFunctions", 50};
 inline constexpr ErrorSite keyNotFound{code::invalidParameter, "zeoskerr_invalidParameter",
@@ -78,10 +80,10 @@ inline constexpr ErrorSite bufferWritePastEnd{code::endOfData, "zeoskerr_endOfDa
 // Unix-domain transport.
 inline constexpr ErrorSite socketAlreadyOpen{code::resourceBusy, "zeoskerr_resourceBusy",
                                              "tUdsMsgInterface", 40};
-// Memory-full and not an OS fault: hosts react to this pairing.
+// [oddity socket-is-memory] Memory-full and not an OS fault: hosts react to this pairing.
 inline constexpr ErrorSite socketFailed{code::memoryFull, "zeoskerr_memoryFull", "tUdsMsgInterface",
                                         48};
-// Resource-not-found and not an OS fault: hosts react to this pairing.
+// [oddity bind-is-not-found] Resource-not-found and not an OS fault: hosts react to this pairing.
 inline constexpr ErrorSite bindFailed{code::resourceNotFound, "zeoskerr_resourceNotFound",
                                       "tUdsMsgInterface", 65};
 inline constexpr ErrorSite sendWhileClosed{

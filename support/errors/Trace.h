@@ -26,8 +26,8 @@ public:
 
     void append(std::string_view text);
 
-    /// Appends the text right-aligned in a field. A longer text keeps its end: of a path, the file
-    /// name is worth more than the folders.
+    /// Appends the text right-aligned in a field. [oddity field-tail] A longer text keeps its end:
+    /// of a path, the file name is worth more than the folders.
     void appendField(std::string_view text, std::size_t width);
 
     [[gnu::format(printf, 2, 0)]] void appendFormatted(const char* format, va_list arguments);
