@@ -17,7 +17,7 @@
 
 namespace {
 
-constexpr char name[ZEKELTR_NAME_SIZE] = "IEEE 1588-2008 BC";
+constexpr char protocolName[ZEKELTR_NAME_SIZE] = "IEEE 1588-2008 BC";
 
 /// Runs a body unless the status already holds an error, and puts what it throws into the status.
 template <typename Body>
@@ -80,8 +80,8 @@ VANTEL_EXPORT void zekeltr_stop(void** sessionSlot) {
     }
 }
 
-VANTEL_EXPORT void zekeltr_getName(char* buffer) {
-    std::memcpy(buffer, name, sizeof(name));
+VANTEL_EXPORT void zekeltr_getName(char* name) {
+    std::memcpy(name, protocolName, sizeof(protocolName));
 }
 
 VANTEL_EXPORT void zekeltr_getParameterValidationData(zekeltr_Reallocate reallocate, char** buffer,

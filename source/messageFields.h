@@ -31,7 +31,7 @@ public:
 
     /// One octet that carries two fields.
     void nibbles(std::uint8_t& high, std::uint8_t& low) const {
-        std::uint8_t octet = static_cast<std::uint8_t>(high << 4 | low);
+        auto octet = static_cast<std::uint8_t>(high << 4 | low);
         field(octet);
         high = static_cast<std::uint8_t>(octet >> 4);
         low = octet & 0x0f;

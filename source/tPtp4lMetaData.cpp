@@ -10,15 +10,12 @@
 namespace zekelVantel {
 namespace {
 
-/// clockAccuracy, IEEE 1588-2008 table 6.
-const std::map<std::uint8_t, const char*> accuracyNames = {
-    {0x20, "WITHIN_25NS"},      {0x21, "WITHIN_100NS"}, {0x22, "WITHIN_250NS"},
-    {0x23, "WITHIN_1US"},       {0x24, "WITHIN_2.5US"}, {0x25, "WITHIN_10US"},
-    {0x26, "WITHIN_25US"},      {0x27, "WITHIN_100US"}, {0x28, "WITHIN_250US"},
-    {0x29, "WITHIN_1MS"},       {0x2A, "WITHIN_2.5MS"}, {0x2B, "WITHIN_10MS"},
-    {0x2C, "WITHIN_25MS"},      {0x2D, "WITHIN_100MS"}, {0x2E, "WITHIN_250MS"},
-    {0x2F, "WITHIN_1S"},        {0x30, "WITHIN_10S"},   {0x31, "GREATER_THAN_10S"},
-    {0xFE, "ACCURACY_UNKNOWN"},
+/// clockAccuracy from 0x20 on, IEEE 1588-2008 table 6.
+constexpr std::uint8_t firstAccuracy = 0x20;
+constexpr std::array<const char*, 18> accuracyNames = {
+    "WITHIN_25NS", "WITHIN_100NS", "WITHIN_250NS", "WITHIN_1US", "WITHIN_2.5US", "WITHIN_10US",
+    "WITHIN_25US", "WITHIN_100US", "WITHIN_250US", "WITHIN_1MS", "WITHIN_2.5MS", "WITHIN_10MS",
+    "WITHIN_25MS", "WITHIN_100MS", "WITHIN_250MS", "WITHIN_1S",  "WITHIN_10S",   "GREATER_THAN_10S",
 };
 
 /// portState, linuxptp `enum port_state`.
@@ -37,8 +34,8 @@ constexpr std::array<const char*, 11> portStateNames = {
 };
 
 const char* accuracyName(std::uint8_t clockAccuracy) {
-    const auto found = accuracyNames.find(clockAccuracy);
-    return found == accuracyNames.end() ? "ACCURACY_UNKNOWN" : found->second;
+    const unsigned index = unsigned{clockAccuracy} - firstAccuracy;
+    return index < accuracyNames.size() ? accuracyNames[index] : "ACCURACY_UNKNOWN";
 }
 
 const char* portStateName(std::uint8_t portState) {

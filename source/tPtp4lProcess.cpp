@@ -43,7 +43,7 @@ private:
     sigaction(SIGCHLD, &byDefault, nullptr);
     sigset_t none;
     sigemptyset(&none);
-    sigprocmask(SIG_SETMASK, &none, nullptr);
+    pthread_sigmask(SIG_SETMASK, &none, nullptr);
     // [oddity silent-exec] A failure is not logged here: the watchdog reports the death.
     _exit(execve(arguments[0], arguments, nullptr));
 }

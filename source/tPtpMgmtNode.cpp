@@ -6,7 +6,9 @@ namespace zekelVantel {
 namespace {
 
 /// All ports of all clocks, IEEE 1588-2008 15.3.1.
-const tPtpPortIdentity allPorts(tPtpClockIdentity(0xFFFFFFFFFFFFFFFF), 0xFFFF);
+tPtpPortIdentity allPorts() {
+    return {tPtpClockIdentity(0xFFFFFFFFFFFFFFFF), 0xFFFF};
+}
 
 } // namespace
 
@@ -20,7 +22,7 @@ void tPtpMgmtNode::prepareRequest(tPtpMgmtMsg& message, std::uint16_t messageLen
     message.setMessageLength(messageLength);
     message.setSourcePortIdentity(portIdentity_);
     message.setSequenceId(sequenceId_++);
-    message.setTargetPortIdentity(allPorts);
+    message.setTargetPortIdentity(allPorts());
     message.setActionField(tPtpMgmtMsg::actionGet);
 }
 

@@ -61,7 +61,7 @@ void tUdsMsgInterface::open(const std::string& localPath, zeerr::Status& status)
 }
 
 int tUdsMsgInterface::close() {
-    if (!isOpen()) {
+    if (!socket_.isOpen()) { // and not isOpen(): the destructor comes here
         return 0;
     }
     unlink(localAddress_.path().c_str());

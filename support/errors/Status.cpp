@@ -23,8 +23,11 @@ void resetText(Status& status) {
     if (status.json == nullptr || status.capacity == 0) {
         return;
     }
-    const bool fits = status.capacity >= sizeof(emptyObject);
-    std::strcpy(status.json, fits ? emptyObject : "");
+    if (status.capacity >= sizeof(emptyObject)) {
+        std::memcpy(status.json, emptyObject, sizeof(emptyObject));
+    } else {
+        status.json[0] = '\0';
+    }
 }
 
 /// The operation may be the host's: whatever it throws is a refusal.

@@ -54,7 +54,7 @@ std::uint32_t textLength(const Status& status);
 /// A fresh status on the stack, with the plug-in's own resize operation, that releases its text.
 class LocalStatus : public Status {
 public:
-    LocalStatus() : Status{0, 0, &defaultResize, nullptr} {}
+    LocalStatus() : Status(Status{0, 0, &defaultResize, nullptr}) {}
     ~LocalStatus() { release(*this); }
     LocalStatus(const LocalStatus&) = delete;
     LocalStatus& operator=(const LocalStatus&) = delete;

@@ -5,7 +5,7 @@
 
 namespace zekelVantel {
 
-ArrayIterator::ArrayIterator(const cJSON* array) : current_(nullptr) {
+ArrayIterator::ArrayIterator(const cJSON* array) {
     if (!isArray(array)) {
         zeerr::throwError(zeerr::site::jsonNotAnArray);
     }

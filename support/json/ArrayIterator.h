@@ -20,7 +20,7 @@ public:
     ArrayIterator& operator++();
 
 private:
-    const cJSON* current_;
+    const cJSON* current_ = nullptr;
 };
 
 } // namespace zekelVantel

@@ -1,0 +1,52 @@
+#!/usr/bin/env bash
+# Installs what is missing, builds one preset (default: release) and runs all its tests.
+# The last line is the count of ctest, which counts skipped tests as passed: they are listed above.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+preset=${1:-release}
+case $preset in
+  armhf) groups=(armhf) ;;
+  clang | fuzz) groups=(tests checks) ;;
+  *) groups=(tests) ;;
+esac
+jobs=$(nproc)
+log=build/$preset/ctest.log
+
+# Lists the tests that did not run, each with its reason: the text behind GoogleTest's
+# "file:line: Skipped", else the last line that the test printed.
+list_skipped() {
+  awk '
+    FNR == 1 { ++file }
+    file == 1 && sub(/^[0-9]+\/[0-9]+ Testing: /, "") { name = $0; text = announced = done = "" }
+    file == 1 && /^<end of output>$/ { reason[name] = text; inside = 0 }
+    inside && !done && /./ { text = $0 }
+    inside && announced { done = 1 }
+    inside && /: Skipped$/ { announced = 1 }
+    file == 1 && /^Output:$/ { inside = 1; getline }
+
+    file == 2 && /^$/ { listed = 0 }
+    listed {
+      sub(/^[ \t]*[0-9]+ - /, "")
+      sub(/ \([A-Za-z ]+\)$/, "")
+      print "skipped: " $0 ": " (reason[$0] ? reason[$0] : "disabled")
+    }
+    file == 2 && /^The following tests did not run:$/ { listed = 1 }
+  ' "build/$preset/Testing/Temporary/LastTest.log" "$log"
+}
+
+scripts/setup.sh "${groups[@]}"
+cmake --preset "$preset"
+cmake --build --preset "$preset" -j "$jobs"
+
+status=0
+ctest --preset "$preset" -j "$jobs" | tee "$log" || status=$?
+if ! count=$(grep '% tests passed' "$log"); then
+  echo "check: no test ran; see the messages above" >&2
+  exit 1
+fi
+
+echo
+list_skipped
+echo "$count"
+exit "$status"

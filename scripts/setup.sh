@@ -1,0 +1,92 @@
+#!/usr/bin/env bash
+# Installs the Debian packages of the named groups (default: tests), if any is missing.
+#   tests   build the library and its tools, run the tests
+#   demo    build, and run the plug-in with the real daemon
+#   checks  clang, format and tidy checks, as CI runs them
+#   armhf   what tests needs, for 32-bit ARM under emulation
+set -euo pipefail
+
+build=(cmake ninja-build g++ pkg-config libcjson-dev libboost-dev nlohmann-json3-dev libcli11-dev
+  libfmt-dev)
+daemon=(linuxptp iproute2 util-linux procps)
+tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales)
+checks=(clang libclang-rt-14-dev clang-format-14 clang-tidy-14 shellcheck)
+armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
+  libcjson-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
+  libbenchmark-dev:armhf)
+
+packages=()
+for group in "${@:-tests}"; do
+  case $group in
+    tests) packages+=("${tests[@]}") ;;
+    demo) packages+=("${build[@]}" "${daemon[@]}") ;;
+    checks) packages+=("${checks[@]}") ;;
+    armhf) packages+=("${armhf[@]}") ;;
+    *)
+      echo "usage: $0 [tests|demo|checks|armhf]..." >&2
+      exit 2
+      ;;
+  esac
+done
+
+if ! command -v dpkg-query >/dev/null; then
+  echo "setup: this is no Debian system. Install the equivalents of: ${packages[*]}" >&2
+  exit 1
+fi
+
+# Sets missing to those packages that are not installed.
+find_missing() {
+  local native installed package
+  native=$(dpkg --print-architecture)
+  installed=$(dpkg-query -W -f '${db:Status-Status} ${Package}:${Architecture}\n' |
+    sed -n "s/:$native\$//; s/:all\$//; s/^installed //p")
+  missing=()
+  for package in "${packages[@]}"; do
+    if ! grep -qxF "$package" <<<"$installed"; then
+      missing+=("$package")
+    fi
+  done
+}
+
+find_missing
+if [[ ${#missing[@]} -eq 0 ]]; then
+  exit 0
+fi
+
+foreign=no
+if [[ "${missing[*]}" == *:armhf* ]] && ! dpkg --print-foreign-architectures | grep -qx armhf; then
+  foreign=yes
+fi
+
+as_root=(env)
+if [[ $(id -u) -ne 0 ]]; then
+  if ! sudo -n true 2>/dev/null; then
+    echo "setup: packages are missing and this user may not install them. As root, run:" >&2
+    if [[ $foreign == yes ]]; then
+      echo "  dpkg --add-architecture armhf" >&2
+    fi
+    echo "  apt-get update" >&2
+    echo "  apt-get install ${missing[*]}" >&2
+    exit 1
+  fi
+  as_root=(sudo -n env)
+fi
+
+apt() {
+  "${as_root[@]}" DEBIAN_FRONTEND=noninteractive apt-get -qq -o Acquire::Retries=3 \
+    -o DPkg::Lock::Timeout=300 "$@" </dev/null
+}
+
+echo "setup: installing ${missing[*]}"
+if [[ $foreign == yes ]]; then
+  "${as_root[@]}" dpkg --add-architecture armhf
+fi
+apt update || echo "setup: warning: some package lists could not be fetched" >&2
+apt install -y --no-install-recommends "${missing[@]}" || true
+
+find_missing
+if [[ ${#missing[@]} -gt 0 ]]; then
+  echo "setup: still missing: ${missing[*]}. Look at apt-get's messages above, then run" \
+    "'apt-get install ${missing[*]}'" >&2
+  exit 1
+fi
