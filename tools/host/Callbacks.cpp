@@ -1,0 +1,96 @@
+#include "Callbacks.h"
+
+#include <chrono>
+
+#include <fmt/format.h>
+
+#include "HostStatus.h"
+
+namespace vantelhost {
+
+namespace {
+
+std::atomic<Callbacks*> activeCallbacks{nullptr};
+
+std::uint64_t realtimeNanoseconds() {
+    using Clock = std::chrono::system_clock; // CLOCK_REALTIME
+    const auto now = Clock::now().time_since_epoch();
+    return static_cast<std::uint64_t>(
+        std::chrono::duration_cast<std::chrono::nanoseconds>(now).count());
+}
+
+} // namespace
+
+Callbacks::Callbacks(Journal& journal, bool refuseWhileStopping)
+    : journal_(journal), refuseWhileStopping_(refuseWhileStopping) {
+    activeCallbacks = this;
+}
+
+Callbacks::~Callbacks() {
+    activeCallbacks = nullptr;
+}
+
+Callbacks* Callbacks::active() {
+    return activeCallbacks;
+}
+
+void Callbacks::getTime(void** context, std::uint64_t* time, zeerr_Status* status) {
+    if (accepts(context, time != nullptr, "zekel_getTime", status)) {
+        *time = realtimeNanoseconds();
+        journal_.timeRequest();
+    }
+}
+
+void Callbacks::adjustTime(void** context, std::uint64_t referenceTime, std::uint64_t localTime,
+                           zeerr_Status* status) {
+    if (accepts(context, true, "zekel_adjustTime", status)) {
+        journal_.pair(referenceTime, localTime);
+    }
+}
+
+void Callbacks::setTRQuality(void** context, const double* quality, const char* reason,
+                             zeerr_Status* status) {
+    const bool hasData = quality != nullptr && reason != nullptr;
+    if (accepts(context, hasData, "zekel_setTRQuality", status)) {
+        journal_.quality(quality, reason);
+    }
+}
+
+void Callbacks::updateMetaData(void** context, const char* metadataJson, zeerr_Status* status) {
+    if (accepts(context, metadataJson != nullptr, "zekel_updateMetaData", status)) {
+        journal_.metadata(metadataJson);
+    }
+}
+
+bool Callbacks::accepts(void** context, bool hasData, const char* function, zeerr_Status* status) {
+    if (status == nullptr) {
+        journal_.error(failureEvent(function, "called without a status"));
+        return false;
+    }
+    if (status->code < 0) {
+        return false;
+    }
+    if (context != &slot_) {
+        refuse(function, fmt::format("called with the unknown context {}", fmt::ptr(context)),
+               *status);
+        return false;
+    }
+    if (!hasData) {
+        refuse(function, "called with a null pointer", *status);
+        return false;
+    }
+    if (refuseWhileStopping_ && stopping_) {
+        journal_.refusal();
+        fail(*status, ZEKEL_HOST_IS_STOPPING, "ZEKEL_HOST_IS_STOPPING", "the host is stopping");
+        return false;
+    }
+    return true;
+}
+
+void Callbacks::refuse(const char* function, const std::string& problem, zeerr_Status& status) {
+    journal_.error(failureEvent(function, problem));
+    fail(status, invalidParameter, "zeoskerr_invalidParameter",
+         fmt::format("{}: {}", function, problem));
+}
+
+} // namespace vantelhost

@@ -1,0 +1,165 @@
+#include "Events.h"
+
+#include <array>
+#include <cstring>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+#include <vantel_bc/quality.h>
+
+#include "Text.h"
+
+namespace vantelhost {
+
+namespace {
+
+using Quality = std::array<double, ZEKEL_QUALITY_LENGTH>;
+
+const char* kindOf(const double* quality) {
+    constexpr Quality usable = ZEKEL_QUALITY_USABLE;
+    constexpr Quality unusable = ZEKEL_QUALITY_UNUSABLE;
+    if (std::memcmp(quality, usable.data(), sizeof(usable)) == 0) {
+        return "usable";
+    }
+    return std::memcmp(quality, unusable.data(), sizeof(unusable)) == 0 ? "unusable" : "other";
+}
+
+/// A member as people read it: strings bare, a missing member as "?".
+std::string member(const Json& object, const char* key) {
+    const auto found = object.find(key);
+    if (found == object.end()) {
+        return "?";
+    }
+    return found->is_string() ? found->get<std::string>() : shown(*found);
+}
+
+std::string portSummary(const std::string& name, const Json& port) {
+    return fmt::format("; {} {} on {}", name, member(port, "portState"), member(port, "interface"));
+}
+
+/// The text of a status, as people read it.
+std::string statusSummary(const Json& object) {
+    std::string summary = fmt::format("{} at {}:{}", member(object, "error_constant"),
+                                      member(object, "file"), member(object, "line"));
+    for (const char* key : {"additionalInfo", "std_exception_what", "zesync_debug"}) {
+        if (object.contains(key)) {
+            summary += ": " + member(object, key);
+        }
+    }
+    return summary;
+}
+
+std::string offsetSummary(const Tally& tally) {
+    if (tally.offsets.count == 0) {
+        return "no offsets";
+    }
+    return fmt::format("offset min {} mean {:.1f} max {} rms {:.1f} ns", tally.offsets.smallest,
+                       tally.offsets.mean(), tally.offsets.largest, tally.offsets.rms());
+}
+
+Json offsetMembers(const OffsetStatistics& offsets) {
+    if (offsets.count == 0) {
+        return nullptr;
+    }
+    return {{"min", offsets.smallest},
+            {"mean", offsets.mean()},
+            {"max", offsets.largest},
+            {"rms", offsets.rms()}};
+}
+
+} // namespace
+
+Event loadedEvent(const std::string& library, const std::string& name, std::uint32_t apiVersion) {
+    return {"loaded",
+            fmt::format("\"{}\", API version {}, {}", name, apiVersion, library),
+            {{"name", name}, {"apiVersion", apiVersion}, {"library", library}}};
+}
+
+Event initialisedEvent(const Json& configuration) {
+    return {"initialised", "interface " + toAscii(configuration["interface"]),
+            Json{{"configuration", configuration}}};
+}
+
+Event startedEvent() {
+    return {"started", "", Json::object()};
+}
+
+Event epochOffsetEvent(std::int64_t nanoseconds) {
+    return {"epoch-offset", fmt::format("{} ns written", nanoseconds),
+            Json{{"offset", nanoseconds}}};
+}
+
+Event qualityEvent(const double* quality, const std::string& reason) {
+    const Quality values{quality[0], quality[1], quality[2]};
+    const char* kind = kindOf(quality);
+    return {"quality",
+            fmt::format("{} [{}] {}", kind, fmt::join(values, ", "), reason),
+            {{"quality", kind}, {"values", values}, {"reason", reason}}};
+}
+
+Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset) {
+    return {"pair",
+            fmt::format("reference {} local {} offset {} ns", reference, local, offset),
+            {{"reference", reference}, {"local", local}, {"offset", offset}}};
+}
+
+Event metadataEvent(const Json& metadata) {
+    std::string text =
+        fmt::format("grandmaster {} class {} {}", member(metadata, "gmClockId"),
+                    member(metadata, "gmClockClass"), member(metadata, "gmClockAccuracy"));
+    std::string ports;
+    for (const auto& [key, value] : metadata.items()) {
+        if (value.is_object()) {
+            ports += portSummary(key, value);
+        }
+    }
+    text += ports.empty() ? "; no ports" : ports;
+    return {"metadata", std::move(text), {{"valid", true}, {"metadata", metadata}}};
+}
+
+Event invalidMetadataEvent(const std::string& text) {
+    return {"metadata", "invalid, not a JSON object: " + text, {{"valid", false}, {"text", text}}};
+}
+
+Event statusEvent(const std::string& operation, std::int32_t code, const std::string& json) {
+    const Json object = Json::parse(json, nullptr, false);
+    const bool valid = object.is_object();
+    std::string text = fmt::format("{}: code {}", operation, code);
+    if (!json.empty()) {
+        text += ", " + (valid ? statusSummary(object) : json);
+    }
+    return {code < 0 ? "error" : "warning",
+            std::move(text),
+            {{"operation", operation}, {"code", code}, {"status", valid ? object : Json(json)}}};
+}
+
+Event failureEvent(const std::string& operation, const std::string& problem) {
+    return {"error", operation + ": " + problem, {{"operation", operation}, {"problem", problem}}};
+}
+
+Event stoppingEvent(const std::string& cause) {
+    return {"stopping", cause, Json{{"cause", cause}}};
+}
+
+Event stoppedEvent() {
+    return {"stopped", "", Json::object()};
+}
+
+Event summaryEvent(double seconds, const Tally& tally) {
+    std::string text =
+        fmt::format("{:.3f} s, {} pairs, {} quality changes, {} metadata updates, {} errors, {}",
+                    seconds, tally.offsets.count, tally.qualityChanges, tally.metadataUpdates,
+                    tally.errors, offsetSummary(tally));
+    return {"summary",
+            std::move(text),
+            {{"duration", seconds},
+             {"pairs", tally.offsets.count},
+             {"qualityChanges", tally.qualityChanges},
+             {"metadataUpdates", tally.metadataUpdates},
+             {"timeRequests", tally.timeRequests},
+             {"refused", tally.refused},
+             {"errors", tally.errors},
+             {"offset", offsetMembers(tally.offsets)}}};
+}
+
+} // namespace vantelhost

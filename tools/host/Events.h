@@ -1,0 +1,45 @@
+/// @file
+/// What the host tells about a run: each event as a line for people and as members for programs.
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "Json.h"
+#include "Tally.h"
+
+namespace vantelhost {
+
+struct Event {
+    std::string name;
+    std::string text; ///< the details, for people; may hold any characters
+    Json members;     ///< the details, for programs: an object
+};
+
+Event loadedEvent(const std::string& library, const std::string& name, std::uint32_t apiVersion);
+Event initialisedEvent(const Json& configuration);
+Event startedEvent();
+Event epochOffsetEvent(std::int64_t nanoseconds);
+
+/// @param quality ZEKEL_QUALITY_LENGTH doubles
+Event qualityEvent(const double* quality, const std::string& reason);
+
+/// Times in nanoseconds modulo 2^64. The offset is local - reference.
+Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset);
+
+Event metadataEvent(const Json& metadata);
+Event invalidMetadataEvent(const std::string& text);
+
+/// A status of the plug-in that is not clean: the event "error", or "warning" for a code above 0.
+/// @param operation what the host had asked for
+/// @param json      the status's text
+Event statusEvent(const std::string& operation, std::int32_t code, const std::string& json);
+
+/// Something that went wrong in the host, or a call of the plug-in that breaks the rules.
+Event failureEvent(const std::string& operation, const std::string& problem);
+
+Event stoppingEvent(const std::string& cause);
+Event stoppedEvent();
+Event summaryEvent(double seconds, const Tally& tally);
+
+} // namespace vantelhost

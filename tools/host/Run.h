@@ -1,0 +1,58 @@
+/// @file
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "Callbacks.h"
+#include "CommandLine.h"
+#include "EpochFifo.h"
+#include "HostStatus.h"
+#include "Journal.h"
+#include "Json.h"
+#include "PlugIn.h"
+#include "Schema.h"
+#include "StopSignal.h"
+
+namespace vantelhost {
+
+/// One session of the plug-in, from loading to unloading. Single use.
+class Run {
+public:
+    /// @param configText the content of the configuration file, if there is one
+    /// @param stopSignal made before any thread
+    Run(const RunOptions& options, std::optional<std::string> configText,
+        const StopSignal& stopSignal);
+
+    /// Throws UsageError.
+    /// @return the exit status.
+    int execute();
+
+private:
+    /// The steps of a run. A step that says false ends the run; the journal then knows why.
+    void session();
+    bool readSchema(const PlugIn& plugIn, Schema& schema);
+    Json completedSettings(const Schema& schema) const;
+    bool initialise(const PlugIn& plugIn, const Json& settings);
+    void startAndStop(const PlugIn& plugIn);
+
+    /// Start and wait do not throw: the plug-in's child must be stopped whatever happens.
+    /// @return why the run ends.
+    std::string startAndWait(const PlugIn& plugIn);
+    std::string waitForEnd();
+    void openFifo();
+    void writeOffset(std::int64_t nanoseconds);
+
+    /// Shows a status that is not clean.
+    /// @return whether the operation succeeded.
+    bool succeeded(const char* operation, const HostStatus& status);
+
+    const RunOptions& options_;
+    std::optional<std::string> configText_;
+    const StopSignal& stopSignal_;
+    Journal journal_;
+    Callbacks callbacks_;
+    std::optional<EpochFifo> fifo_;
+};
+
+} // namespace vantelhost

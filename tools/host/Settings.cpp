@@ -1,0 +1,153 @@
+#include "Settings.h"
+
+#include <algorithm>
+#include <set>
+
+#include <fmt/format.h>
+#include <strings.h>
+
+#include "Text.h"
+
+namespace vantelhost {
+
+namespace {
+
+constexpr char interfaceKey[] = "interface";
+
+/// Gathers the settings of all sources, then sorts them out by the schema.
+class Completion {
+public:
+    Completion(const Schema& schema, const UserSettings& user) : schema_(schema), user_(user) {}
+
+    Settings run() {
+        if (user_.text && !readText(*user_.text)) {
+            return std::move(settings_);
+        }
+        for (const auto& assignment : user_.assignments) {
+            assign(assignment);
+        }
+        takeInterfaces();
+        takeParameters();
+        checkInterfaces();
+        takeTheRest();
+        return std::move(settings_);
+    }
+
+private:
+    void error(const std::string& key, const std::string& problem) {
+        if (bad_.insert(key).second) {
+            settings_.errors.push_back(fmt::format("{}: {}", key, problem));
+        }
+    }
+
+    /// @return false when the text has no settings to go on with.
+    bool readText(const std::string& text) {
+        std::set<std::string> seen;
+        const auto watchKeys = [&](int depth, Json::parse_event_t event, Json& key) {
+            if (event == Json::parse_event_t::key && depth == 1 &&
+                !seen.insert(key.get<std::string>()).second) {
+                error(key.get<std::string>(), "is given twice");
+            }
+            return true;
+        };
+        try {
+            given_ = Json::parse(text, watchKeys);
+        } catch (const Json::exception& failure) {
+            error("configuration", failure.what());
+            return false;
+        }
+        if (!given_.is_object()) {
+            error("configuration", "must be a JSON object, not " + shown(given_));
+        }
+        return given_.is_object();
+    }
+
+    void assign(const std::string& assignment) {
+        const auto equals = assignment.find('=');
+        const std::string key = assignment.substr(0, equals);
+        if (equals == std::string::npos || key.empty()) {
+            settings_.errors.push_back(fmt::format("{}: must be key=value", assignment));
+            return;
+        }
+        const std::string value = assignment.substr(equals + 1);
+        if (!isUtf8(assignment)) {
+            error(toAscii(key), "is not UTF-8 text");
+        } else if (key == interfaceKey) {
+            error(key, "is set with --interface");
+        } else if (const auto* parameter = find(schema_, key)) {
+            given_[key] = valueFromText(*parameter, value);
+        } else {
+            const Json parsed = Json::parse(value, nullptr, false);
+            given_[key] = parsed.is_discarded() ? Json(value) : parsed;
+        }
+    }
+
+    void takeInterfaces() {
+        if (!std::all_of(user_.interfaces.begin(), user_.interfaces.end(), isUtf8)) {
+            error(interfaceKey, "is not UTF-8 text");
+        } else if (!user_.interfaces.empty()) {
+            given_[interfaceKey] = user_.interfaces;
+        }
+    }
+
+    void takeParameters() {
+        for (const auto& parameter : schema_) {
+            const auto found = given_.find(parameter.key);
+            const Json& value = found == given_.end() ? parameter.defaultValue : *found;
+            const std::string problem = complaint(parameter, value);
+            if (!problem.empty()) {
+                error(parameter.key, problem);
+            }
+            settings_.values[parameter.key] = value;
+        }
+    }
+
+    void checkInterfaces() {
+        const bool given = given_.contains(interfaceKey);
+        const Json value = given ? given_[interfaceKey] : Json::array();
+        const auto isName = [](const Json& each) { return each.is_string() && each != ""; };
+        if (!given && user_.interfacesRequired) {
+            error(interfaceKey, "is missing: name at least one, as with --interface eth0");
+        } else if (!value.is_array() || !std::all_of(value.begin(), value.end(), isName)) {
+            error(interfaceKey, "must be an array of names, not " + shown(value));
+        } else if (value.empty() && user_.interfacesRequired) {
+            error(interfaceKey, "must name at least one interface");
+        }
+        settings_.values[interfaceKey] = value;
+    }
+
+    /// Unknown keys come last: a plug-in that is less strict about names finds the known key first.
+    void takeTheRest() {
+        for (const auto& [key, value] : given_.items()) {
+            if (settings_.values.contains(key)) {
+                continue;
+            }
+            settings_.warnings.push_back(
+                fmt::format("{}: is unknown to the plug-in{}, passed on as it is", key, hint(key)));
+            settings_.values[key] = value;
+        }
+    }
+
+    std::string hint(const std::string& key) const {
+        for (const auto& parameter : schema_) {
+            if (strcasecmp(parameter.key.c_str(), key.c_str()) == 0) {
+                return fmt::format(" (\"{}\" is meant?)", parameter.key);
+            }
+        }
+        return {};
+    }
+
+    const Schema& schema_;
+    const UserSettings& user_;
+    Json given_ = Json::object();
+    std::set<std::string> bad_;
+    Settings settings_;
+};
+
+} // namespace
+
+Settings completeSettings(const Schema& schema, const UserSettings& user) {
+    return Completion(schema, user).run();
+}
+
+} // namespace vantelhost

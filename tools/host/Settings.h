@@ -1,0 +1,31 @@
+/// @file
+/// From the user's settings to the protocol configuration that the plug-in gets.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "Json.h"
+#include "Schema.h"
+
+namespace vantelhost {
+
+/// What the user gave. Later sources win: text, assignments, interfaces.
+struct UserSettings {
+    std::optional<std::string> text;      ///< a JSON object
+    std::vector<std::string> assignments; ///< each "key=value"
+    std::vector<std::string> interfaces;
+    bool interfacesRequired = true;
+};
+
+struct Settings {
+    Json values = Json::object();      ///< complete: the schema's keys, "interface", then the rest
+    std::vector<std::string> errors;   ///< one line per bad key, beginning with the key
+    std::vector<std::string> warnings; ///< the same for keys that the schema does not know
+};
+
+/// Completes and checks the settings. The values are of use only when there are no errors.
+Settings completeSettings(const Schema& schema, const UserSettings& user);
+
+} // namespace vantelhost
