@@ -79,7 +79,8 @@ char* writeQuoted(char* out, std::string_view text) {
 
 /// Whether nothing but blanks stands between the position and the brace that opens its object.
 bool isFirstMember(const char* position) {
-    while (std::strchr(" \t\r\n", position[-1]) != nullptr) {
+    // What cJSON skips as a blank, which is more than JSON's four.
+    while (static_cast<unsigned char>(position[-1]) <= ' ') {
         --position;
     }
     return position[-1] == '{' || position[-1] == '[';
@@ -114,6 +115,10 @@ char* Resizer::insert(char* position, std::size_t octets) {
         if (!grow()) {
             return nullptr;
         }
+    }
+    // A resize operation of the host may have lost the text.
+    if (offset > length || textLength(status_) != length) {
+        return nullptr;
     }
     position = status_.json + offset;
     std::memmove(position + octets, position, length - offset + 1);

@@ -1,0 +1,109 @@
+#include <cstdlib>
+#include <cstring>
+#include <stdexcept>
+
+#include <gmock/gmock.h>
+
+#include "PluginFixture.h"
+
+namespace {
+
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+std::vector<std::pair<char*, std::size_t>> requests;
+
+char* countingReallocate(char* buffer, std::size_t size) {
+    requests.emplace_back(buffer, size);
+    return static_cast<char*>(std::realloc(buffer, size));
+}
+
+char* refusingReallocate(char* buffer, std::size_t size) {
+    requests.emplace_back(buffer, size);
+    std::free(buffer);
+    return nullptr;
+}
+
+char* throwingReallocate(char*, std::size_t) {
+    throw std::runtime_error("no");
+}
+
+class ParameterDataTest : public PluginFixture {
+protected:
+    ParameterDataTest() { requests.clear(); }
+    ~ParameterDataTest() override { std::free(buffer); }
+
+    void fetch(zeerr_Status& status, zekeltr_Reallocate reallocate = &countingReallocate) {
+        EXPECT_NO_THROW(plugin().getParameterValidationData(reallocate, &buffer, &status));
+    }
+
+    char* buffer = nullptr;
+};
+
+TEST_F(ParameterDataTest, AsksOnceForExactlyTheTextAndItsZero) {
+    HostStatus status;
+    fetch(status);
+    ASSERT_EQ(requests.size(), 1U);
+    EXPECT_EQ(requests[0].first, nullptr);
+    EXPECT_EQ(requests[0].second, 1882U);
+    ASSERT_NE(buffer, nullptr);
+    EXPECT_EQ(std::strlen(buffer), 1881U);
+    EXPECT_THAT(buffer, StartsWith("{\n   \"neighborPropDelayThreshold\": {\n"
+                                   "      \"dataType\": \"int\",\n"
+                                   "      \"range\": [0, 4294967295],\n"));
+    EXPECT_THAT(buffer, EndsWith("   \"ptpDstMac\": {\n"
+                                 "      \"dataType\": \"string\",\n"
+                                 "      \"default\": \"01:00:5e:00:01:81\",\n"
+                                 "      \"hidden\": false\n   }\n}\n"));
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(status.json, nullptr);
+}
+
+TEST_F(ParameterDataTest, ExistingBufferIsHandedToTheReallocator) {
+    char* const former = static_cast<char*>(std::malloc(1));
+    buffer = former;
+    HostStatus status;
+    fetch(status);
+    ASSERT_EQ(requests.size(), 1U);
+    EXPECT_EQ(requests[0].first, former);
+    EXPECT_EQ(std::strlen(buffer), 1881U);
+}
+
+TEST_F(ParameterDataTest, RefusalLeavesANullBufferAndMemoryFull) {
+    buffer = static_cast<char*>(std::malloc(1));
+    HostStatus status;
+    fetch(status, &refusingReallocate);
+    ASSERT_EQ(requests.size(), 1U);
+    EXPECT_EQ(requests[0].second, 1882U);
+    EXPECT_EQ(buffer, nullptr);
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_THAT(status.text(), StartsWith(R"({"error_constant":"zeoskerr_memoryFull","file":")"));
+    EXPECT_THAT(status.text(), EndsWith(R"("component":"vantel_bc"})"));
+}
+
+TEST_F(ParameterDataTest, NegativeStatusOnEntryMeansNothingHappens) {
+    HostStatus status(-1, R"({"mine":1})");
+    fetch(status);
+    EXPECT_TRUE(requests.empty());
+    EXPECT_EQ(buffer, nullptr);
+    EXPECT_EQ(status.code, -1);
+    EXPECT_EQ(status.text(), R"({"mine":1})");
+}
+
+TEST_F(ParameterDataTest, WarningOnEntryIsNoObstacle) {
+    HostStatus status(3);
+    fetch(status);
+    ASSERT_NE(buffer, nullptr);
+    EXPECT_EQ(status.code, 3);
+}
+
+TEST_F(ParameterDataTest, ExceptionOfTheReallocatorBecomesASoftwareFault) {
+    HostStatus status;
+    fetch(status, &throwingReallocate);
+    EXPECT_EQ(status.code, -52003);
+    EXPECT_THAT(status.text(), HasSubstr(R"("std_exception_what":"no"})"));
+    EXPECT_EQ(buffer, nullptr);
+}
+
+} // namespace
