@@ -28,6 +28,7 @@ done
 build() { # folder, cmake options...
   local folder=$1
   shift
+  echo "demo: building in $folder"
   cmake -S . -B "$folder" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo -DBUILD_TESTING=OFF "$@" \
     >/dev/null
   cmake --build "$folder" -- -j "$(nproc)" --quiet
@@ -53,12 +54,12 @@ on_real_daemon() {
 }
 
 on_simulated_daemon() {
-  build build/demo-simulated -DVANTEL_PTP4L_PATH="$PWD/build/demo-simulated/tools/simptp4l/simptp4l" \
-    -DVANTEL_EPOCH_FIFO_PATH="/tmp/vantel_bc.demo.fifo" \
-    -DVANTEL_LOCAL_SOCKET_PREFIX="/tmp/vantel_bc.demo."
+  local place=build/demo-simulated
+  build $place -DVANTEL_PTP4L_PATH=$place/tools/simptp4l/simptp4l \
+    -DVANTEL_EPOCH_FIFO_PATH=$place/epochOffset -DVANTEL_LOCAL_SOCKET_PREFIX=$place/ptp4lTimeRef.
   printf '%s\n' "gm-after 4" "offset 250" "drift-ppb 20" >"$folder/run/ptp4l.conf.sim"
-  build/demo-simulated/tools/host/vantel-host "${host[@]}" --interface sim0 \
-    --fifo /tmp/vantel_bc.demo.fifo --library build/demo-simulated/source/libvantel_bc.so.19
+  $place/tools/host/vantel-host "${host[@]}" --interface sim0 --fifo $place/epochOffset \
+    --library $place/source/libvantel_bc.so.19
 }
 
 if ! scripts/setup.sh demo; then

@@ -1,0 +1,90 @@
+#include "Clock.h"
+
+#include "Random.h"
+
+#include <algorithm>
+#include <cmath>
+#include <ctime>
+
+namespace simptp4l {
+namespace {
+
+std::int64_t intervalOf(const Script& script, int logSyncInterval) {
+    if (script.syncInterval) {
+        return *script.syncInterval;
+    }
+    const int bounded = std::clamp(logSyncInterval, -20, 20);
+    return static_cast<std::int64_t>(std::ldexp(1e9, bounded));
+}
+
+std::int64_t readClock(clockid_t clock) {
+    timespec time{};
+    clock_gettime(clock, &time);
+    return std::int64_t{time.tv_sec} * 1000000000 + time.tv_nsec;
+}
+
+} // namespace
+
+Clock::Clock(const Script& script, int logSyncInterval, std::int64_t start)
+    : script_(script),
+      start_(start),
+      interval_(intervalOf(script, logSyncInterval)),
+      present_(script.gmPresent),
+      since_(script.gmAfter) {}
+
+ClockReading Clock::read(std::int64_t now) {
+    const bool present = present_ && now >= since_;
+    if (present) {
+        const std::int64_t index = (now - since_) / interval_;
+        const std::int64_t arrival = since_ + index * interval_;
+        if (arrival != last_) {
+            measure(arrival, static_cast<std::uint64_t>(index));
+        }
+        seen_ = true;
+    }
+    return {present, seen_, offset_, ingress_};
+}
+
+void Clock::setGrandmaster(bool present, std::int64_t now) {
+    if (present == present_ && (!present || now >= since_)) {
+        return;
+    }
+    // A last reading, so that a grandmaster nobody asked about still counts as seen.
+    read(now);
+    present_ = present;
+    since_ = now;
+    last_ = -1;
+    ingress_ = 0;
+}
+
+void Clock::step(std::int64_t difference) {
+    stepped_ += difference;
+    offset_ += difference;
+    if (ingress_ != 0) {
+        ingress_ += difference;
+    }
+}
+
+void Clock::measure(std::int64_t arrival, std::uint64_t index) {
+    last_ = arrival;
+    const double drift = script_.driftPpb * (static_cast<double>(arrival) / 1e9);
+    offset_ = script_.offset + std::llround(drift) + jitter(index) + stepped_;
+    if (script_.clock == ClockSource::fixed) {
+        ingress_ = script_.fixedTime + stepped_;
+        return;
+    }
+    ingress_ = start_ + arrival + stepped_;
+    if (script_.clock == ClockSource::realtime) {
+        ingress_ += readClock(CLOCK_REALTIME) - readClock(CLOCK_MONOTONIC);
+    }
+}
+
+std::int64_t Clock::jitter(std::uint64_t index) const {
+    if (script_.jitter == 0) {
+        return 0;
+    }
+    const std::uint64_t span = 2 * static_cast<std::uint64_t>(script_.jitter) + 1;
+    return static_cast<std::int64_t>(Random(script_.seed + index).next() % span) - script_.jitter;
+}
+
+} // namespace simptp4l
