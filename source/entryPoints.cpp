@@ -53,8 +53,7 @@ VANTEL_EXPORT void zekeltr_initialize(void** sessionSlot, const char* protocolCo
                                       zeerr::Status* status) {
     guarded(*status, [&] {
         if (protocolConfig == nullptr) {
-            zeerr::throwError({zeerr::code::invalidParameter, "zeoskerr_invalidParameter",
-                               "tPtp4lTimeRef", __LINE__});
+            zeerr::throwError(zeerr::site::configurationIsNull);
         }
         *sessionSlot =
             std::make_unique<zekelVantel::tPtp4lTimeRef>(sessionSlot, std::string(protocolConfig))
@@ -89,8 +88,7 @@ VANTEL_EXPORT void zekeltr_getParameterValidationData(zekeltr_Reallocate realloc
     guarded(*status, [&] {
         *buffer = reallocate(*buffer, zekelVantel::parameterSchemaSize);
         if (*buffer == nullptr) {
-            zeerr::throwError(
-                {zeerr::code::memoryFull, "zeoskerr_memoryFull", "tPtp4lTimeRef", __LINE__});
+            zeerr::throwError(zeerr::site::schemaNotAllocated);
         }
         std::memcpy(*buffer, zekelVantel::parameterSchema, zekelVantel::parameterSchemaSize);
     });

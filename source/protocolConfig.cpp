@@ -1,5 +1,7 @@
 #include "protocolConfig.h"
 
+#include <cerrno>
+
 #include <fcntl.h>
 #include <syslog.h>
 #include <unistd.h>
@@ -8,6 +10,7 @@
 #include "errors/Exception.h"
 #include "ptp4lConfigTemplate.h"
 #include "tFileDescriptor.h"
+#include "json/ClassicLocale.h"
 #include "json/cJSONUtils.h"
 
 namespace zekelVantel {
@@ -111,10 +114,11 @@ void writeFile(const std::string& path, const std::string& text) {
     std::size_t written = 0;
     while (written < text.size()) {
         const ssize_t count = write(file.get(), text.data() + written, text.size() - written);
-        if (count <= 0) {
+        if (count > 0) {
+            written += static_cast<std::size_t>(count);
+        } else if (errno != EINTR) {
             return;
         }
-        written += static_cast<std::size_t>(count);
     }
 }
 
@@ -132,7 +136,7 @@ void readParameter(tProtocolConfig& session, const tConfigText& config, const st
     const std::string placeholder = "$" + key;
     const std::size_t position = templateText.find(placeholder);
     if (position == std::string::npos) {
-        // [oddity paramater] Spelt so since the first release; log filters in the field match it.
+        // [oddity paramater] Spelt so on purpose: those who watch the log search for this text.
         syslog(LOG_ERR, "Invalid paramater %s in configuration file for vantel", key.c_str());
         zeerr::throwError(zeerr::site::placeholderNotFound);
     }
@@ -156,6 +160,7 @@ template void readParameter<bool>(tProtocolConfig&, const tConfigText&, const st
                                   std::string&);
 
 void readProtocolConfig(tProtocolConfig& session, const std::string& configText) {
+    const ClassicLocale locale;
     const tConfigText config(configText);
     std::string text = ptp4lConfigTemplate;
     readParameter<std::uint32_t>(session, config, "neighborPropDelayThreshold", text);

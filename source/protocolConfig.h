@@ -26,7 +26,7 @@ struct tConfigText {
     /// @throws zeerr::Exception -52005 "jsonErrorsInvalidJSON".
     explicit tConfigText(const std::string& json) : text(json), document(json) {}
 
-    const std::string& text;
+    std::string text;
     CppJson document;
 };
 

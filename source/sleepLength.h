@@ -5,7 +5,7 @@
 
 namespace zekelVantel {
 
-/// The first sleep, and the one after a failure, in microseconds.
+/// The first sleep, and the one after a pass that ended in an error, in microseconds.
 inline constexpr std::uint32_t longestSleep = 125000;
 
 /// How long to sleep before the next poll, so that it comes 128 ms after the last Sync, soon after

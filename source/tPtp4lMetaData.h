@@ -34,7 +34,9 @@ class tPtp4lMetaData {
 public:
     tPtp4lMetaData() = default;
     tPtp4lMetaData(const tPtp4lMetaData&) = default;
+    tPtp4lMetaData(tPtp4lMetaData&&) = default;
     tPtp4lMetaData& operator=(const tPtp4lMetaData&) = default;
+    tPtp4lMetaData& operator=(tPtp4lMetaData&&) = default;
     virtual ~tPtp4lMetaData();
 
     void takeGrandmaster(const tParentDataSet& parent);

@@ -34,13 +34,23 @@ private:
     sigset_t previous_{};
 };
 
+/// Whether execve would reset it; until then, a handler would run on the host's memory.
+bool isHandled(int signal) {
+    struct sigaction action {};
+    return sigaction(signal, nullptr, &action) == 0 && action.sa_handler != SIG_DFL &&
+           action.sa_handler != SIG_IGN;
+}
+
 /// The child, on the memory of its parent: nothing here may return or allocate.
 [[noreturn]] void becomePtp4l(char* const* arguments) {
-    // A host may block or ignore SIGTERM; ptp4l must still be ended by it.
     struct sigaction byDefault {};
     byDefault.sa_handler = SIG_DFL;
-    sigaction(SIGTERM, &byDefault, nullptr);
-    sigaction(SIGCHLD, &byDefault, nullptr);
+    for (int signal = 1; signal < NSIG; ++signal) {
+        // A host may block or ignore SIGTERM; ptp4l must still be ended by it.
+        if (signal == SIGTERM || signal == SIGCHLD || isHandled(signal)) {
+            sigaction(signal, &byDefault, nullptr);
+        }
+    }
     sigset_t none;
     sigemptyset(&none);
     pthread_sigmask(SIG_SETMASK, &none, nullptr);
@@ -67,7 +77,7 @@ void tPtp4lProcess::spawn(const std::string& program, const std::string& configF
     if (pid_ < 0) {
         const zeerr::ErrnoText error;
         syslog(LOG_ERR, "Unable to fork subprocess in vantel, got errno: %s", error.text());
-        zeerr::throwError({zeerr::code::osFault, "zeoskerr_osFault", "tPtp4lTimeRef", __LINE__});
+        zeerr::throwError(zeerr::site::forkFailed);
     }
 }
 
@@ -89,7 +99,7 @@ void tPtp4lProcess::terminate() {
         std::this_thread::sleep_for(terminationPollInterval);
     }
     if (!hasDied()) {
-        // [oddity sigkill-text] The "x" belongs to the text that log filters in the field match.
+        // [oddity sigkill-text] The "x" belongs to the text: those who watch the log search for it.
         syslog(LOG_ERR, "Killing ptp4l subprocess (pid %ld) using SIGKILL.x",
                static_cast<long>(pid_));
         // [oddity unreaped-kill] Not waited for: what SIGKILL cannot end at once must not hold the

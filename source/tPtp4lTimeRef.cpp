@@ -2,6 +2,7 @@
 
 #include <chrono>
 #include <thread>
+#include <utility>
 
 #include <syslog.h>
 
@@ -52,6 +53,7 @@ tPtp4lTimeRef::~tPtp4lTimeRef() {
 void tPtp4lTimeRef::start() {
     updateMetaData(tPtp4lMetaData());
     host_.setQuality(tQuality::unusable, waitingForStatus);
+    history_ = tHistory();
     ptp4l_.spawn(ptp4lPath_, config_.configFile, config_.interfaces);
     try {
         worker_ = std::async(std::launch::async, &tPtp4lTimeRef::runWorker, this);
@@ -96,46 +98,44 @@ void tPtp4lTimeRef::runWatchdog() {
 }
 
 void tPtp4lTimeRef::runWorker() {
-    tHistory history;
     while (!stopRequested_) {
         try {
-            runPass(history);
+            runPass();
         } catch (...) {
             logHostFailure("Unable to call into KEL in vantel, got error: ");
-            history.sleep = longestSleep;
+            history_.sleep = longestSleep;
         }
     }
 }
 
-void tPtp4lTimeRef::runPass(tHistory& history) {
+void tPtp4lTimeRef::runPass() {
+    std::this_thread::sleep_for(std::chrono::microseconds(history_.sleep));
     tTimeStatus timeStatus;
     tPtp4lMetaData metaData;
-    std::this_thread::sleep_for(std::chrono::microseconds(history.sleep));
     if (const std::int32_t code = poller_->fetch(timeStatus, metaData); code != 0) {
         reportUnreachable(code);
         return;
     }
-    history.sleep =
+    history_.sleep =
         sleepLength(host_.getTime(), static_cast<std::uint64_t>(timeStatus.ingressTime));
-    if (timeStatus.gmPresent != history.timeStatus.gmPresent) {
+    if (timeStatus.gmPresent != history_.timeStatus.gmPresent) {
         host_.setQuality(timeStatus.gmPresent == 0 ? tQuality::unusable : tQuality::usable,
                          roleHasChanged);
     }
-    if (timeStatus.ingressTime != history.timeStatus.ingressTime) {
-        reportTimePair(timeStatus, history);
+    if (timeStatus.ingressTime != history_.timeStatus.ingressTime) {
+        reportTimePair(timeStatus);
     }
-    if (metaData != history.metaData) {
+    if (metaData != history_.metaData) {
         updateMetaData(metaData);
-        history.metaData = metaData;
+        history_.metaData = std::move(metaData);
     }
-    history.timeStatus = timeStatus;
+    history_.timeStatus = timeStatus;
 }
 
 // [oddity silent-recovery] The history stays as it is: after a recovery the host is told only what
 // differs from the last good poll, so it keeps "unusable" until the next change of role.
 void tPtp4lTimeRef::reportUnreachable(std::int32_t code) const {
-    // [oddity unreachable-is-info] LOG_INFO: while ptp4l starts or is being replaced this is
-    // expected.
+    // [oddity unreachable-is-info] LOG_INFO: while ptp4l starts this is expected.
     syslog(
         LOG_INFO,
         "Unable to communicate with PTP sub process while attempting to retrieve data,got error: "
@@ -145,24 +145,28 @@ void tPtp4lTimeRef::reportUnreachable(std::int32_t code) const {
     updateMetaData(tPtp4lMetaData());
 }
 
-void tPtp4lTimeRef::reportTimePair(const tTimeStatus& timeStatus, tHistory& history) {
-    drainEpochOffsets(history);
+void tPtp4lTimeRef::reportTimePair(const tTimeStatus& timeStatus) {
+    drainEpochOffsets();
     const std::uint64_t offset =
-        history.epochOffset + static_cast<std::uint64_t>(timeStatus.masterOffset);
+        history_.epochOffset + static_cast<std::uint64_t>(timeStatus.masterOffset);
     const std::uint64_t localTime =
-        static_cast<std::uint64_t>(timeStatus.ingressTime) + history.epochOffset;
+        static_cast<std::uint64_t>(timeStatus.ingressTime) + history_.epochOffset;
     host_.adjustTime(localTime - offset, localTime);
 }
 
 // At most one pipe full, so that a writer that never pauses cannot hold the worker.
-void tPtp4lTimeRef::drainEpochOffsets(tHistory& history) {
+void tPtp4lTimeRef::drainEpochOffsets() {
     zeerr::LocalStatus status;
     std::uint64_t value = 0;
+    std::size_t capacity = 0;
     std::size_t octets = 0;
     while (epochFifo_->read(&value, sizeof(value), status) == sizeof(value)) {
-        history.epochOffset = value;
+        history_.epochOffset = value;
         octets += sizeof(value);
-        if (octets >= epochFifo_->capacity()) {
+        if (capacity == 0) {
+            capacity = epochFifo_->capacity();
+        }
+        if (octets >= capacity) {
             break;
         }
     }

@@ -10,12 +10,9 @@ tPtpClockIdentity::tPtpClockIdentity(std::uint64_t value) {
 }
 
 void tPtpClockIdentity::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
-    Octets whole{};
-    for (std::uint8_t& octet : whole) {
-        octet = buffer.readU8(status);
-    }
+    const tPtpClockIdentity whole(buffer.readU64(status));
     if (!zeerr::isError(status)) {
-        identity_ = whole;
+        *this = whole;
     }
 }
 

@@ -9,7 +9,7 @@
 namespace zekelVantel {
 
 /// ClockIdentity, IEEE 1588-2008 5.3.4: 8 octets. All zero by default. Read all or nothing.
-class tPtpClockIdentity : public iMsgSerializable {
+class tPtpClockIdentity final : public iMsgSerializable {
 public:
     using Octets = std::array<std::uint8_t, 8>;
 

@@ -8,7 +8,7 @@
 namespace zekelVantel {
 
 /// ClockQuality, IEEE 1588-2008 5.3.7: 4 octets. All zero by default. Read all or nothing.
-class tPtpClockQuality : public iMsgSerializable {
+class tPtpClockQuality final : public iMsgSerializable {
 public:
     void deserialize(tMsgBuffer& buffer, zeerr::Status& status) override;
     void serialize(tMsgBuffer& buffer, zeerr::Status& status) const override;

@@ -52,8 +52,8 @@ void tPtpMgmtNode::getSingle(iMsgInterface& interface, const iMsgAddress& remote
     const std::uint32_t expected = message.size() + tlv.size();
     request(interface, remoteAddress, buffer, message, tlv, tPadOctet::uncounted, status);
     receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);
-    // [oddity length-only] The length alone decides: ptp4l answers one request at a time, and what
-    // is late is dropped so.
+    // [oddity length-only] The length alone decides: a late answer of the same length is as good,
+    // and one of another length is dropped.
     if (!zeerr::isError(status) && buffer.getLength() != expected) {
         zeerr::setError(status, zeerr::site::answerOfOtherLength);
     }

@@ -1,6 +1,7 @@
 /// @file
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <vector>
 
@@ -23,6 +24,9 @@ class tPtpMgmtNode {
 public:
     /// Time limit of every answer, in milliseconds.
     static constexpr std::uint32_t answerTimeoutMs = 2000;
+
+    /// Ports for which room is made at once; a daemon may claim 65535.
+    static constexpr std::uint32_t usualPorts = 64;
 
     /// @param portIdentity      stands as sourcePortIdentity in every request.
     /// @param transportSpecific likewise; the low 4 bits count.
@@ -78,6 +82,7 @@ void tPtpMgmtNode::getFromPorts(iMsgInterface& interface, const iMsgAddress& rem
     Tlv tlv;
     const std::uint32_t expected = message.size() + tlv.size();
     request(interface, remoteAddress, buffer, message, tlv, padOctet, status);
+    answers.reserve(std::min(count, usualPorts));
     for (std::uint32_t answer = 0; answer < count && !zeerr::isError(status); ++answer) {
         if (receiveAtLeast(expected, interface, buffer, message, tlv, status)) {
             answers.push_back(tlv.data());

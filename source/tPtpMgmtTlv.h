@@ -9,7 +9,6 @@ namespace zekelVantel {
 
 /// managementId, IEEE 1588-2008 table 40 and linuxptp's own.
 enum class tManagementId : std::uint16_t {
-    none = 0,
     defaultDataSet = 0x2000,
     parentDataSet = 0x2002,
     portDataSet = 0x2004,

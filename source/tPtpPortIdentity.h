@@ -8,7 +8,7 @@
 namespace zekelVantel {
 
 /// PortIdentity, IEEE 1588-2008 5.3.5: 10 octets. All zero by default. Read all or nothing.
-class tPtpPortIdentity : public iMsgSerializable {
+class tPtpPortIdentity final : public iMsgSerializable {
 public:
     tPtpPortIdentity() = default;
     tPtpPortIdentity(const tPtpClockIdentity& clockIdentity, std::uint16_t portNumber);

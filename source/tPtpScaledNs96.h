@@ -9,7 +9,7 @@ namespace zekelVantel {
 
 /// ScaledNs, IEEE 802.1AS-2011 6.3.3.1 (linuxptp `struct ScaledNs`): 96 bits in units of 2^-16 ns.
 /// All zero by default. Read all or nothing.
-class tPtpScaledNs96 : public iMsgSerializable {
+class tPtpScaledNs96 final : public iMsgSerializable {
 public:
     void deserialize(tMsgBuffer& buffer, zeerr::Status& status) override;
     void serialize(tMsgBuffer& buffer, zeerr::Status& status) const override;

@@ -10,7 +10,7 @@ namespace zekelVantel {
 
 /// PTPText, IEEE 1588-2008 5.3.9: a length octet and as many octets of text. Empty by default. Read
 /// all or nothing. A pad octet behind it belongs to whoever holds the text.
-class tPtpText : public iMsgSerializable {
+class tPtpText final : public iMsgSerializable {
 public:
     /// The text is kept up to its first zero octet, the length as received.
     void deserialize(tMsgBuffer& buffer, zeerr::Status& status) override;

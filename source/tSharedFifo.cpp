@@ -48,14 +48,16 @@ void tSharedFifo::open(zeerr::Status& status) {
     }
     // [oddity fifo-ends] The owner opens for writing too: its end then never reads as if the other
     // had gone.
-    descriptor_ = tFileDescriptor(::open(path_.c_str(), (owner_ ? O_RDWR : O_RDONLY) | O_NONBLOCK));
-    if (!isOpen()) {
+    const int descriptor = ::open(path_.c_str(), (owner_ ? O_RDWR : O_RDONLY) | O_NONBLOCK);
+    if (descriptor < 0) {
         const zeerr::ErrnoText error;
         const zeerr::ErrorSite& site =
             error.number() == ENOENT ? zeerr::site::fifoNotFound : zeerr::site::fifoOpenFailed;
         zeerr::setErrorWithInfo(status, site, "Failed opening shared FIFO: %s, errno: %d (%s)",
                                 path_.c_str(), error.number(), error.text());
+        return;
     }
+    descriptor_ = tFileDescriptor(descriptor);
 }
 
 ssize_t tSharedFifo::read(void* buffer, std::size_t length, zeerr::Status& status) {
@@ -72,6 +74,23 @@ ssize_t tSharedFifo::read(void* buffer, std::size_t length, zeerr::Status& statu
             error.number() == EAGAIN ? zeerr::site::fifoEmpty : zeerr::site::fifoReadFailed;
         zeerr::setErrorWithInfo(status, site, "Failed reading from shared FIFO: %s, errno: %d (%s)",
                                 path_.c_str(), error.number(), error.text());
+    }
+    return octets;
+}
+
+ssize_t tSharedFifo::write(const void* buffer, std::size_t length, zeerr::Status& status) {
+    if (!isOpen()) {
+        open(status);
+    }
+    if (zeerr::isError(status)) {
+        return -1;
+    }
+    const ssize_t octets = ::write(descriptor_.get(), buffer, length);
+    if (octets < 0) {
+        const zeerr::ErrnoText error;
+        zeerr::setErrorWithInfo(status, zeerr::site::fifoWriteFailed,
+                                "Failed writing to shared FIFO: %s, errno: %d (%s)", path_.c_str(),
+                                error.number(), error.text());
     }
     return octets;
 }

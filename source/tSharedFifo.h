@@ -34,6 +34,12 @@ public:
     ///         when it is empty, -52008 when it cannot be read otherwise, and those of open.
     ssize_t read(void* buffer, std::size_t length, zeerr::Status& status);
 
+    /// Writes what there is room for, after opening if need be. For the owner.
+    /// @return octets written, or -1 with an error: -52008 when the FIFO cannot be written, and
+    /// those of
+    ///         open.
+    ssize_t write(const void* buffer, std::size_t length, zeerr::Status& status);
+
     /// Octets that the FIFO holds at most.
     std::size_t capacity() const;
 

@@ -5,8 +5,7 @@
 namespace zekelVantel {
 
 tUdsMsgAddress::tUdsMsgAddress(const std::string& path) {
-    address_.sun_family = AF_UNIX;
-    // [oddity cut-path] Cut without a word: a path that long is refused by ptp4l, which says so.
+    // [oddity cut-path] Cut without a word, as ptp4l cuts its uds_address: both still meet.
     path.copy(address_.sun_path, sizeof(address_.sun_path) - 1);
 }
 

@@ -12,6 +12,8 @@ namespace zekelVantel {
 /// The path of a Unix-domain socket, unix(7).
 class tUdsMsgAddress : public iMsgAddress {
 public:
+    tUdsMsgAddress() = default;
+
     /// @param path cut silently to 107 characters, so that a zero follows.
     explicit tUdsMsgAddress(const std::string& path);
 
@@ -21,8 +23,11 @@ public:
     socklen_t length() const override;
     std::string path() const override;
 
+    /// The path given to the constructor, as far as it is kept.
+    const char* localPath() const { return address_.sun_path; }
+
 private:
-    sockaddr_un address_{};
+    sockaddr_un address_{AF_UNIX, {}};
 };
 
 } // namespace zekelVantel

@@ -22,8 +22,6 @@ timeval toTimeval(std::uint32_t milliseconds) {
 
 } // namespace
 
-tUdsMsgInterface::tUdsMsgInterface() : localAddress_("") {}
-
 tUdsMsgInterface::~tUdsMsgInterface() {
     tUdsMsgInterface::close();
 }
@@ -36,21 +34,22 @@ void tUdsMsgInterface::open(const std::string& localPath, zeerr::Status& status)
         zeerr::setError(status, zeerr::site::socketAlreadyOpen);
         return;
     }
-    socket_ = tFileDescriptor(socket(AF_UNIX, SOCK_DGRAM, 0));
-    if (!isOpen()) {
+    const int descriptor = socket(AF_UNIX, SOCK_DGRAM, 0);
+    if (descriptor < 0) {
         const zeerr::ErrnoText error;
         zeerr::setErrorWithInfo(status, zeerr::site::socketFailed,
                                 "Failed to open socket with errno %d (%s)", error.number(),
                                 error.text());
         return;
     }
+    socket_ = tFileDescriptor(descriptor);
     // A stopped ptp4l does not read: without a limit, a send would then never return.
     const timeval timeout = toTimeval(sendTimeoutMs);
     setsockopt(socket_.get(), SOL_SOCKET, SO_SNDTIMEO, &timeout, sizeof(timeout));
     // [oddity stale-path] Whatever stands at the path goes: it is ours by name, left by a former
     // run.
     localAddress_ = tUdsMsgAddress(localPath);
-    unlink(localAddress_.path().c_str());
+    unlink(localAddress_.localPath());
     if (bind(socket_.get(), localAddress_.sendAddress(), localAddress_.length()) != 0) {
         const zeerr::ErrnoText error;
         zeerr::setErrorWithInfo(status, zeerr::site::bindFailed,
@@ -64,7 +63,7 @@ int tUdsMsgInterface::close() {
     if (!socket_.isOpen()) { // and not isOpen(): the destructor comes here
         return 0;
     }
-    unlink(localAddress_.path().c_str());
+    unlink(localAddress_.localPath());
     return socket_.close();
 }
 
@@ -85,7 +84,7 @@ void tUdsMsgInterface::send(const tMsgBuffer& buffer, const iMsgAddress& remoteA
 }
 
 void tUdsMsgInterface::receive(tMsgBuffer& buffer, std::uint32_t timeoutMs, zeerr::Status& status) {
-    tUdsMsgAddress ignoredSource("");
+    tUdsMsgAddress ignoredSource;
     receive(buffer, ignoredSource, timeoutMs, status);
 }
 

@@ -14,7 +14,7 @@ namespace zekelVantel {
 /// signal that interrupts the waiting counts as a time-out.
 class tUdsMsgInterface : public iMsgInterface {
 public:
-    tUdsMsgInterface();
+    tUdsMsgInterface() = default;
     ~tUdsMsgInterface() override;
     tUdsMsgInterface(const tUdsMsgInterface&) = delete;
     tUdsMsgInterface& operator=(const tUdsMsgInterface&) = delete;

@@ -103,6 +103,15 @@ inline constexpr ErrorSite answerOfOtherLength{code::endOfData, "zeoskerr_endOfD
 inline constexpr ErrorSite answerTooShort{code::endOfData, "zeoskerr_endOfData", "tPtpMgmtNode",
                                           120};
 
+// Exported functions.
+inline constexpr ErrorSite configurationIsNull{code::invalidParameter, "zeoskerr_invalidParameter",
+                                               "tPtp4lTimeRef", 56};
+inline constexpr ErrorSite schemaNotAllocated{code::memoryFull, "zeoskerr_memoryFull",
+                                              "tPtp4lTimeRef", 92};
+
+// ptp4l's process.
+inline constexpr ErrorSite forkFailed{code::osFault, "zeoskerr_osFault", "tPtp4lTimeRef", 70};
+
 // Metadata.
 inline constexpr ErrorSite portListsDiffer{code::communicationsFault,
                                            "zeoskerr_communicationsFault", "tPtp4lMetaData", 99};
@@ -111,6 +120,7 @@ inline constexpr ErrorSite portListsDiffer{code::communicationsFault,
 inline constexpr ErrorSite fifoCreationFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 35};
 inline constexpr ErrorSite fifoEmpty{code::endOfData, "zeoskerr_endOfData", "tSharedFifo", 82};
 inline constexpr ErrorSite fifoReadFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 86};
+inline constexpr ErrorSite fifoWriteFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 112};
 inline constexpr ErrorSite fifoNotFound{code::resourceNotFound, "zeoskerr_resourceNotFound",
                                         "tSharedFifo", 139};
 inline constexpr ErrorSite fifoOpenFailed{code::osFault, "zeoskerr_osFault", "tSharedFifo", 143};

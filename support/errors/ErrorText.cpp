@@ -4,9 +4,8 @@
 #include <cstdio>
 #include <cstring>
 #include <limits>
-#include <memory>
 
-#include <cjson/cJSON.h>
+#include "errors/JsonScanner.h"
 
 namespace zeerr {
 namespace {
@@ -79,8 +78,7 @@ char* writeQuoted(char* out, std::string_view text) {
 
 /// Whether nothing but blanks stands between the position and the brace that opens its object.
 bool isFirstMember(const char* position) {
-    // What cJSON skips as a blank, which is more than JSON's four.
-    while (static_cast<unsigned char>(position[-1]) <= ' ') {
+    while (isJsonBlank(position[-1])) {
         --position;
     }
     return position[-1] == '{' || position[-1] == '[';
@@ -138,13 +136,8 @@ char* beginMembers(Status& status) {
     if (!resize(status, size + roomForMembers)) {
         return nullptr;
     }
-    const char* end = nullptr;
-    const std::unique_ptr<cJSON, decltype(&cJSON_Delete)> text(
-        cJSON_ParseWithLengthOpts(status.json, textLength(status), &end, 0), &cJSON_Delete);
-    if (text == nullptr || !(cJSON_IsObject(text.get()) || cJSON_IsArray(text.get()))) {
-        return nullptr;
-    }
-    return status.json + (end - status.json) - 1;
+    const char* const bracket = closingBracket({status.json, textLength(status)});
+    return bracket == nullptr ? nullptr : status.json + (bracket - status.json);
 }
 
 char* addString(char* position, std::string_view key, std::string_view value, Resizer& resizer) {
