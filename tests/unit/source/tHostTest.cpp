@@ -1,11 +1,14 @@
 #include "tHost.h"
 
 #include <cstring>
+#include <stdexcept>
+#include <string>
 
 #include <gtest/gtest.h>
 
 #include "errors/Exception.h"
 #include "support/RecordingHost.h"
+#include "unit/errors/ResizeOperations.h"
 
 using zekelVantel::tHost;
 using zekelVantel::tQuality;
@@ -19,6 +22,12 @@ protected:
     RecordingHost recorder;
     void* slot = nullptr;
     tHost host{&slot};
+};
+
+/// Calls the host while an exception unwinds.
+struct Unwinding {
+    tHost& host;
+    ~Unwinding() { host.updateMetaData("{}"); }
 };
 
 std::uint64_t bits(double value) {
@@ -90,10 +99,6 @@ TEST_F(HostTest, PositiveCodeIsNoError) {
 
 TEST_F(HostTest, NothingIsThrownWhileAnotherExceptionUnwinds) {
     recorder.onCall([](const RecordingHost::Call&, zeerr_Status& status) { status.code = -1; });
-    struct Unwinding {
-        tHost& host;
-        ~Unwinding() { host.updateMetaData("{}"); }
-    };
     try {
         const Unwinding unwinding{host};
         throw 42;
@@ -101,6 +106,121 @@ TEST_F(HostTest, NothingIsThrownWhileAnotherExceptionUnwinds) {
         EXPECT_EQ(value, 42);
     }
     EXPECT_EQ(recorder.calls().size(), 1U);
+}
+
+class HostTextTest : public HostTest {
+protected:
+    /// The host puts a resize operation and a text of its own into the status, and then goes on.
+    void answer(std::int32_t code, const RecordingHost::Reaction& goOn = nullptr) {
+        recorder.onCall([=](const RecordingHost::Call& call, zeerr_Status& status) {
+            ASSERT_EQ(status.json, nullptr);
+            status.resize = &countingResize;
+            ASSERT_TRUE(status.resize(&status, 16));
+            std::strcpy(status.json, "{\"a\":1}");
+            status.code = code;
+            requestedSizes.clear();
+            if (goOn) {
+                goOn(call, status);
+            }
+        });
+    }
+
+    static void expectReleasedOnce() {
+        EXPECT_EQ(requestedSizes, std::vector<std::uint32_t>{0});
+        requestedSizes.clear();
+    }
+};
+
+TEST_F(HostTextTest, IsReleasedOnceAfterSuccess) {
+    answer(0);
+    host.getTime();
+    expectReleasedOnce();
+    host.adjustTime(1, 2);
+    expectReleasedOnce();
+    host.setQuality(tQuality::usable, "why");
+    expectReleasedOnce();
+    host.updateMetaData("{}");
+    expectReleasedOnce();
+}
+
+TEST_F(HostTextTest, IsReleasedOnceAfterAWarning) {
+    answer(7);
+    EXPECT_NO_THROW(host.adjustTime(1, 2));
+    expectReleasedOnce();
+}
+
+TEST_F(HostTextTest, IsReleasedOnceAfterAnErrorAndTheExceptionHasACopy) {
+    answer(-52009);
+    try {
+        host.setQuality(tQuality::unusable, "why");
+        FAIL() << "nothing thrown";
+    } catch (zeerr::Exception& exception) {
+        expectReleasedOnce();
+        EXPECT_EQ(exception.status().code, -52009);
+        EXPECT_STREQ(exception.what(), "{\"a\":1}");
+    }
+    EXPECT_TRUE(requestedSizes.empty());
+}
+
+TEST_F(HostTextTest, IsReleasedOnceAfterACallbackThatThrows) {
+    for (const std::int32_t code : {0, 7, -1}) {
+        answer(code, [](const RecordingHost::Call&, zeerr_Status&) { throw 42; });
+        EXPECT_THROW(host.updateMetaData("{}"), int);
+        expectReleasedOnce();
+    }
+}
+
+TEST_F(HostTextTest, IsReleasedOnceWhileAnotherExceptionUnwinds) {
+    for (const std::int32_t code : {0, 7, -1}) {
+        answer(code);
+        try {
+            const Unwinding unwinding{host};
+            throw std::runtime_error("other");
+        } catch (const std::runtime_error& exception) {
+            expectReleasedOnce();
+            EXPECT_STREQ(exception.what(), "other");
+        }
+    }
+}
+
+TEST_F(HostTextTest, IsReleasedOnceThoughThereIsNone) {
+    recorder.onCall([](const RecordingHost::Call&, zeerr_Status& status) {
+        status.resize = &countingResize;
+        requestedSizes.clear();
+    });
+    host.getTime();
+    expectReleasedOnce();
+}
+
+TEST_F(HostTest, ExceptionOfACallbackArrivesAsItIs) {
+    recorder.onCall([](const RecordingHost::Call&, zeerr_Status& status) {
+        status.code = -1;
+        throw std::runtime_error("of the host");
+    });
+    for (const bool quality : {false, true}) {
+        try {
+            quality ? host.setQuality(tQuality::usable, "why") : host.adjustTime(1, 2);
+            FAIL() << "nothing thrown";
+        } catch (const std::runtime_error& exception) {
+            EXPECT_STREQ(exception.what(), "of the host");
+        }
+    }
+}
+
+TEST_F(HostTest, CallAfterAnExceptionOfACallbackIsLikeAnyOther) {
+    recorder.onCall([](const RecordingHost::Call&, zeerr_Status& status) {
+        status.code = -1;
+        throw std::runtime_error("of the host");
+    });
+    EXPECT_THROW(host.getTime(), std::runtime_error);
+    recorder.onCall(nullptr);
+    recorder.setTime(7);
+    EXPECT_EQ(host.getTime(), 7U);
+    const auto calls = recorder.calls();
+    ASSERT_EQ(calls.size(), 2U);
+    EXPECT_EQ(calls[1].context, &slot);
+    EXPECT_EQ(calls[1].codeOnEntry, 0);
+    EXPECT_FALSE(calls[1].textOnEntry);
 }
 
 } // namespace

@@ -1,0 +1,53 @@
+/// @file
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include <sys/types.h>
+
+/// linuxptp's ptp4l as a boundary clock on the interfaces that scripts/testbed.sh provides, and
+/// what linuxptp's own client says about it.
+class RealDaemonScene {
+public:
+    /// One answer, as the client prints it: texts by the names of their fields.
+    using Report = std::map<std::string, std::string>;
+
+    /// Starts the daemon and waits until it follows the grandmaster. Throws when it does not.
+    RealDaemonScene();
+    ~RealDaemonScene();
+    RealDaemonScene(const RealDaemonScene&) = delete;
+    RealDaemonScene& operator=(const RealDaemonScene&) = delete;
+
+    /// Whether this process runs in scripts/testbed.sh.
+    static bool isProvided();
+
+    std::size_t ports() const { return ports_; }
+    std::string socket() const { return folder_ + "/boundary.uds"; }
+    std::string path(const std::string& name) const { return folder_ + "/" + name; }
+
+    /// One report per answer.
+    std::vector<Report> ask(const std::string& dataSet) const;
+
+private:
+    void start();
+    void waitUntilFollowing();
+    std::string log() const;
+
+    std::string folder_;
+    std::size_t ports_ = 0;
+    pid_t daemon_ = -1;
+};
+
+/// No Syncs come while this object lives.
+class PausedGrandmaster {
+public:
+    PausedGrandmaster();
+    ~PausedGrandmaster();
+    PausedGrandmaster(const PausedGrandmaster&) = delete;
+    PausedGrandmaster& operator=(const PausedGrandmaster&) = delete;
+
+private:
+    pid_t pid_;
+};
