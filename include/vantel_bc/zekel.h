@@ -8,10 +8,10 @@
 /// - `context` is the address of the session slot that the host passed to `zekeltr_initialize`.
 /// - `status` is fresh on entry (code 0, no text). The host reports a failure by making the code
 ///   negative and filling the text through `status->resize`. The plug-in releases the text.
-/// - A code of ZEKEL_HOST_IS_STOPPING says that the host is going down; it is not logged as an
-/// error.
+/// - A code of ZEKEL_HOST_IS_STOPPING says that the host is going down.
+/// - A C++ exception that leaves a function counts as an error of that call.
 /// - Calls of one session may come from two threads at the same time. A call should return soon:
-///   `zekeltr_stop` waits for calls that are under way.
+///   `zekeltr_stop` waits for calls that are under way. It must not start, stop or finalize its session.
 #ifndef VANTEL_BC_ZEKEL_H
 #define VANTEL_BC_ZEKEL_H
 

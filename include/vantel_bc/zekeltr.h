@@ -6,7 +6,7 @@
 ///
 /// Order: `zekeltr_initialize`, `zekeltr_start`, `zekeltr_stop`, `zekeltr_finalize`, once each; the
 /// other three at any time. The functions are not serialised: start, stop and finalize of one
-/// session must not overlap. No exception leaves them.
+/// session must not overlap, nor be called from a callback of it. No exception leaves them.
 #ifndef VANTEL_BC_ZEKELTR_H
 #define VANTEL_BC_ZEKELTR_H
 
@@ -36,8 +36,8 @@ uint32_t zekeltr_getAPIVersion(void);
 /// @param protocolConfig JSON object text; copied.
 /// @param status         in and out. A negative code on entry: nothing happens. Codes on failure:
 ///                       -52005 a null configuration, JSON that does not parse, a missing key;
-///                       -52004 a value of the wrong type; -52003 a number out of range;
-///                       -52000 no memory.
+///                       -52004 a value of the wrong type; -52003 a number out of range, or a
+///                       transportSpecific that is no hexadecimal number; -52000 no memory.
 void zekeltr_initialize(void** sessionSlot, const char* protocolConfig, zeerr_Status* status);
 
 /// Destroys the session, if `*sessionSlot` is not null, and leaves the slot as it is. A started
@@ -47,7 +47,8 @@ void zekeltr_finalize(void** sessionSlot);
 /// Starts the session: sends default metadata and the quality "unusable", runs ptp4l, and begins to
 /// report. The slot must hold a session.
 /// @param status in and out. A negative code on entry: nothing happens. Codes on failure: -52008
-///               ptp4l could not be forked, or the code of a host call that failed.
+///               ptp4l could not be forked; -52003 no thread; -52000 no memory; or the code of a
+///               host call that failed.
 void zekeltr_start(void** sessionSlot, zeerr_Status* status);
 
 /// Stops the session: waits for its threads and ends ptp4l. The slot must hold a session. A failure

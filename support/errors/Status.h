@@ -44,8 +44,9 @@ bool setCode(Status& status, std::int32_t code);
 /// @return what `setCode` returned.
 bool merge(Status& target, Status& source, bool* changed = nullptr);
 
-/// Replaces the text of `target` by a copy, through the target's resize operation.
-/// @return false when there is no room; the target then has no text that contradicts its code.
+/// Replaces the text of `target` by a copy of the source's, if there is one, through the target's
+/// resize operation.
+/// @return false when there is no room: the target keeps the text it had.
 bool copyText(Status& target, const Status& source);
 
 /// Length of the text, never beyond its capacity; 0 when there is none.
