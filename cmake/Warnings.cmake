@@ -18,6 +18,4 @@ target_compile_options(
             $<$<COMPILE_LANGUAGE:CXX>:-Woverloaded-virtual>
             $<$<CXX_COMPILER_ID:GNU>:-Wduplicated-cond>
             $<$<CXX_COMPILER_ID:GNU>:-Wlogical-op>
-            # A cast that 64-bit needs, for std::size_t or time_t, is "useless" on 32-bit.
-            $<$<AND:$<COMPILE_LANG_AND_ID:CXX,GNU>,$<EQUAL:${CMAKE_SIZEOF_VOID_P},8>>:-Wuseless-cast>
             -Werror)

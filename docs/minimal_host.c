@@ -12,8 +12,7 @@
 
 /* What the plug-in calls. */
 
-void zekel_getTime(void** context, uint64_t* now, zeerr_Status* status)
-{
+void zekel_getTime(void** context, uint64_t* now, zeerr_Status* status) {
     struct timespec time;
     (void)context;
     (void)status;
@@ -21,23 +20,20 @@ void zekel_getTime(void** context, uint64_t* now, zeerr_Status* status)
     *now = (uint64_t)time.tv_sec * 1000000000U + (uint64_t)time.tv_nsec;
 }
 
-void zekel_adjustTime(void** context, uint64_t reference, uint64_t local, zeerr_Status* status)
-{
+void zekel_adjustTime(void** context, uint64_t reference, uint64_t local, zeerr_Status* status) {
     (void)context;
     (void)status;
     printf("offset %lld ns\n", (long long)(local - reference));
 }
 
 void zekel_setTRQuality(void** context, const double* quality, const char* reason,
-                        zeerr_Status* status)
-{
+                        zeerr_Status* status) {
     (void)context;
     (void)status;
     printf("%s: %s\n", quality[0] > 0 ? "usable" : "unusable", reason);
 }
 
-void zekel_updateMetaData(void** context, const char* json, zeerr_Status* status)
-{
+void zekel_updateMetaData(void** context, const char* json, zeerr_Status* status) {
     (void)context;
     (void)status;
     printf("%s\n", json);
@@ -45,8 +41,7 @@ void zekel_updateMetaData(void** context, const char* json, zeerr_Status* status
 
 /* Where the text of an error goes. */
 
-static bool resize(zeerr_Status* status, uint32_t size)
-{
+static bool resize(zeerr_Status* status, uint32_t size) {
     char* text = NULL;
     if (size != 0 && size <= status->capacity)
         return true;
@@ -62,8 +57,7 @@ static bool resize(zeerr_Status* status, uint32_t size)
     return true;
 }
 
-static int failed(const char* operation, zeerr_Status* status)
-{
+static int failed(const char* operation, zeerr_Status* status) {
     if (status->code >= 0)
         return 0;
     fprintf(stderr, "%s: %d %s\n", operation, (int)status->code, status->json ? status->json : "");
@@ -71,8 +65,7 @@ static int failed(const char* operation, zeerr_Status* status)
     return 1;
 }
 
-int main(int argc, char** argv)
-{
+int main(int argc, char** argv) {
     static char configuration[65536];
     void* session = NULL; /* its address names the session */
     zeerr_Status status = {0, 0, resize, NULL};

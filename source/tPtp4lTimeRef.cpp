@@ -53,6 +53,7 @@ tPtp4lTimeRef::~tPtp4lTimeRef() {
 void tPtp4lTimeRef::start() {
     updateMetaData(tPtp4lMetaData());
     host_.setQuality(tQuality::unusable, waitingForStatus);
+    stopRequested_ = false;
     history_ = tHistory();
     ptp4l_.spawn(ptp4lPath_, config_.configFile, config_.interfaces);
     try {
@@ -60,7 +61,6 @@ void tPtp4lTimeRef::start() {
         watchdog_ = std::async(std::launch::async, &tPtp4lTimeRef::runWatchdog, this);
     } catch (...) {
         stop();
-        stopRequested_ = false;
         throw;
     }
 }

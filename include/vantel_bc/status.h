@@ -51,9 +51,9 @@ struct zeerr_Status
     char* json;          ///< zero-terminated JSON text, or null
 };
 
-/// The code with which a host refuses calls while it is stopping. The threads of a session log it at
-/// LOG_INFO instead of LOG_ERR and go on; in `zekeltr_start` it is an error as any other. The plug-in
-/// never sets it itself.
+/// The code with which a host refuses calls while it is stopping. The threads of a session log it
+/// at LOG_INFO instead of LOG_ERR and go on; in `zekeltr_start` it is an error as any other. The
+/// plug-in never sets it itself.
 #define ZEKEL_HOST_IS_STOPPING (-52009)
 
 #ifdef __cplusplus

@@ -11,7 +11,8 @@
 /// - A code of ZEKEL_HOST_IS_STOPPING says that the host is going down.
 /// - A C++ exception that leaves a function counts as an error of that call.
 /// - Calls of one session may come from two threads at the same time. A call should return soon:
-///   `zekeltr_stop` waits for calls that are under way. It must not start, stop or finalize its session.
+///   `zekeltr_stop` waits for calls that are under way. It must not start, stop or finalize its
+///   session.
 #ifndef VANTEL_BC_ZEKEL_H
 #define VANTEL_BC_ZEKEL_H
 

@@ -98,6 +98,14 @@ TEST(ExportedSymbolsTest, FourAreLeftForTheHost) {
                                 "zekel_updateMetaData"}));
 }
 
+TEST(ExportedSymbolsTest, LogIsNeitherOpenedNorClosed) {
+    const Names imported = library().symbols(false);
+    EXPECT_EQ(imported.count("openlog"), 0U);
+    EXPECT_EQ(imported.count("closelog"), 0U);
+    EXPECT_EQ(imported.count("setlogmask"), 0U);
+    EXPECT_EQ(imported.count("syslog") + imported.count("__syslog_chk"), 1U);
+}
+
 TEST(ExportedSymbolsTest, SharedObjectNameHasVersion19) {
     EXPECT_EQ(library().dynamicTexts(DT_SONAME), Names{"libvantel_bc.so.19"});
 }

@@ -14,6 +14,7 @@
 #include <unistd.h>
 
 #include "contract/PluginFixture.h"
+#include "support/Descriptors.h"
 #include "support/EpochFifo.h"
 #include "support/Processes.h"
 #include "system/ManagementClient.h"
@@ -99,6 +100,7 @@ protected:
         slot = nullptr;
         EXPECT_FALSE(hasChildren());
         EXPECT_EQ(threadCount(), threadsBefore);
+        EXPECT_EQ(openDescriptors(), descriptorsBefore);
         EXPECT_FALSE(std::filesystem::exists("/run/ptp4lTimeRef." + std::to_string(getpid())));
     }
 
@@ -111,6 +113,7 @@ protected:
     SyslogCapture log;
     const Plugin plugin;
     EpochFifo fifo;
+    const int descriptorsBefore = openDescriptors();
     void* slot = nullptr;
 };
 
@@ -128,6 +131,25 @@ std::string clockIdText(const std::string& text) {
 
 std::string macText(const std::string& clockId) {
     return clockId.substr(0, 9) + clockId.substr(15);
+}
+
+TEST_F(RealDaemon, RunsWithItsArgumentsAloneAfterTheFirstReports) {
+    const auto calls = host.calls();
+    ASSERT_GE(calls.size(), 2U);
+    EXPECT_EQ(calls[0].function, Function::updateMetaData);
+    EXPECT_EQ(calls[1].function, Function::setTRQuality);
+    EXPECT_EQ(calls[1].text, "Waiting for ptp4l status");
+    const std::string process = "/proc/" + std::to_string(childOfThisProcess());
+    // The scene's /usr/bin/ptp4l is a script that adds -S.
+    const std::string arguments =
+        "/usr/sbin/ptp4l|-S|-f|" + sceneVariable("TESTBED_FOLDER") + "/boundary.conf|-i|bc0|";
+    const auto commandLine = [&] {
+        std::string line = readFile(process + "/cmdline");
+        std::replace(line.begin(), line.end(), '\0', '|');
+        return line;
+    };
+    EXPECT_TRUE(waitUntil([&] { return commandLine() == arguments; })) << commandLine();
+    EXPECT_EQ(readFile(process + "/environ").find("TESTBED"), std::string::npos);
 }
 
 TEST_F(RealDaemon, IsUsableWithin15SecondsOfStart) {

@@ -113,7 +113,7 @@ void dropAt(std::vector<Answer>& answers, std::int64_t index) {
     if (index == 0) {
         answers.clear();
     } else if (index <= static_cast<std::int64_t>(answers.size())) {
-        answers.erase(answers.begin() + (index - 1));
+        answers.erase(answers.begin() + static_cast<std::ptrdiff_t>(index - 1));
     }
 }
 

@@ -82,7 +82,9 @@ std::int64_t Simulator::wakeTime(std::int64_t now) const {
 void Simulator::wait() {
     const std::int64_t current = now();
     const std::int64_t duration = std::max<std::int64_t>(wakeTime(current) - current, 0);
-    const timespec timeout{duration / second, duration % second};
+    timespec timeout{};
+    timeout.tv_sec = static_cast<decltype(timeout.tv_sec)>(duration / second);
+    timeout.tv_nsec = static_cast<decltype(timeout.tv_nsec)>(duration % second);
     // A negative descriptor is skipped by poll.
     const int readable = current < readAgain_ ? -1 : socket_.descriptor();
     pollfd polled[] = {{signals_.descriptor(), POLLIN, 0}, {readable, POLLIN, 0}};

@@ -2,11 +2,14 @@
 
 #include <array>
 #include <climits>
+#include <cstdlib>
 #include <string>
 
+#include <cjson/cJSON.h>
 #include <gtest/gtest.h>
 
 #include "ResizeOperations.h"
+#include "errors/Exception.h"
 
 using zeerr::addInt;
 using zeerr::addObject;
@@ -49,6 +52,41 @@ protected:
         std::strcpy(status.json, text.c_str());
     }
 };
+
+/// cJSON finds no memory while this object lives.
+class CjsonWithoutMemory {
+public:
+    CjsonWithoutMemory() {
+        requests = 0;
+        cJSON_Hooks hooks{[](std::size_t) -> void* {
+                              ++requests;
+                              return nullptr;
+                          },
+                          &std::free};
+        cJSON_InitHooks(&hooks);
+    }
+    ~CjsonWithoutMemory() { cJSON_InitHooks(nullptr); }
+    CjsonWithoutMemory(const CjsonWithoutMemory&) = delete;
+    CjsonWithoutMemory& operator=(const CjsonWithoutMemory&) = delete;
+
+    static inline int requests = 0;
+};
+
+char pool[1024];
+
+/// Serves from a fixed pool, half of it at first.
+bool poolResize(zeerr::Status* status, std::uint32_t size) {
+    requestedSizes.push_back(size);
+    if (size > sizeof(pool)) {
+        return false;
+    }
+    if (size != 0 && status->json == nullptr) {
+        std::strcpy(pool, "{}");
+    }
+    status->json = size == 0 ? nullptr : pool;
+    status->capacity = size == 0 ? 0U : size <= 512 ? 512U : 1024U;
+    return true;
+}
 
 TEST(EscapeTest, EveryOctetByItself) {
     for (unsigned octet = 0; octet < 256; ++octet) {
@@ -194,6 +232,50 @@ TEST_F(ErrorTextTest, TextsThatAreNoObjectOrDoNotScanGiveNoPosition) {
         EXPECT_EQ(beginMembers(status), nullptr) << text;
         EXPECT_STREQ(status.json, text);
     }
+}
+
+TEST_F(ErrorTextTest, DescribingAnErrorNeedsNothingOfCjson) {
+    const CjsonWithoutMemory shortage;
+    zeerr::setErrorWithInfo(status, zeerr::site::fifoNotFound, "errno: %d", 2);
+    EXPECT_EQ(CjsonWithoutMemory::requests, 0);
+    EXPECT_STREQ(status.json,
+                 R"({"error_constant":"zeoskerr_resourceNotFound","file":"tSharedFifo",)"
+                 R"("line":139,"component":"vantel_bc","additionalInfo":"errno: 2"})");
+    EXPECT_EQ(cJSON_Parse("{}"), nullptr);
+    EXPECT_GT(CjsonWithoutMemory::requests, 0);
+}
+
+TEST(ErrorTextPoolTest, TextIsFilledFromAFixedPool) {
+    requestedSizes.clear();
+    zeerr::Status status{0, 0, &poolResize, nullptr};
+    {
+        const CjsonWithoutMemory shortage;
+        zeerr::setError(status, zeerr::site::forkFailed, "pool");
+        EXPECT_EQ(CjsonWithoutMemory::requests, 0);
+    }
+    EXPECT_EQ(status.code, -52008);
+    EXPECT_EQ(status.json, pool);
+    EXPECT_STREQ(pool, R"({"error_constant":"zeoskerr_osFault","file":"tPtp4lTimeRef","line":70,)"
+                       R"("component":"vantel_bc","additionalInfo":"pool"})");
+    zeerr::release(status);
+    EXPECT_EQ(status.json, nullptr);
+    EXPECT_EQ(requestedSizes.back(), 0U);
+}
+
+TEST(ErrorTextPoolTest, PoolGrowsOnceAndThenTheTextStaysWithoutTheMember) {
+    requestedSizes.clear();
+    zeerr::Status status{0, 0, &poolResize, nullptr};
+    const CjsonWithoutMemory shortage;
+    Resizer resizer(status);
+    const std::string half(600, 'x');
+    char* position = beginMembers(status);
+    position = addString(position, "a", half, resizer);
+    ASSERT_NE(position, nullptr);
+    EXPECT_EQ(status.json, "{\"a\":\"" + half + "\"}");
+    EXPECT_EQ(addString(position, "b", half, resizer), nullptr);
+    EXPECT_EQ(status.json, "{\"a\":\"" + half + "\"}");
+    EXPECT_EQ(requestedSizes, (std::vector<std::uint32_t>{5, 1022, 2046}));
+    zeerr::release(status);
 }
 
 TEST_F(ErrorTextTest, DeepNestingScansOrIsRefused) {

@@ -110,7 +110,7 @@ TEST_P(PtpFetchMemoryTest, EveryAllocationThatFailsIsMemoryFull) {
         daemon.settle();
     }
     EXPECT_EQ(code, 0);
-    EXPECT_GT(allocations, 10);
+    EXPECT_GT(allocations, 3); // one for each list of ports, at least
     EXPECT_EQ(timeStatus.masterOffset, -42);
     EXPECT_NE(metaData, zekelVantel::tPtp4lMetaData());
 }

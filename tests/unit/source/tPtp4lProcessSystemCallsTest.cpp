@@ -131,6 +131,7 @@ protected:
 };
 
 TEST_F(PtpProcessHandlerTest, SignalThatEndsTheChildBeforeItsProgramIsNotHandled) {
+    writeFile("child.cfg", "exit 0");
     for (const int signal : {SIGUSR1, SIGUSR2, SIGINT, SIGHUP, SIGALRM, SIGTERM, SIGRTMIN}) {
         const Disposition handled(signal, &handler);
         signalToTheChild = signal;

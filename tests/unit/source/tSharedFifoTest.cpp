@@ -215,9 +215,9 @@ TEST_F(SharedFifoTest, NonOwnerReadsWhatTheOwnersPartyWrites) {
 
 TEST_F(SharedFifoTest, OctetsThatTheOwnerWritesArriveAtTheOtherEnd) {
     tSharedFifo owner(path, true, status);
-    EXPECT_EQ(owner.write("1234\0678", 8, status), 8);
+    EXPECT_EQ(owner.write("1234\000678", 8, status), 8);
     tSharedFifo other(path, false, status);
-    EXPECT_EQ(read(other), std::string("1234\0678", 8));
+    EXPECT_EQ(read(other), std::string("1234\000678", 8));
     EXPECT_EQ(owner.write("90", 2, status), 2);
     EXPECT_EQ(read(other), "90");
     EXPECT_EQ(status.code, 0);

@@ -1,24 +1,22 @@
 /// @file
 #pragma once
 
-#include <map>
 #include <string>
 #include <vector>
 
 #include <sys/types.h>
 
+#include "system/ManagementClient.h"
+
 /// linuxptp's ptp4l as a boundary clock on the interfaces that scripts/testbed.sh provides, and
 /// what linuxptp's own client says about it.
-class RealDaemonScene {
+class BoundaryClock {
 public:
-    /// One answer, as the client prints it: texts by the names of their fields.
-    using Report = std::map<std::string, std::string>;
-
     /// Starts the daemon and waits until it follows the grandmaster. Throws when it does not.
-    RealDaemonScene();
-    ~RealDaemonScene();
-    RealDaemonScene(const RealDaemonScene&) = delete;
-    RealDaemonScene& operator=(const RealDaemonScene&) = delete;
+    BoundaryClock();
+    ~BoundaryClock();
+    BoundaryClock(const BoundaryClock&) = delete;
+    BoundaryClock& operator=(const BoundaryClock&) = delete;
 
     /// Whether this process runs in scripts/testbed.sh.
     static bool isProvided();

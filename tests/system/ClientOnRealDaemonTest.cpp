@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "system/realDaemonReports.h"
+#include "system/ClientReports.h"
 #include "tPtpMgmtNode.h"
 #include "tUdsMsgInterface.h"
 
@@ -11,15 +11,15 @@ using namespace zekelVantel;
 
 namespace {
 
-using Report = RealDaemonScene::Report;
+using Report = Report;
 using Reports = std::vector<Report>;
 
 /// The exchanges with linuxptp's ptp4l, beside linuxptp's own client.
 class RealDaemonTest : public testing::Test {
 protected:
     static void SetUpTestSuite() {
-        if (RealDaemonScene::isProvided()) {
-            scene = std::make_unique<RealDaemonScene>();
+        if (BoundaryClock::isProvided()) {
+            scene = std::make_unique<BoundaryClock>();
         }
     }
     static void TearDownTestSuite() { scene.reset(); }
@@ -75,14 +75,14 @@ protected:
         FAIL() << "the daemon does not come to rest";
     }
 
-    static std::unique_ptr<RealDaemonScene> scene;
+    static std::unique_ptr<BoundaryClock> scene;
 
     tUdsMsgInterface interface;
     tUdsMsgAddress remote{""};
     tPtpMgmtNode node{tPtpPortIdentity(tPtpClockIdentity(), 1), 0};
 };
 
-std::unique_ptr<RealDaemonScene> RealDaemonTest::scene;
+std::unique_ptr<BoundaryClock> RealDaemonTest::scene;
 
 TEST_F(RealDaemonTest, TimeStatusIsWhatTheClientSays) {
     const PausedGrandmaster paused;

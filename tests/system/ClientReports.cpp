@@ -1,4 +1,4 @@
-#include "system/realDaemonReports.h"
+#include "system/ClientReports.h"
 
 #include <cinttypes>
 #include <cstdio>
@@ -46,7 +46,7 @@ std::string timestampingName(std::uint8_t kind) {
 
 } // namespace
 
-RealDaemonScene::Report reportOf(const tTimeStatus& data) {
+Report reportOf(const tTimeStatus& data) {
     constexpr double scale = 2199023255552.0; // 2^41
     const auto& change = data.lastGmPhaseChange;
     return {
@@ -63,7 +63,7 @@ RealDaemonScene::Report reportOf(const tTimeStatus& data) {
         {"gmIdentity", textOf(data.gmIdentity)}};
 }
 
-RealDaemonScene::Report reportOf(const tParentDataSet& data) {
+Report reportOf(const tParentDataSet& data) {
     const auto& quality = data.grandmasterClockQuality;
     return {
         {"parentPortIdentity", textOf(data.parentPortIdentity)},
@@ -80,7 +80,7 @@ RealDaemonScene::Report reportOf(const tParentDataSet& data) {
         {"grandmasterIdentity", textOf(data.grandmasterIdentity)}};
 }
 
-RealDaemonScene::Report reportOf(const tDefaultDataSet& data) {
+Report reportOf(const tDefaultDataSet& data) {
     const auto& quality = data.clockQuality;
     return {{"twoStepFlag", decimal(data.flags & 1)},
             {"slaveOnly", decimal(data.flags >> 1 & 1)},
@@ -94,7 +94,7 @@ RealDaemonScene::Report reportOf(const tDefaultDataSet& data) {
             {"domainNumber", decimal(data.domainNumber)}};
 }
 
-RealDaemonScene::Report reportOf(const tPortDataSet& data) {
+Report reportOf(const tPortDataSet& data) {
     return {{"portIdentity", textOf(data.portIdentity)},
             {"portState", portStateName(data.portState)},
             {"logMinDelayReqInterval", decimal(data.logMinDelayReqInterval)},
@@ -107,12 +107,12 @@ RealDaemonScene::Report reportOf(const tPortDataSet& data) {
             {"versionNumber", decimal(data.versionNumber)}};
 }
 
-RealDaemonScene::Report reportOf(const tPortDataSetNp& data) {
+Report reportOf(const tPortDataSetNp& data) {
     return {{"neighborPropDelayThresh", decimal(data.neighborPropDelayThresh)},
             {"asCapable", decimal(data.asCapable)}};
 }
 
-RealDaemonScene::Report reportOf(const tPortProperties& data) {
+Report reportOf(const tPortProperties& data) {
     return {{"portIdentity", textOf(data.portIdentity)},
             {"portState", portStateName(data.portState)},
             {"timestamping", timestampingName(data.timestamping)},

@@ -1,13 +1,9 @@
-#include "system/realDaemonScene.h"
+#include "system/BoundaryClock.h"
 
 #include <chrono>
 #include <csignal>
-#include <cstdio>
-#include <cstdlib>
 #include <fstream>
 #include <iterator>
-#include <memory>
-#include <sstream>
 #include <stdexcept>
 #include <thread>
 
@@ -16,34 +12,13 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-namespace {
+#include "system/Scene.h"
 
-std::string environment(const char* name) {
-    const char* const value = std::getenv(name);
-    return value == nullptr ? "" : value;
+bool BoundaryClock::isProvided() {
+    return !sceneInterfaces().empty();
 }
 
-std::string outputOf(const std::string& command) {
-    struct Closer {
-        void operator()(std::FILE* pipe) const { pclose(pipe); }
-    };
-    const std::unique_ptr<std::FILE, Closer> pipe(popen(command.c_str(), "re"));
-    std::string output;
-    char piece[4096];
-    for (std::size_t size = 1; pipe && size > 0;) {
-        size = std::fread(piece, 1, sizeof(piece), pipe.get());
-        output.append(piece, size);
-    }
-    return output;
-}
-
-} // namespace
-
-bool RealDaemonScene::isProvided() {
-    return !environment("TESTBED_INTERFACES").empty();
-}
-
-RealDaemonScene::RealDaemonScene() : folder_(environment("TESTBED_FOLDER")) {
+BoundaryClock::BoundaryClock() : folder_(sceneVariable("TESTBED_FOLDER")) {
     std::ofstream configuration(path("boundary.conf"));
     configuration << "[global]\n"
                      "network_transport UDPv4\n"
@@ -55,9 +30,9 @@ RealDaemonScene::RealDaemonScene() : folder_(environment("TESTBED_FOLDER")) {
                      "priority1 200\n"
                      "uds_address "
                   << socket() << '\n';
-    std::istringstream interfaces(environment("TESTBED_INTERFACES"));
-    for (std::string interface; interfaces >> interface; ++ports_) {
+    for (const std::string& interface : sceneInterfaces()) {
         configuration << '[' << interface << "]\n";
+        ++ports_;
     }
     configuration.close();
     start();
@@ -70,12 +45,12 @@ RealDaemonScene::RealDaemonScene() : folder_(environment("TESTBED_FOLDER")) {
     }
 }
 
-RealDaemonScene::~RealDaemonScene() {
+BoundaryClock::~BoundaryClock() {
     kill(daemon_, SIGTERM);
     waitpid(daemon_, nullptr, 0);
 }
 
-void RealDaemonScene::start() {
+void BoundaryClock::start() {
     std::string program = "/usr/sbin/ptp4l";
     std::string file = path("boundary.conf");
     std::string options[] = {program, "-S", "-m", "-q", "-f", file};
@@ -97,7 +72,7 @@ void RealDaemonScene::start() {
     }
 }
 
-void RealDaemonScene::waitUntilFollowing() {
+void BoundaryClock::waitUntilFollowing() {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(30);
     while (std::chrono::steady_clock::now() < deadline) {
         for (const Report& report : ask("TIME_STATUS_NP")) {
@@ -110,31 +85,17 @@ void RealDaemonScene::waitUntilFollowing() {
     throw std::runtime_error("the daemon does not follow the grandmaster:\n" + log());
 }
 
-std::string RealDaemonScene::log() const {
+std::string BoundaryClock::log() const {
     std::ifstream file(path("boundary.log"));
     return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
 }
 
-std::vector<RealDaemonScene::Report> RealDaemonScene::ask(const std::string& dataSet) const {
-    std::istringstream lines(
-        outputOf("/usr/sbin/pmc -u -b 0 -s " + socket() + " 'GET " + dataSet + "' 2>&1"));
-    std::vector<Report> reports;
-    for (std::string line; std::getline(lines, line);) {
-        std::istringstream words(line);
-        std::string name;
-        std::string value;
-        words >> name >> value;
-        if (line.find(" RESPONSE MANAGEMENT " + dataSet) != std::string::npos) {
-            reports.emplace_back();
-        } else if (!reports.empty()) {
-            reports.back()[name] = value;
-        }
-    }
-    return reports;
+std::vector<Report> BoundaryClock::ask(const std::string& dataSet) const {
+    return askDaemon(socket(), dataSet);
 }
 
 PausedGrandmaster::PausedGrandmaster()
-    : pid_(static_cast<pid_t>(std::stol(environment("TESTBED_GRANDMASTER_PID")))) {
+    : pid_(static_cast<pid_t>(std::stol(sceneVariable("TESTBED_GRANDMASTER_PID")))) {
     kill(pid_, SIGSTOP);
 }
 

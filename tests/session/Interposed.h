@@ -1,0 +1,43 @@
+/// @file
+/// Functions of the C library that stand in this program, between the plug-in and the system.
+#pragma once
+
+#include <ostream>
+#include <vector>
+
+#include <sys/types.h>
+
+struct SentSignal {
+    pid_t to;
+    int number;
+    bool operator==(const SentSignal& other) const {
+        return to == other.to && number == other.number;
+    }
+};
+
+/// For readable failures.
+void PrintTo(const SentSignal& sent, std::ostream* out);
+
+/// Every kill(2) of this process so far, or since they were last forgotten.
+std::vector<SentSignal> sentSignals();
+void forgetSentSignals();
+
+/// Lets thread creation fail while this object lives.
+class ThreadLimit {
+public:
+    /// @param allowed threads that can still be created.
+    explicit ThreadLimit(int allowed);
+    ~ThreadLimit();
+    ThreadLimit(const ThreadLimit&) = delete;
+    ThreadLimit& operator=(const ThreadLimit&) = delete;
+};
+
+/// Ends sleeps of a second and more while this object lives: the watchdog's, so that a test that is
+/// over need not wait for it.
+class ShortSleeps {
+public:
+    ShortSleeps();
+    ~ShortSleeps();
+    ShortSleeps(const ShortSleeps&) = delete;
+    ShortSleeps& operator=(const ShortSleeps&) = delete;
+};

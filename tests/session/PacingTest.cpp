@@ -1,0 +1,112 @@
+#include <algorithm>
+#include <memory>
+
+#include <gmock/gmock.h>
+
+#include "SessionFixture.h"
+
+namespace {
+
+using std::chrono::milliseconds;
+
+constexpr std::uint64_t ingressTime = 1700000000000000000;
+
+/// How long a poll of the simulated daemon takes is not known, so lower bounds are checked on each
+/// interval and upper bounds on the shortest of many.
+class PacingTest : public SessionTest {
+protected:
+    void beginAt(std::uint64_t microsecondsAfterIngress, const std::string& script = "") {
+        host.setTime(ingressTime + microsecondsAfterIngress * 1000);
+        begin("clock fixed 1700000000000000000\n" + script);
+    }
+
+    /// The intervals between calls of a function, but for the first ones.
+    std::vector<milliseconds> intervals(Function function, std::size_t skipped = 0) const {
+        const auto calls = host.calls(function);
+        std::vector<milliseconds> result;
+        for (std::size_t i = skipped + 1; i < calls.size(); ++i) {
+            result.push_back(
+                std::chrono::duration_cast<milliseconds>(calls[i].at - calls[i - 1].at));
+        }
+        return result;
+    }
+
+    milliseconds shortest(Function function, std::size_t skipped = 0) const {
+        const auto all = intervals(function, skipped);
+        return *std::min_element(all.begin(), all.end());
+    }
+};
+
+TEST_F(PacingTest, FirstPollComesAfterTheLongSleep) {
+    beginAt(112000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 1));
+    EXPECT_GE(host.calls(Function::getTime)[0].at - host.calls()[1].at, milliseconds(125));
+}
+
+TEST_F(PacingTest, PollsComeFastWhenASyncIsDue) {
+    beginAt(120000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 40));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(16));
+    EXPECT_LT(shortest(Function::getTime), milliseconds(60));
+}
+
+TEST_F(PacingTest, PollsAimAtTheNextSync) {
+    beginAt(60000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 20));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(68));
+    EXPECT_LT(shortest(Function::getTime), milliseconds(125));
+}
+
+TEST_F(PacingTest, PollsComeSlowlyRightAfterASync) {
+    beginAt(0);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+}
+
+TEST_F(PacingTest, PollsComeSlowlyWhenTheSyncIsOverdue) {
+    beginAt(200000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+}
+
+TEST_F(PacingTest, PollsComeSlowlyWhenTheHostIsBehindTheIngress) {
+    host.setTime(ingressTime - 1);
+    begin("clock fixed 1700000000000000000\n");
+    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+}
+
+TEST_F(PacingTest, FailedFetchKeepsTheShortSleep) {
+    beginAt(112000, "on TIME_STATUS_NP after 1 do length +1\n");
+    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 40));
+    // The first two are of start and of the good poll.
+    EXPECT_GE(shortest(Function::updateMetaData, 2), milliseconds(16));
+    EXPECT_LT(shortest(Function::updateMetaData, 2), milliseconds(60));
+}
+
+TEST_F(PacingTest, FailedFetchKeepsTheLongSleep) {
+    beginAt(0, "on TIME_STATUS_NP after 1 do length +1\n");
+    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 8));
+    EXPECT_GE(shortest(Function::updateMetaData, 2), milliseconds(125));
+}
+
+TEST_F(PacingTest, HostErrorBringsTheLongSleep) {
+    host.onCall([starter = std::this_thread::get_id()](const RecordingHost::Call& call,
+                                                       zeerr_Status& status) {
+        if (call.function == Function::updateMetaData && call.thread != starter) {
+            status.code = -1;
+        }
+    });
+    beginAt(112000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+}
+
+TEST_F(PacingTest, FailureOfTheFifoBringsTheLongSleep) {
+    fifo.reset();
+    beginAt(112000);
+    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+}
+
+} // namespace
