@@ -57,6 +57,8 @@ TEST_F(UdsMsgInterfaceTest, OpeningTwiceIsBusyAndChangesNothing) {
 }
 
 TEST_F(UdsMsgInterfaceTest, NoSocketIsReportedAsMemoryFullWithErrno) {
+    // UndefinedBehaviorSanitizer needs a descriptor when it first looks at the object.
+    ASSERT_FALSE(interface.isOpen());
     const int lowestFree = dup(STDERR_FILENO);
     ASSERT_EQ(close(lowestFree), 0);
     {
