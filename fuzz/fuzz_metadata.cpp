@@ -99,8 +99,8 @@ tPtp4lMetaData metaDataOf(const Situation& situation) {
     for (const Port& port : situation.ports) {
         dataSets.push_back(read<tPtp4lPortDataSetMgmtTlv>(port.dataSet));
         dataSetsNp.push_back(read<tPtp4lPortDataSetNpMgmtTlv>(port.np));
-        Octets octets(12);
-        octets.push_back(static_cast<std::uint8_t>(port.interface.size()));
+        Octets octets(13);
+        octets[12] = static_cast<std::uint8_t>(port.interface.size());
         octets.insert(octets.end(), port.interface.begin(), port.interface.end());
         properties.push_back(read<tPtp4lPortPropertiesMgmtTlv>(octets));
     }

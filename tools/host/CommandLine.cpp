@@ -126,7 +126,7 @@ std::variant<int, RunOptions, SchemaOptions> readCommandLine(int argc, const cha
 
     RunOptions runOptions;
     auto& run = *app.add_subcommand("run", "Run the plug-in and show what it reports");
-    addLibrary(run, runOptions.library);
+    addLibrary(run, runOptions.pluginPath);
     addSettings(run, runOptions);
     addBehaviour(run, runOptions);
     addFifo(run, runOptions);
@@ -134,7 +134,7 @@ std::variant<int, RunOptions, SchemaOptions> readCommandLine(int argc, const cha
 
     SchemaOptions schemaOptions;
     auto& schema = *app.add_subcommand("schema", "Show the plug-in's parameters");
-    addLibrary(schema, schemaOptions.library);
+    addLibrary(schema, schemaOptions.pluginPath);
     schema.add_flag("--json", schemaOptions.raw, "Show the schema's own text");
 
     try {

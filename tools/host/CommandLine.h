@@ -16,7 +16,7 @@ struct TimedOffset {
 };
 
 struct RunOptions {
-    std::string library = "libvantel_bc.so.19";
+    std::string pluginPath = "libvantel_bc.so.19";
     std::string configFile; ///< "-" is the standard input; empty when there is none
     std::vector<std::string> assignments;
     std::vector<std::string> interfaces;
@@ -32,7 +32,7 @@ struct RunOptions {
 };
 
 struct SchemaOptions {
-    std::string library = "libvantel_bc.so.19";
+    std::string pluginPath = "libvantel_bc.so.19";
     bool raw = false;
 };
 

@@ -47,8 +47,8 @@ int Run::execute() {
 }
 
 void Run::session() {
-    const PlugIn plugIn(options_.library);
-    journal_.note(loadedEvent(options_.library, plugIn.name(), plugIn.apiVersion()));
+    const PlugIn plugIn(options_.pluginPath);
+    journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
     Schema schema;
     if (!readSchema(plugIn, schema)) {
         return;

@@ -55,7 +55,7 @@ std::string schemaTable(const Schema& schema) {
 }
 
 int showSchema(const SchemaOptions& options) {
-    const PlugIn plugIn(options.library);
+    const PlugIn plugIn(options.pluginPath);
     HostStatus status;
     const std::string text = plugIn.schema(status);
     if (status.isError()) {

@@ -28,7 +28,7 @@ RunOptions run(std::vector<const char*> words) {
 
 TEST(CommandLine, DefaultsOfRun) {
     const auto options = run({});
-    EXPECT_EQ(options.library, "libvantel_bc.so.19");
+    EXPECT_EQ(options.pluginPath, "libvantel_bc.so.19");
     EXPECT_EQ(options.configFile, "");
     EXPECT_EQ(options.seconds, std::nullopt);
     EXPECT_EQ(options.fifo, "/tmp/quillEpochOffset");
@@ -41,7 +41,7 @@ TEST(CommandLine, AllOptionsOfRun) {
         run({"--library", "l.so", "--config", "-", "--set", "a=1", "--set", "b=x,y", "--interface",
              "eth0", "--interface", "eth1", "--seconds", "2.5", "--json", "--create-fifo", "--fifo",
              "f", "--refuse-while-stopping"});
-    EXPECT_EQ(options.library, "l.so");
+    EXPECT_EQ(options.pluginPath, "l.so");
     EXPECT_EQ(options.configFile, "-");
     EXPECT_THAT(options.assignments, ElementsAre("a=1", "b=x,y"));
     EXPECT_THAT(options.interfaces, ElementsAre("eth0", "eth1"));
@@ -72,7 +72,7 @@ TEST(CommandLine, TimedOffsetsComeInTheOrderOfTheirTimes) {
 
 TEST(CommandLine, OptionsOfSchema) {
     const auto options = std::get<SchemaOptions>(read({"schema", "--library", "l", "--json"}));
-    EXPECT_EQ(options.library, "l");
+    EXPECT_EQ(options.pluginPath, "l");
     EXPECT_TRUE(options.raw);
 }
 

@@ -14,7 +14,7 @@ using zekelVantel::tPtp4lMetaData;
 namespace {
 
 std::string twoDigits(unsigned octet) {
-    char text[3];
+    char text[16];
     std::snprintf(text, sizeof(text), "%02X", octet & 0xffU);
     return text;
 }

@@ -62,7 +62,8 @@ public:
         action.sa_handler = [](int) {};
         sigaction(SIGALRM, &action, &before_);
         itimerval timer{};
-        timer.it_value.tv_usec = std::chrono::microseconds(delay).count();
+        timer.it_value.tv_usec =
+            static_cast<decltype(timer.it_value.tv_usec)>(std::chrono::microseconds(delay).count());
         setitimer(ITIMER_REAL, &timer, nullptr);
     }
     ~AlarmAfter() {
