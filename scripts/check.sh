@@ -40,8 +40,7 @@ cmake --preset "$preset"
 cmake --build --preset "$preset" -j "$jobs"
 
 status=0
-# Many tests wait for a daemon more than they work.
-ctest --preset "$preset" -j "$((2 * jobs))" | tee "$log" || status=$?
+ctest --preset "$preset" -j "$jobs" | tee "$log" || status=$?
 if ! count=$(grep '% tests passed' "$log"); then
   echo "check: no test ran; see the messages above" >&2
   exit 1
