@@ -3,6 +3,7 @@
 #include <array>
 #include <initializer_list>
 #include <tuple>
+#include <utility>
 
 #include "errors/ErrorText.h"
 #include "errors/Exception.h"
