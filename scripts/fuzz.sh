@@ -5,6 +5,9 @@
 # --minimise adds to fuzz/corpus what reaches more than the inputs there that have a name, and no more.
 set -euo pipefail
 cd "$(dirname "$0")/.."
+# Targets may work in a folder of their own.
+corpora=$PWD/fuzz/corpus
+work=$PWD/build/fuzz/work
 
 minimise=no
 if [[ ${1-} == --minimise ]]; then
@@ -18,17 +21,15 @@ if ! [[ $seconds =~ ^[1-9][0-9]*$ ]]; then
   exit 2
 fi
 if [[ ${#targets[@]} -eq 0 ]]; then
-  targets=(fuzz/corpus/*)
+  targets=("$corpora"/*)
   targets=("${targets[@]##*/}")
 fi
-work=build/fuzz/work
-
 # One target. libFuzzer ends at its first finding, and leaves the input in findings/.
 fuzz() { # target
   local target=$1 status=0
   mkdir -p "$work/corpus/$target" "$work/findings"
   build/fuzz/fuzz/"$target" -max_total_time="$seconds" -timeout=10 -print_final_stats=1 \
-    -artifact_prefix="$work/findings/$target-" "$work/corpus/$target" "fuzz/corpus/$target" \
+    -artifact_prefix="$work/findings/$target-" "$work/corpus/$target" "$corpora/$target" \
     >"$work/$target.log" 2>&1 </dev/null || status=$?
   echo "$status" >"$work/$target.status"
   echo "fuzz: $target has ended"
@@ -56,7 +57,7 @@ report_coverage() {
   cmake --build --preset coverage -j "$(nproc)" --target "${targets[@]}" -- --quiet
   find build/coverage -name '*.gcda' -delete
   for target in "${targets[@]}"; do
-    build/coverage/fuzz/"$target" "fuzz/corpus/$target" >/dev/null
+    build/coverage/fuzz/"$target" "$corpora/$target" >/dev/null
     build/coverage/fuzz/"$target" "$work/corpus/$target" >/dev/null
   done
   printf '\nlines of the library that these inputs reach:\n'
@@ -66,7 +67,7 @@ report_coverage() {
 }
 
 minimise_corpus() { # target
-  local target=$1 corpus=fuzz/corpus/$1 merged=$work/merged/$1
+  local target=$1 corpus=$corpora/$1 merged=$work/merged/$1
   rm -rf "$merged"
   mkdir -p "$merged"
   # Those that have a name stay, whatever they reach.

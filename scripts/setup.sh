@@ -10,7 +10,8 @@ build=(cmake ninja-build g++ pkg-config libcjson-dev libboost-dev nlohmann-json3
   libfmt-dev)
 daemon=(linuxptp iproute2 util-linux procps)
 tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales)
-checks=(clang libclang-rt-14-dev clang-format-14 clang-tidy-14 gcovr shellcheck)
+checks=(clang libclang-rt-14-dev clang-format-14 clang-tidy-14 gcovr shellcheck
+  valgrind)
 armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
   libcjson-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
   libbenchmark-dev:armhf)

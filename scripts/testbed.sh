@@ -22,6 +22,8 @@ The command finds /run private and empty, and in its environment:
   TESTBED_GRANDMASTER_PID  process id of the grandmaster; empty with --no-grandmaster
   TESTBED_FOLDER           a folder for its files, removed afterwards; holds the daemons' logs
 
+TESTBED_LAUNCHER, if set, is a program with arguments that runs the command, such as valgrind.
+
 The exit status is the command's. It is 77, after one line "SKIPPED: reason", where namespaces are
 not allowed or linuxptp is not installed. An interrupt (Ctrl-C) reaches the command, which ends in
 its own time; any other end of this script takes the command with it.
@@ -170,7 +172,7 @@ wait_until_ready() {
 }
 
 run_inside() {
-    local interfaces=(bc0) port status=0
+    local interfaces=(bc0) launcher port status=0
     mount_private
     ip link set lo up
     : >/run/netns/grandmaster
@@ -200,7 +202,8 @@ run_inside() {
     fi
     # This shell is the first process of its namespace: when it exits, the kernel ends the others.
     trap : INT
-    "$@" || status=$?
+    read -ra launcher <<<"${TESTBED_LAUNCHER-}"
+    "${launcher[@]}" "$@" || status=$?
     exit "$status"
 }
 
