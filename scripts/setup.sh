@@ -1,20 +1,23 @@
 #!/usr/bin/env bash
 # Installs the Debian packages of the named groups (default: tests), if any is missing.
-#   tests   build the library and its tools, run the tests
-#   demo    build, and run the plug-in with the real daemon
-#   checks  clang, format and tidy checks, as CI runs them
-#   armhf   what tests needs, for 32-bit ARM under emulation
+#   tests     build the library and its tools, run the tests
+#   demo      build, and run the plug-in with the real daemon
+#   checks    clang, format and tidy checks, as CI runs them
+#   armhf     what tests needs, for 32-bit ARM under emulation
+#   packages  build Debian packages, check and install them
 set -euo pipefail
 
 build=(cmake ninja-build g++ pkg-config libcjson-dev libboost-dev nlohmann-json3-dev libcli11-dev
-  libfmt-dev)
+  libfmt-dev systemtap-sdt-dev)
 daemon=(linuxptp iproute2 util-linux procps)
-tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales)
+tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
+  chrony)
 checks=(clang libclang-rt-14-dev clang-format-14 clang-tidy-14 gcovr shellcheck
   valgrind)
 armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
   libcjson-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
   libbenchmark-dev:armhf)
+debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap uidmap)
 
 packages=()
 for group in "${@:-tests}"; do
@@ -23,8 +26,9 @@ for group in "${@:-tests}"; do
     demo) packages+=("${build[@]}" "${daemon[@]}") ;;
     checks) packages+=("${checks[@]}") ;;
     armhf) packages+=("${armhf[@]}") ;;
+    packages) packages+=("${debs[@]}") ;;
     *)
-      echo "usage: $0 [tests|demo|checks|armhf]..." >&2
+      echo "usage: $0 [tests|demo|checks|armhf|packages]..." >&2
       exit 2
       ;;
   esac

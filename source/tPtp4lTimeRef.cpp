@@ -8,6 +8,7 @@
 
 #include "errors/Exception.h"
 #include "paths.h"
+#include "probes.h"
 
 namespace zekelVantel {
 namespace {
@@ -109,6 +110,7 @@ void tPtp4lTimeRef::runWorker() {
 }
 
 void tPtp4lTimeRef::runPass() {
+    probeSleep(history_.sleep);
     std::this_thread::sleep_for(std::chrono::microseconds(history_.sleep));
     tTimeStatus timeStatus;
     tPtp4lMetaData metaData;
@@ -170,6 +172,7 @@ void tPtp4lTimeRef::drainEpochOffsets() {
             break;
         }
     }
+    probeOffsets(octets, static_cast<std::int64_t>(history_.epochOffset));
     // [oddity no-fifo-no-pairs] A missing FIFO is an error: without the epoch, a pair would be
     // wrong.
     if (status.code != zeerr::code::endOfData) {

@@ -49,6 +49,7 @@ void tPtpMgmtNode::getSingle(iMsgInterface& interface, const iMsgAddress& remote
                              tPtpMgmtTlv& tlv, zeerr::Status& status) {
     tPtpMgmtMsg message;
     tMsgBuffer buffer;
+    const tExchangeProbe exchange(tlv.managementId(), sequenceId_, status);
     const std::uint32_t expected = message.size() + tlv.size();
     request(interface, remoteAddress, buffer, message, tlv, tPadOctet::uncounted, status);
     receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "iMsgInterface.h"
+#include "probes.h"
 #include "tPtpMgmtMsg.h"
 #include "tPtpMgmtTlv.h"
 
@@ -80,6 +81,7 @@ void tPtpMgmtNode::getFromPorts(iMsgInterface& interface, const iMsgAddress& rem
     tPtpMgmtMsg message;
     tMsgBuffer buffer;
     Tlv tlv;
+    const tExchangeProbe exchange(tlv.managementId(), sequenceId_, status);
     const std::uint32_t expected = message.size() + tlv.size();
     request(interface, remoteAddress, buffer, message, tlv, padOctet, status);
     answers.reserve(std::min(count, usualPorts));
