@@ -47,8 +47,9 @@ void tSharedFifo::open(zeerr::Status& status) {
         return;
     }
     // [oddity fifo-ends] The owner opens for writing too: its end then never reads as if the other
-    // had gone.
-    const int descriptor = ::open(path_.c_str(), (owner_ ? O_RDWR : O_RDONLY) | O_NONBLOCK);
+    // had gone. A terminal that a stranger put at the path must not become the host's.
+    const int descriptor =
+        ::open(path_.c_str(), (owner_ ? O_RDWR : O_RDONLY) | O_NONBLOCK | O_NOCTTY);
     if (descriptor < 0) {
         const zeerr::ErrnoText error;
         const zeerr::ErrorSite& site =

@@ -5,6 +5,7 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include "errors/Trace.h"
@@ -118,6 +119,44 @@ TEST_F(SharedFifoFailuresTest, RegularFileAtThePathIsReadLikeOne) {
     EXPECT_EQ(read(fifo), 1);
     EXPECT_EQ(read(fifo), 0);
     EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(SharedFifoFailuresTest, SymbolicLinkIsFollowed) {
+    const std::int64_t value = 7;
+    writeFile("elsewhere", {reinterpret_cast<const char*>(&value), sizeof(value)});
+    ASSERT_EQ(symlink("elsewhere", "./fifo"), 0);
+    tSharedFifo fifo("./fifo", false, status);
+    std::int64_t read = 0;
+    EXPECT_EQ(fifo.read(&read, sizeof(read), status), 8);
+    EXPECT_EQ(read, 7);
+}
+
+/// Opens a terminal as a FIFO, as a daemon does that leads a session without a terminal.
+/// @return whether the process has a terminal then.
+bool getsATerminal(const std::string& terminal) {
+    const pid_t daemon = fork();
+    if (daemon == 0) {
+        setsid();
+        zeerr::LocalStatus status;
+        tSharedFifo fifo(terminal, false, status);
+        fifo.open(status);
+        const bool opened = fifo.isOpen();
+        _exit(!opened ? 2 : ::open("/dev/tty", O_RDWR) >= 0 ? 1 : 0);
+    }
+    int result = 0;
+    EXPECT_EQ(waitpid(daemon, &result, 0), daemon);
+    EXPECT_NE(WEXITSTATUS(result), 2) << "not opened";
+    return WEXITSTATUS(result) == 1;
+}
+
+TEST_F(SharedFifoFailuresTest, TerminalAtThePathDoesNotBecomeTheHosts) {
+    const zekelVantel::tFileDescriptor master(posix_openpt(O_RDWR | O_NOCTTY));
+    if (!master.isOpen() || grantpt(master.get()) != 0 || unlockpt(master.get()) != 0) {
+        GTEST_SKIP() << "no pseudo-terminals here";
+    }
+    char terminal[64];
+    ASSERT_EQ(ptsname_r(master.get(), terminal, sizeof(terminal)), 0);
+    EXPECT_FALSE(getsATerminal(terminal));
 }
 
 TEST_F(SharedFifoFailuresTest, StatusWithAnErrorCreatesNothing) {
