@@ -39,6 +39,21 @@ TEST_F(ProtocolConfigFileTest, ExistingFileIsReplaced) {
     EXPECT_EQ(written(), first);
 }
 
+TEST_F(ProtocolConfigFileTest, ExistingFileKeepsItsPermissions) {
+    writeFile("ptp4l_bc.conf", "");
+    std::filesystem::permissions("ptp4l_bc.conf", std::filesystem::perms(0666));
+    read();
+    EXPECT_EQ(mode("ptp4l_bc.conf"), mode_t{S_IFREG | 0666});
+}
+
+TEST_F(ProtocolConfigFileTest, SymbolicLinkIsFollowed) {
+    writeFile("target", "another's");
+    std::filesystem::create_symlink("target", "ptp4l_bc.conf");
+    read();
+    EXPECT_TRUE(std::filesystem::is_symlink("ptp4l_bc.conf"));
+    EXPECT_EQ(readFile("target").substr(0, 9), "[global]\n");
+}
+
 TEST_F(ProtocolConfigFileTest, EachReadingStartsFromAFreshTemplate) {
     read();
     set("priority1", "7");

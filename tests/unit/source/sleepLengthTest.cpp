@@ -15,6 +15,10 @@ constexpr std::uint64_t second = 1000000000;
 /// A time that no arithmetic on 32 bits could keep.
 constexpr std::uint64_t someTime = 1700000000123456789;
 
+// The last nanosecond whose seconds have so many bits: in 2038, in 2106.
+constexpr std::uint64_t lastOf31Bits = 2147483647999999999;
+constexpr std::uint64_t lastOf32Bits = 4294967295999999999;
+
 struct Row {
     const char* name;
     std::uint64_t elapsed; ///< ns; from 2^63 on: the host's time is before the Sync
@@ -28,8 +32,8 @@ void PrintTo(const Row& row, std::ostream* out) {
 class SleepLengthTest : public testing::TestWithParam<Row> {};
 
 TEST_P(SleepLengthTest, FollowsFromTheTimeSinceTheSync) {
-    for (const std::uint64_t ingressTime :
-         {std::uint64_t{0}, someTime, std::uint64_t{UINT64_MAX}, std::uint64_t{1} << 63}) {
+    for (const std::uint64_t ingressTime : {std::uint64_t{0}, someTime, lastOf31Bits, lastOf32Bits,
+                                            std::uint64_t{UINT64_MAX}, std::uint64_t{1} << 63}) {
         EXPECT_EQ(sleepLength(ingressTime + GetParam().elapsed, ingressTime), GetParam().expected)
             << ingressTime;
     }

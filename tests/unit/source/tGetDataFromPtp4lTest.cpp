@@ -80,6 +80,14 @@ TEST_F(PtpFetchTest, ThreePortsGiveThreeEntries) {
               std::string(jsonOfTheClocks) + jsonOfPort1 + jsonOfPorts2And3 + "}");
 }
 
+TEST_F(PtpFetchTest, TenThousandPortsAreTaken) {
+    daemon.setPorts(10000);
+    EXPECT_EQ(fetch(), 0);
+    const std::string json = metaData.toJson();
+    EXPECT_NE(json.find("\"Port10000\":{"), std::string::npos);
+    EXPECT_LT(json.size(), 10000U * 200);
+}
+
 TEST_F(PtpFetchTest, NoPortsMeanNoReceivesAndNoEntries) {
     daemon.setPorts(0);
     ASSERT_EQ(fetch(), 0);

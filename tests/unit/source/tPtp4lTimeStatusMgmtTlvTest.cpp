@@ -54,6 +54,28 @@ TEST(Ptp4lTimeStatusMgmtTlvTest, AnswerOfTheRealDaemonIsRead) {
     EXPECT_EQ(serialized(tlv), answer);
 }
 
+TEST(Ptp4lTimeStatusMgmtTlvTest, TimesBeyond32BitsOfSecondsAreKeptToTheNanosecond) {
+    struct Row {
+        const char* octets;
+        std::int64_t time;
+    };
+    // The last nanosecond of 31 and of 32 bits of seconds, the first ones after them, and the last
+    // of all: 2038, 2106, 2262.
+    for (const auto& row :
+         {Row{"1DCD64FFFFFFFFFF", 2147483647999999999},
+          Row{"1DCD650000000000", 2147483648000000000},
+          Row{"3B9AC9FFFFFFFFFF", 4294967295999999999},
+          Row{"3B9ACA0000000001", 4294967296000000001}, Row{"7FFFFFFFFFFFFFFF", INT64_MAX}}) {
+        const Octets answer = octets(std::string("0001 0034 C000") + row.octets + row.octets +
+                                     "00000000 00000000 0000 000000000000000000000000 00000001"
+                                     "a65c12fffe175c7d");
+        const auto tlv = readFrom<tPtp4lTimeStatusMgmtTlv>(answer);
+        EXPECT_EQ(tlv.masterOffset(), row.time);
+        EXPECT_EQ(tlv.ingressTime(), row.time);
+        EXPECT_EQ(serialized(tlv), answer);
+    }
+}
+
 TEST(Ptp4lTimeStatusMgmtTlvTest, DataCutAnywhereKeepsWhatWasReadBefore) {
     expectEachFieldAsItIsRead<tPtp4lTimeStatusMgmtTlv>(before, next,
                                                        {2, 4, 6, 14, 22, 26, 30, 32, 44, 48, 56});

@@ -29,6 +29,16 @@ TEST_F(PtpMgmtNodeExchangeTest, CountZeroReceivesNothing) {
     EXPECT_EQ(queued(), portNpAnswer(1));
 }
 
+TEST_F(PtpMgmtNodeExchangeTest, NoMemoryIsTakenForPortsThatAreOnlyClaimed) {
+    answer(portNpAnswer(1));
+    answer(first(1, portAnswer));
+    std::vector<tPortDataSetNp> answers;
+    node.getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(interface, remoteAddress, 65535, answers, status);
+    EXPECT_EQ(status.code, -52012);
+    EXPECT_EQ(answers.size(), 1U);
+    EXPECT_LE(answers.capacity(), 64U);
+}
+
 TEST_F(PtpMgmtNodeExchangeTest, PortAnswerOneOctetShortEndsInTheBuffer) {
     answer(first(79, portAnswer));
     EXPECT_EQ(countFromPorts<tPtp4lPortDataSetMgmtTlv>(1), 0U);

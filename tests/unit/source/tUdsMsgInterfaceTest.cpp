@@ -1,9 +1,11 @@
 #include "tUdsMsgInterface.h"
 
 #include <filesystem>
+#include <utility>
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include "support/DatagramSocket.h"
@@ -103,6 +105,27 @@ TEST_F(UdsMsgInterfaceTest, StaleSocketFileIsReplaced) {
     interface.open(local, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_TRUE(interface.isOpen());
+}
+
+TEST_F(UdsMsgInterfaceTest, SymbolicLinkIsReplacedAndItsTargetStays) {
+    writeFile("target", "another's");
+    std::filesystem::create_symlink("target", local);
+    interface.open(local, status);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_FALSE(std::filesystem::is_symlink(local));
+    interface.close();
+    EXPECT_EQ(readFile("target"), "another's");
+}
+
+TEST_F(UdsMsgInterfaceTest, SocketIsAsOpenToOthersAsTheMaskOfTheProcessSays) {
+    const mode_t before = umask(0);
+    for (const auto& [mask, mode] : {std::pair(022U, 0755U), {077U, 0700U}}) {
+        umask(mask);
+        interface.open(local, status);
+        EXPECT_EQ(std::filesystem::status(local).permissions(), std::filesystem::perms(mode));
+        interface.close();
+    }
+    umask(before);
 }
 
 TEST_F(UdsMsgInterfaceTest, LocalPathOf200CharactersIsBoundUnderItsFirst107) {
