@@ -116,7 +116,7 @@ void writeFile(const std::string& path, const std::string& text) {
         const ssize_t count = write(file.get(), text.data() + written, text.size() - written);
         if (count > 0) {
             written += static_cast<std::size_t>(count);
-        } else if (errno != EINTR) {
+        } else if (count == 0 || errno != EINTR) {
             return;
         }
     }

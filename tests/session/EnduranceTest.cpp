@@ -50,6 +50,7 @@ void expectConstant(const Holdings& before, int cycles) {
 class EnduranceTest : public testing::Test {
 protected:
     static void runSession() {
+        const FormerThreads threads;
         forgetSentSignals();
         const SyslogCapture log;
         const RecordingHost host;

@@ -1,11 +1,8 @@
-#include <atomic>
 #include <filesystem>
 #include <numeric>
-#include <thread>
 
 #include <gmock/gmock.h>
 #include <sys/stat.h>
-#include <syslog.h>
 
 #include "SessionFixture.h"
 
@@ -13,7 +10,6 @@ namespace {
 
 using testing::Each;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 constexpr char noFifo[] = "Unable to call into KEL in vantel, got error: -52006";
 constexpr char badFifo[] = "Unable to call into KEL in vantel, got error: -52008";
@@ -40,24 +36,6 @@ protected:
         return offsets;
     }
 };
-
-TEST_F(EpochFifoTest, AbsentGivesNoPairAndAnErrorForEachMeasurement) {
-    beginMeasuring();
-    ASSERT_TRUE(waitForLog(noFifo, 3));
-    EXPECT_THAT(host.calls(Function::adjustTime), IsEmpty());
-    for (const auto& line : log.lines()) {
-        if (line.text == noFifo) {
-            EXPECT_EQ(line.priority, LOG_ERR);
-        }
-    }
-    EXPECT_FALSE(std::filesystem::exists(EpochFifo::path));
-}
-
-TEST_F(EpochFifoTest, AbsentEndsEachPassBeforeItsMetadata) {
-    begin("clock fixed 1000\n");
-    ASSERT_TRUE(waitForLog(noFifo, 3));
-    EXPECT_EQ(metaData().size(), 1U);
-}
 
 TEST_F(EpochFifoTest, CreatedLaterBringsThePairThatWasMissed) {
     begin("clock fixed 1000\n");
@@ -140,45 +118,6 @@ TEST_F(EpochFifoTest, FullPipeIsReadToItsEnd) {
     beginMeasuring();
     ASSERT_TRUE(waitForCalls(Function::adjustTime, 1));
     EXPECT_EQ(epochs().at(0), 8192);
-}
-
-TEST_F(EpochFifoTest, WriterThatNeverPausesCannotHoldTheWorker) {
-    // Always has eight octets more.
-    std::filesystem::create_symlink("/dev/zero", EpochFifo::path);
-    beginMeasuring();
-    EXPECT_TRUE(waitForCalls(Function::adjustTime, 3));
-}
-
-TEST_F(EpochFifoTest, BusyWriterIsServed) {
-    fifo.emplace();
-    std::atomic<bool> done{false};
-    std::thread writer([&] {
-        while (!done) {
-            if (fifo->queued() < 32768) {
-                fifo->write({77});
-            }
-        }
-    });
-    beginMeasuring();
-    EXPECT_TRUE(waitForCalls(Function::adjustTime, 3));
-    done = true;
-    writer.join();
-    EXPECT_EQ(epochs().at(2), 77);
-}
-
-TEST_F(EpochFifoTest, RegularFileIsReadLikeAFifo) {
-    const std::int64_t values[] = {11, 12};
-    writeFile(EpochFifo::path, {reinterpret_cast<const char*>(values), sizeof(values)});
-    beginMeasuring();
-    ASSERT_TRUE(waitForCalls(Function::adjustTime, 2));
-    EXPECT_THAT(epochs(), Each(12));
-}
-
-TEST_F(EpochFifoTest, FolderInItsPlaceIsAnError) {
-    std::filesystem::create_directory(EpochFifo::path);
-    beginMeasuring();
-    ASSERT_TRUE(waitForLog(badFifo, 3));
-    EXPECT_THAT(host.calls(Function::adjustTime), IsEmpty());
 }
 
 TEST_F(EpochFifoTest, InitialiseDoesNotTouchThePath) {

@@ -103,11 +103,6 @@ TEST_F(FetchFailureTest, ErrorAnswer) {
     expectThirdPollFails(-52012);
 }
 
-TEST_F(FetchFailureTest, LostAnswerOfOnePort) {
-    begin("on PORT_DATA_SET after 2 times 1 do drop 2\n", R"(["eth0","eth1"])");
-    expectThirdPollFails(-52007);
-}
-
 TEST_F(FetchFailureTest, LongerAnswerOfAPortIsNone) {
     begin("on PORT_DATA_SET do length +1\n", R"(["eth0"])");
     ASSERT_TRUE(waitForCalls(Function::getTime, 2));
@@ -153,14 +148,6 @@ TEST_F(FetchFailureTest, SomethingAtThePathOfTheSocketIsReplaced) {
     EXPECT_TRUE(waitForCalls(Function::getTime, 1));
     EXPECT_TRUE(std::filesystem::is_socket(socketPath()));
     EXPECT_EQ(log.count(failureLine(-52006)), 0);
-}
-
-TEST_F(FetchFailureTest, FolderAtThePathOfTheSocket) {
-    std::filesystem::create_directory(socketPath());
-    begin("gm present\n");
-    ASSERT_TRUE(waitForLog(failureLine(-52006), 2));
-    std::filesystem::remove(socketPath());
-    EXPECT_TRUE(waitForCalls(Function::getTime, 1));
 }
 
 } // namespace

@@ -19,7 +19,7 @@ protected:
         std::thread([this] { session.finalise(); }).detach();
         const std::size_t calls = host.calls(Function::getTime).size();
         good = good && waitForCalls(Function::getTime, calls + 10);
-        good = good && *session.slot() != nullptr && threadCount() == threadsBefore + 3;
+        good = good && *session.slot() != nullptr && threadCount() == threadsBefore.count() + 3;
         _exit(good ? 0 : 1);
     }
 };

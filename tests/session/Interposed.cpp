@@ -1,5 +1,6 @@
 #include "Interposed.h"
 
+#include <algorithm>
 #include <atomic>
 #include <cerrno>
 #include <chrono>
@@ -15,12 +16,18 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
+#include "support/OwnAllocations.h"
+
 // A sanitizer's, when there is one: it must know of every thread.
 extern "C" [[gnu::weak]] int __interceptor_pthread_create(pthread_t* thread,
                                                           const pthread_attr_t* attributes,
                                                           void* (*start)(void*), void* argument);
 
 namespace {
+
+constexpr long beforeFirstPoll = 125000000;
+
+thread_local std::chrono::nanoseconds oversleptByThisThread{0};
 
 constexpr int unlimited = std::numeric_limits<int>::max();
 
@@ -40,6 +47,7 @@ struct Sleeps {
     std::mutex mutex;
     std::condition_variable changed;
     bool areShort = false;
+    bool areHeld = false;
 };
 
 Sleeps& sleeps() {
@@ -65,6 +73,7 @@ extern "C" {
 
 [[gnu::visibility("default")]] int kill(pid_t pid, int number) noexcept {
     {
+        const OwnAllocations own;
         const std::lock_guard<std::mutex> lock(signals().mutex);
         signals().sent.push_back({pid, number});
     }
@@ -73,7 +82,17 @@ extern "C" {
 
 [[gnu::visibility("default")]] int nanosleep(const timespec* duration, timespec* rest) {
     if (duration->tv_sec == 0) {
-        return static_cast<int>(syscall(SYS_nanosleep, duration, rest));
+        if (duration->tv_nsec == beforeFirstPoll) {
+            std::unique_lock<std::mutex> lock(sleeps().mutex);
+            sleeps().changed.wait(lock, [] { return !sleeps().areHeld; });
+        }
+        const auto end =
+            std::chrono::steady_clock::now() + std::chrono::nanoseconds(duration->tv_nsec);
+        const int result = static_cast<int>(syscall(SYS_nanosleep, duration, rest));
+        oversleptByThisThread +=
+            std::max(std::chrono::nanoseconds(0),
+                     std::chrono::nanoseconds(std::chrono::steady_clock::now() - end));
+        return result;
     }
     std::unique_lock<std::mutex> lock(sleeps().mutex);
     sleeps().changed.wait_for(
@@ -107,6 +126,10 @@ void forgetSentSignals() {
     signals().sent.clear();
 }
 
+std::chrono::nanoseconds overslept() {
+    return oversleptByThisThread;
+}
+
 ThreadLimit::ThreadLimit(int allowed) {
     threadsAllowed = allowed;
 }
@@ -124,4 +147,15 @@ ShortSleeps::ShortSleeps() {
 ShortSleeps::~ShortSleeps() {
     const std::lock_guard<std::mutex> lock(sleeps().mutex);
     sleeps().areShort = false;
+}
+
+HeldPolls::HeldPolls() {
+    const std::lock_guard<std::mutex> lock(sleeps().mutex);
+    sleeps().areHeld = true;
+}
+
+HeldPolls::~HeldPolls() {
+    const std::lock_guard<std::mutex> lock(sleeps().mutex);
+    sleeps().areHeld = false;
+    sleeps().changed.notify_all();
 }

@@ -2,6 +2,7 @@
 /// Functions of the C library that stand in this program, between the plug-in and the system.
 #pragma once
 
+#include <chrono>
 #include <ostream>
 #include <vector>
 
@@ -22,6 +23,10 @@ void PrintTo(const SentSignal& sent, std::ostream* out);
 std::vector<SentSignal> sentSignals();
 void forgetSentSignals();
 
+/// By how much the sleeps below a second of this thread have been longer than they should, in all:
+/// a busy machine wakes up late.
+std::chrono::nanoseconds overslept();
+
 /// Lets thread creation fail while this object lives.
 class ThreadLimit {
 public:
@@ -40,4 +45,13 @@ public:
     ~ShortSleeps();
     ShortSleeps(const ShortSleeps&) = delete;
     ShortSleeps& operator=(const ShortSleeps&) = delete;
+};
+
+/// Lets sleeps of 125 ms begin no sooner than this object goes: the worker's before its first poll.
+class HeldPolls {
+public:
+    HeldPolls();
+    ~HeldPolls();
+    HeldPolls(const HeldPolls&) = delete;
+    HeldPolls& operator=(const HeldPolls&) = delete;
 };

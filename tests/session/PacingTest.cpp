@@ -50,6 +50,15 @@ TEST_F(PacingTest, PollsComeFastWhenASyncIsDue) {
     EXPECT_LT(shortest(Function::getTime), milliseconds(60));
 }
 
+TEST_F(PacingTest, PollsComeFastAfter2038WhenASyncIsDue) {
+    // The second of the Sync is the last of 31 bits, that of the poll the first of 32.
+    host.setTime(2147483648020000000);
+    begin("clock fixed 2147483647900000000\n");
+    ASSERT_TRUE(waitForCalls(Function::getTime, 40));
+    EXPECT_GE(shortest(Function::getTime), milliseconds(16));
+    EXPECT_LT(shortest(Function::getTime), milliseconds(60));
+}
+
 TEST_F(PacingTest, PollsAimAtTheNextSync) {
     beginAt(60000);
     ASSERT_TRUE(waitForCalls(Function::getTime, 20));

@@ -147,6 +147,15 @@ TEST_F(ReportingTest, InterfaceNameCannotBreakTheMetadata) {
     EXPECT_THAT(metaData().at(1), testing::HasSubstr(R"("interface":"a\"b\\c")"));
 }
 
+TEST_F(ReportingTest, InterfaceNameIsNoFormatOfTheLogLine) {
+    begin("gm present\n"
+          "interface-name 1 %s%n%999999d\n",
+          R"(["eth0"])");
+    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
+    EXPECT_THAT(metaData().at(1), testing::HasSubstr(R"("interface":"%s%n%999999d")"));
+    EXPECT_EQ(log.count("update Meta Data: " + metaData().at(1)), 1);
+}
+
 TEST_F(ReportingTest, WithoutPortsMetadataEndsAfterTheGrandmaster) {
     begin("ports 0\n", R"(["eth0"])");
     ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));

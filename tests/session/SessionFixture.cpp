@@ -82,7 +82,7 @@ void PrintTo(const QualityReport& report, std::ostream* out) {
     *out << (report.usable ? "usable: " : "unusable: ") << report.reason;
 }
 
-SessionTest::SessionTest() : daemon(simulatorProgram), threadsBefore(settledThreadCount()) {
+SessionTest::SessionTest() : daemon(simulatorProgram) {
     forgetSentSignals();
     fifo.emplace();
 }
@@ -90,7 +90,14 @@ SessionTest::SessionTest() : daemon(simulatorProgram), threadsBefore(settledThre
 void SessionTest::begin(const std::string& script, const std::string& interfaces) {
     SimulatedDaemon::script(script);
     session.initialise(sessionConfiguration(interfaces));
+    // A daemon that is to bind its socket late is awaited no longer than until it runs.
+    const std::string ready = script.find("start-delay") == std::string::npos ? "bound" : "start";
+    const std::size_t former = SimulatedDaemon::events(ready).size();
+    const HeldPolls untilItIsReady;
     session.start();
+    waitUntil([&] {
+        return SimulatedDaemon::events(ready).size() > former || hasDeadChild() || !hasChildren();
+    });
 }
 
 void SessionTest::beginMeasured(std::vector<HandDrivenDaemon::Measurement> polls) {
@@ -138,8 +145,8 @@ void SessionTest::onEachPoll(const std::function<void(int poll)>& action) {
 }
 
 void SessionTest::expectOwnThreads(int count) const {
-    waitUntil([=] { return threadCount() == threadsBefore + count; });
-    EXPECT_EQ(threadCount(), threadsBefore + count);
+    waitUntil([=] { return threadCount() == threadsBefore.count() + count; });
+    EXPECT_EQ(threadCount(), threadsBefore.count() + count);
 }
 
 std::string SessionTest::socketPath() {

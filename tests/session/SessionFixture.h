@@ -73,7 +73,8 @@ protected:
 
     SessionTest();
 
-    /// Initialises and starts the session with a daemon that follows a script.
+    /// Initialises and starts the session with a daemon that follows a script. The first poll comes
+    /// 125 ms after the daemon is ready, however slow the machine or its emulation is.
     void begin(const std::string& script, const std::string& interfaces = "[]");
 
     /// Initialises and starts the session with measurements of the test, poll by poll.
@@ -103,7 +104,7 @@ protected:
     SyslogCapture log;
     RecordingHost host;
     const SimulatedDaemon daemon;
-    const int threadsBefore;
+    const FormerThreads threadsBefore;
 
     // There is one, but for tests that take it away. What a reaction of the host uses must outlive
     // the session.

@@ -5,7 +5,6 @@
 #include <memory>
 
 #include <gmock/gmock.h>
-#include <syslog.h>
 
 #include "Interposed.h"
 #include "SessionFixture.h"
@@ -14,7 +13,6 @@
 namespace {
 
 using std::chrono::seconds;
-using std::chrono::steady_clock;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
@@ -98,35 +96,6 @@ TEST_F(StopTest, WritesNoLogLine) {
     session.stop();
     EXPECT_THAT(log.lines(), testing::Each(testing::Field(&SyslogCapture::Line::text,
                                                           testing::StartsWith("update Meta"))));
-}
-
-TEST_F(StopTest, DaemonThatIgnoresSigtermIsKilledAfterTenSeconds) {
-    begin("ignore SIGTERM\n");
-    ASSERT_TRUE(SimulatedDaemon::waitFor("bound"));
-    const pid_t child = SimulatedDaemon::events("start").at(0).pid;
-    const auto begun = steady_clock::now();
-    session.stop();
-    EXPECT_GE(steady_clock::now() - begun, seconds(10));
-    EXPECT_LT(steady_clock::now() - begun, seconds(25));
-    EXPECT_THAT(sentSignals(), ElementsAre(SentSignal{child, SIGTERM}, SentSignal{child, SIGKILL}));
-    const SyslogCapture::Line line{LOG_ERR, "Killing ptp4l subprocess (pid " +
-                                                std::to_string(child) + ") using SIGKILL.x"};
-    EXPECT_EQ(log.lines().back(), line);
-    EXPECT_THAT(SimulatedDaemon::events("signal"), SizeIs(1));
-    // It is not waited for; that is the host's.
-    EXPECT_TRUE(hasChildren());
-    session.stop();
-    EXPECT_THAT(sentSignals(), SizeIs(2));
-}
-
-TEST_F(StopTest, WaitsNoLongerThanOnePollAndOneWatch) {
-    begin("on any after 6 do silence\n");
-    ASSERT_TRUE(waitForCalls(Function::getTime, 1));
-    ASSERT_TRUE(SimulatedDaemon::waitFor("request", 7));
-    const auto begun = steady_clock::now();
-    session.stop();
-    EXPECT_LT(steady_clock::now() - begun, seconds(6));
-    expectEndedBySigterm();
 }
 
 TEST_F(StopTest, WaitsForACallThatIsUnderWay) {

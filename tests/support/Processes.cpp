@@ -45,14 +45,26 @@ bool hasChildren() {
     return waitid(P_ALL, 0, &ignored, WEXITED | WNOHANG | WNOWAIT) == 0;
 }
 
+bool hasDeadChild() {
+    siginfo_t dead{};
+    return waitid(P_ALL, 0, &dead, WEXITED | WNOHANG | WNOWAIT) == 0 && dead.si_pid != 0;
+}
+
+std::vector<pid_t> children() {
+    std::vector<pid_t> found;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc")) {
+        if (isProcess(entry.path()) && parentOf(entry.path()) == getpid()) {
+            found.push_back(std::stoi(entry.path().filename()));
+        }
+    }
+    return found;
+}
+
 void endChildren() {
     while (hasChildren()) {
-        for (const auto& entry : std::filesystem::directory_iterator("/proc")) {
-            if (isProcess(entry.path()) && parentOf(entry.path()) == getpid()) {
-                const pid_t child = std::stoi(entry.path().filename());
-                kill(child, SIGKILL);
-                waitpid(child, nullptr, 0);
-            }
+        for (const pid_t child : children()) {
+            kill(child, SIGKILL);
+            waitpid(child, nullptr, 0);
         }
     }
 }
@@ -68,4 +80,10 @@ int settledThreadCount() {
     std::thread([&] { within = threadCount(); }).join();
     waitUntil([&] { return threadCount() < within; });
     return std::max(before, within - 1);
+}
+
+FormerThreads::FormerThreads() : count_(settledThreadCount()) {}
+
+FormerThreads::~FormerThreads() {
+    waitUntil([this] { return threadCount() <= count_; }, std::chrono::seconds(1));
 }

@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <utility>
 
+#include "support/OwnAllocations.h"
+
 namespace {
 
 std::atomic<RecordingHost*> current{nullptr};
@@ -34,6 +36,7 @@ extern "C" {
 
 [[gnu::visibility("default")]] void zekel_getTime(void** context, std::uint64_t* time,
                                                   zeerr_Status* status) {
+    const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::getTime, context, status);
     call.timeOnEntry = *time;
     record(std::move(call), time, status);
@@ -42,6 +45,7 @@ extern "C" {
 [[gnu::visibility("default")]] void zekel_adjustTime(void** context, std::uint64_t referenceTime,
                                                      std::uint64_t localTime,
                                                      zeerr_Status* status) {
+    const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::adjustTime, context, status);
     call.referenceTime = referenceTime;
     call.localTime = localTime;
@@ -50,6 +54,7 @@ extern "C" {
 
 [[gnu::visibility("default")]] void zekel_setTRQuality(void** context, const double* quality,
                                                        const char* reason, zeerr_Status* status) {
+    const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::setTRQuality, context, status);
     std::copy_n(quality, ZEKEL_QUALITY_LENGTH, call.quality.begin());
     call.text = reason;
@@ -58,6 +63,7 @@ extern "C" {
 
 [[gnu::visibility("default")]] void zekel_updateMetaData(void** context, const char* metadataJson,
                                                          zeerr_Status* status) {
+    const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::updateMetaData, context, status);
     call.text = metadataJson;
     record(std::move(call), nullptr, status);

@@ -9,11 +9,14 @@
 
 #include <syslog.h>
 
+#include "support/OwnAllocations.h"
+
 namespace {
 
 std::atomic<SyslogCapture*> current{nullptr};
 
 [[gnu::format(printf, 2, 0)]] void capture(int priority, const char* format, va_list arguments) {
+    const OwnAllocations own;
     char text[8192];
     std::vsnprintf(text, sizeof(text), format, arguments);
     if (SyslogCapture* const log = current.load()) {

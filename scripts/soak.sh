@@ -1,0 +1,57 @@
+#!/usr/bin/env bash
+# Runs the plug-in against the simulated daemon, session after session in one process, while daemon,
+# host and FIFO misbehave at random. Fails when the process dies, a session does not recover, or memory
+# or descriptors grow. The same seed and time give the same faults.
+#   scripts/soak.sh [--seed N] [--plan] [MINUTES]
+# MINUTES is 10 by default. --plan only prints what would go wrong. Ctrl-C ends with a report.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+usage() {
+  sed -n 's/^#   /usage: /p' "$0" >&2
+  exit 2
+}
+
+minutes=10
+seed=$((RANDOM * 32768 + RANDOM))
+options=()
+while [[ $# -gt 0 ]]; do
+  case $1 in
+    --seed)
+      seed=${2:?--seed needs a number}
+      shift
+      ;;
+    --plan) options+=(--plan) ;;
+    *)
+      [[ $1 =~ ^[1-9][0-9]{0,3}$ ]] || usage
+      minutes=$1
+      ;;
+  esac
+  shift
+done
+
+scripts/setup.sh tests
+cmake --preset release >/dev/null
+cmake --build --preset release -j "$(nproc)" --target soak -- --quiet
+
+# A process group of its own, so that nothing stays behind when the host dies. A session that cannot be
+# stopped hangs the host, which then cannot tell of it.
+folder=$(mktemp -d)
+set -m
+TMPDIR=$folder timeout --foreground --kill-after=60 $((minutes * 75 + 120)) \
+  build/release/tests/soak/soak --seconds $((minutes * 60)) --seed "$seed" "${options[@]}" &
+job=$!
+set +m
+trap 'kill -KILL -- "-$job" 2>/dev/null || true; rm -rf "$folder"' EXIT
+trap 'kill -INT "$job" 2>/dev/null || true' INT TERM
+
+status=0
+wait "$job" || status=$?
+while kill -0 "$job" 2>/dev/null; do
+  status=0
+  wait "$job" || status=$?
+done
+if [[ $status -gt 2 ]]; then
+  echo "soak: FAILED: the host died or hung, status $status" >&2
+fi
+exit "$status"
