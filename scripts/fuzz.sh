@@ -28,7 +28,7 @@ fi
 fuzz() { # target
   local target=$1 status=0
   mkdir -p "$work/corpus/$target" "$work/findings"
-  build/fuzz/fuzz/"$target" -max_total_time="$seconds" -timeout=10 -print_final_stats=1 \
+  build/fuzz/fuzz/"$target" -max_total_time="$seconds" -timeout=60 -print_final_stats=1 \
     -artifact_prefix="$work/findings/$target-" "$work/corpus/$target" "$corpora/$target" \
     >"$work/$target.log" 2>&1 </dev/null || status=$?
   echo "$status" >"$work/$target.status"
