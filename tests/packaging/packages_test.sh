@@ -1,0 +1,177 @@
+#!/usr/bin/env bash
+# Checks the Debian packages that cpack makes of a build folder. Each check is a test of ctest.
+# usage: tests/packaging/packages_test.sh BUILD_FOLDER native|armhf CHECK
+set -euo pipefail
+here=$(cd "$(dirname "$0")" && pwd)
+build=$1
+architecture=${2/#native/$(dpkg --print-architecture)}
+check=$3
+packages=$build/tests/packaging/packages
+scratch=$(mktemp -d)
+trap 'rm -rf "$scratch"' EXIT
+
+for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
+  if ! command -v "$tool" >/dev/null; then
+    echo "SKIPPED: $tool is missing; run scripts/setup.sh packages"
+    exit 77
+  fi
+done
+if [[ ! -e $build/CPackConfig.cmake ]]; then
+  echo "SKIPPED: dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
+  exit 77
+fi
+
+fail() {
+  echo "FAILED: $*" >&2
+  exit 1
+}
+
+make_packages() { # folder
+  rm -rf "$1"
+  cpack --config "$build/CPackConfig.cmake" -B "$1" >"$scratch/cpack.log" 2>&1 ||
+    fail "$(cat "$scratch/cpack.log")"
+}
+
+deb() { # package
+  compgen -G "$packages/$1_19.0.0_*.deb" || fail "there is no $1"
+}
+
+field() { # package, field
+  dpkg-deb --field "$(deb "$1")" "$2"
+}
+
+expect_equal() { # what, expected, actual
+  [[ $2 == "$3" ]] || fail "$1: expected, and found:" $'\n'"$(diff <(echo "$2") <(echo "$3"))"
+}
+
+expect_field() { # package, field, value
+  expect_equal "$2 of $1" "$3" "$(field "$1" "$2")"
+}
+
+# The files of a package, with links as "name -> target", sorted; the triplet stands as TRIPLET.
+files() { # package
+  dpkg-deb --fsys-tarfile "$(deb "$1")" | tar -t -v |
+    sed -nE '/^d/d; s/^([^ ]+ +){5}\.\///; s/(x86_64|arm)-linux-gnu(eabihf)?/TRIPLET/; p' |
+    LC_ALL=C sort
+}
+
+unpack_library() {
+  dpkg-deb -x "$(deb libvantel-bc19)" "$scratch/root"
+  echo "$scratch"/root/usr/lib/*/libvantel_bc.so.19.0.0
+}
+
+PackagesAreMade() {
+  make_packages "$packages"
+  expect_equal "count of packages" 3 "$(find "$packages" -maxdepth 1 -name '*.deb' | wc -l)"
+}
+
+SameBuildGivesTheSameOctets() {
+  make_packages "$scratch/again"
+  local first
+  for first in "$packages"/*.deb; do
+    cmp "$first" "$scratch/again/${first##*/}" || fail "${first##*/} differs"
+  done
+}
+
+LibraryPackageHoldsTheLibraryAlone() {
+  expect_equal "files" "usr/lib/TRIPLET/libvantel_bc.so.19 -> libvantel_bc.so.19.0.0
+usr/lib/TRIPLET/libvantel_bc.so.19.0.0
+usr/share/doc/libvantel-bc19/CHANGELOG.md
+usr/share/doc/libvantel-bc19/README.Debian
+usr/share/doc/libvantel-bc19/changelog.gz
+usr/share/doc/libvantel-bc19/copyright
+usr/share/lintian/overrides/libvantel-bc19" "$(files libvantel-bc19)"
+}
+
+DevelopmentPackageHoldsWhatHostsAreWrittenWith() {
+  expect_equal "files" "usr/include/vantel_bc/quality.h
+usr/include/vantel_bc/status.h
+usr/include/vantel_bc/zekel.h
+usr/include/vantel_bc/zekeltr.h
+usr/lib/TRIPLET/libvantel_bc.so -> libvantel_bc.so.19
+usr/share/doc/libvantel-bc-dev/changelog.gz
+usr/share/doc/libvantel-bc-dev/copyright
+usr/share/doc/libvantel-bc-dev/examples/minimal_host.c
+usr/share/doc/libvantel-bc-dev/host-interface.md
+usr/share/doc/libvantel-bc-dev/oddities.md" "$(files libvantel-bc-dev)"
+}
+
+HostPackageHoldsBothToolsWithManualPagesAndScripts() {
+  local expected=(usr/bin/simptp4l usr/bin/vantel-host usr/share/doc/vantel-host/simptp4l.md) file
+  for file in "$here"/../../tools/simptp4l/examples/*.sim; do
+    expected+=("usr/share/doc/vantel-host/examples/${file##*/}")
+  done
+  for file in "$here"/../../docs/man/*.1; do
+    [[ -e $file ]] && expected+=("usr/share/man/man1/${file##*/}.gz")
+  done
+  files vantel-host >"$scratch/files"
+  for file in "${expected[@]}"; do
+    grep -qxF "$file" "$scratch/files" || fail "$file is missing"
+  done
+  if grep -E '^usr/(lib|include)' "$scratch/files"; then
+    fail "these belong to another package"
+  fi
+}
+
+FieldsSayWhatDebianMustKnow() {
+  local package
+  for package in libvantel-bc19 libvantel-bc-dev vantel-host; do
+    expect_field $package Version 19.0.0
+    expect_field $package Architecture "$architecture"
+    expect_field $package Source vantel-bc
+    expect_field $package Priority optional
+  done
+  expect_field libvantel-bc19 Section libs
+  expect_field libvantel-bc19 Multi-Arch same
+  expect_field libvantel-bc19 Recommends "linuxptp (>= 1.8)"
+  expect_field libvantel-bc-dev Section libdevel
+  expect_field libvantel-bc-dev Multi-Arch same
+  expect_field libvantel-bc-dev Depends "libvantel-bc19 (= 19.0.0)"
+  expect_field vantel-host Section net
+  expect_field vantel-host Recommends "linuxptp (>= 1.8)"
+}
+
+DependenciesNameTheLibrariesInUse() {
+  names() { field "$1" Depends | sed 's/ ([^)]*)//g'; }
+  expect_equal "libraries of the library" "libc6, libcjson1, libgcc-s1, libstdc++6" \
+    "$(names libvantel-bc19)"
+  expect_equal "libraries of the tools" "libc6, libfmt9, libgcc-s1, libstdc++6, libvantel-bc19" \
+    "$(names vantel-host)"
+}
+
+NoPackageRunsScriptsOfItsOwn() {
+  local package
+  for package in libvantel-bc19 libvantel-bc-dev vantel-host; do
+    rm -rf "$scratch/control"
+    dpkg-deb --control "$(deb $package)" "$scratch/control"
+    if compgen -G "$scratch/control/p*"; then
+      fail "$package has maintainer scripts"
+    fi
+  done
+}
+
+LibraryIsStrippedAndKeepsItsNotes() {
+  local library
+  library=$(unpack_library)
+  if readelf -S --wide "$library" | grep -E '\.(symtab|debug_|comment)'; then
+    fail "the library is not stripped"
+  fi
+  notes() { readelf -n --wide "$1" | grep -c 'Provider:' || true; }
+  expect_equal "count of probes" "$(notes "$build/source/libvantel_bc.so.19")" "$(notes "$library")"
+}
+
+SymbolsFileNamesWhatIsExported() {
+  local library
+  library=$(unpack_library)
+  mkdir "$scratch/debian"
+  printf 'Source: vantel-bc\n\nPackage: libvantel-bc19\nArchitecture: any\n' >"$scratch/debian/control"
+  cd "$scratch"
+  DEB_HOST_ARCH=$architecture dpkg-gensymbols -c4 -plibvantel-bc19 \
+    -v19.0.0 -Proot -I"$here/../../packaging/libvantel-bc19/symbols" -e"$library" -O/dev/null
+}
+
+LintianFindsNothing() {
+  "$here/lintian.sh" "$packages"/*.deb
+}
+
+"$check"
