@@ -1,5 +1,6 @@
 /* The smallest host: prints what the plug-in reports for a minute. Create the epoch FIFO first.
- *   cc minimal_host.c -rdynamic -ldl -o minimal_host && ./minimal_host configuration.json */
+ *   cc minimal_host.c -rdynamic -ldl -o minimal_host && ./minimal_host configuration.json
+ * For 32 bits, add -D_FILE_OFFSET_BITS=64 -D_TIME_BITS=64: its clock then goes on after 2038. */
 #include <dlfcn.h>
 #include <stdio.h>
 #include <stdlib.h>

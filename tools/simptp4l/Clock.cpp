@@ -19,6 +19,7 @@ std::int64_t intervalOf(const Script& script, int logSyncInterval) {
 
 std::int64_t readClock(clockid_t clock) {
     timespec time{};
+    static_assert(sizeof(time.tv_sec) == 8, "goes on after 2038");
     clock_gettime(clock, &time);
     return std::int64_t{time.tv_sec} * 1000000000 + time.tv_nsec;
 }
