@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Shows the plug-in doing its whole job: a host loads it, the boundary clock finds a grandmaster, time
-# pairs arrive. With the real ptp4l in private namespaces; where those are not allowed, with the
-# simulated one. Nothing of the system is touched, and nothing stays behind.
+# pairs arrive: live on a terminal, else line by line. With the real ptp4l in private namespaces; where
+# those are not allowed, with the simulated one. Nothing of the system is touched, nothing stays behind.
 #   scripts/demo.sh [--seconds N] [--simulated]
 set -euo pipefail
 cd "$(dirname "$0")/.."

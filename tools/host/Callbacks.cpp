@@ -1,23 +1,15 @@
 #include "Callbacks.h"
 
-#include <chrono>
-
 #include <fmt/format.h>
 
 #include "HostStatus.h"
+#include "Moment.h"
 
 namespace vantelhost {
 
 namespace {
 
 std::atomic<Callbacks*> activeCallbacks{nullptr};
-
-std::uint64_t realtimeNanoseconds() {
-    using Clock = std::chrono::system_clock; // CLOCK_REALTIME
-    const auto now = Clock::now().time_since_epoch();
-    return static_cast<std::uint64_t>(
-        std::chrono::duration_cast<std::chrono::nanoseconds>(now).count());
-}
 
 } // namespace
 
@@ -80,7 +72,7 @@ bool Callbacks::accepts(void** context, bool hasData, const char* function, zeer
         return false;
     }
     if (refuseWhileStopping_ && stopping_) {
-        journal_.refusal();
+        journal_.refusal(function);
         fail(*status, ZEKEL_HOST_IS_STOPPING, "ZEKEL_HOST_IS_STOPPING", "the host is stopping");
         return false;
     }

@@ -1,44 +1,29 @@
 /// @file
+/// The program's command line. A subcommand is a row of main.cpp's table and a file pair with the
+/// function that the row names.
 #pragma once
 
-#include <cstdint>
-#include <optional>
-#include <string>
-#include <variant>
+#include <functional>
 #include <vector>
+
+namespace CLI {
+class App;
+}
 
 namespace vantelhost {
 
-/// An epoch offset to write some time after the start.
-struct TimedOffset {
-    double seconds;
-    std::int64_t nanoseconds;
+struct Subcommand {
+    const char* name;
+    const char* description;
+
+    /// Adds the subcommand's options to its part of the command line.
+    /// @return what to do once they are read; gives the program's exit status, may throw
+    /// UsageError.
+    std::function<int()> (*prepare)(CLI::App& command);
 };
 
-struct RunOptions {
-    std::string pluginPath = "libvantel_bc.so.19";
-    std::string configFile; ///< "-" is the standard input; empty when there is none
-    std::vector<std::string> assignments;
-    std::vector<std::string> interfaces;
-    bool noInterfaces = false;
-    std::optional<double> seconds;
-    bool jsonLines = false;
-    bool useFifo = false;
-    bool createFifo = false;
-    std::string fifo = "/tmp/quillEpochOffset";
-    std::optional<std::int64_t> epochOffset;
-    std::vector<TimedOffset> timedOffsets; ///< in the order of their times
-    bool refuseWhileStopping = false;
-};
-
-struct SchemaOptions {
-    std::string pluginPath = "libvantel_bc.so.19";
-    bool raw = false;
-};
-
-/// Reads the command line.
-/// @return the options of the subcommand, or the exit status when the help or a complaint has been
-///         printed instead.
-std::variant<int, RunOptions, SchemaOptions> readCommandLine(int argc, const char* const* argv);
+/// Reads the command line and does what it says.
+/// @return the exit status; exitUsage after a complaint about the command line.
+int execute(const std::vector<Subcommand>& subcommands, int argc, const char* const* argv);
 
 } // namespace vantelhost

@@ -1,52 +1,40 @@
 #include "EventPrinter.h"
 
-#include <cerrno>
 #include <cmath>
-#include <string_view>
+#include <string>
 
 #include <fmt/format.h>
-#include <unistd.h>
 
 #include "Text.h"
+#include "WriteAll.h"
 
 namespace vantelhost {
 
 namespace {
 
-bool writeAll(int descriptor, std::string_view text) {
-    while (!text.empty()) {
-        const ssize_t written = ::write(descriptor, text.data(), text.size());
-        if (written >= 0) {
-            text.remove_prefix(static_cast<std::size_t>(written));
-        } else if (errno != EINTR) {
-            return false;
-        }
-    }
-    return true;
+std::string readableLine(const Event& event, const Moment& moment) {
+    std::string text = fmt::format("{:10.3f} {:<12} {}", moment.seconds, event.name, event.text);
+    text.erase(text.find_last_not_of(' ') + 1);
+    return onOneLine(text);
+}
+
+std::string jsonLine(const Event& event, const Moment& moment) {
+    Json object{{"event", event.name},
+                {"t", std::round(moment.seconds * 1e6) / 1e6},
+                {"time", moment.realtime}};
+    object.update(event.members);
+    return toAscii(object);
 }
 
 } // namespace
 
-EventPrinter::EventPrinter(int descriptor, Format format, Clock::time_point begin)
-    : descriptor_(descriptor), format_(format), begin_(begin) {}
+EventPrinter::EventPrinter(int descriptor, Format format)
+    : descriptor_(descriptor), format_(format) {}
 
-bool EventPrinter::print(const Event& event) {
-    return writeAll(descriptor_, line(event) + "\n");
-}
-
-double EventPrinter::seconds() const {
-    return std::chrono::duration<double>(Clock::now() - begin_).count();
-}
-
-std::string EventPrinter::line(const Event& event) const {
-    if (format_ == Format::readable) {
-        std::string text = fmt::format("{:10.3f} {:<12} {}", seconds(), event.name, event.text);
-        text.erase(text.find_last_not_of(' ') + 1);
-        return onOneLine(text);
-    }
-    Json object{{"event", event.name}, {"t", std::round(seconds() * 1e6) / 1e6}};
-    object.update(event.members);
-    return toAscii(object);
+bool EventPrinter::operator()(const Event& event, const Moment& moment) const {
+    const std::string line =
+        format_ == Format::readable ? readableLine(event, moment) : jsonLine(event, moment);
+    return writeAll(descriptor_, line + "\n");
 }
 
 } // namespace vantelhost

@@ -137,6 +137,19 @@ Event failureEvent(const std::string& operation, const std::string& problem) {
     return {"error", operation + ": " + problem, {{"operation", operation}, {"problem", problem}}};
 }
 
+Event refusedEvent(const std::string& function) {
+    return {"refused", function + ": the host is stopping", Json{{"function", function}}};
+}
+
+Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem) {
+    const bool reachable = problem.empty();
+    std::string text = reachable ? "takes the pairs" : "does not take the pairs: " + problem;
+    text += fmt::format("; {} sent, {} failed", sent, failed);
+    return {"chrony",
+            std::move(text),
+            {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
+}
+
 Event stoppingEvent(const std::string& cause) {
     return {"stopping", cause, Json{{"cause", cause}}};
 }

@@ -38,6 +38,13 @@ Event statusEvent(const std::string& operation, std::int32_t code, const std::st
 /// Something that went wrong in the host, or a call of the plug-in that breaks the rules.
 Event failureEvent(const std::string& operation, const std::string& problem);
 
+/// A call of the plug-in that is refused because the host is stopping.
+Event refusedEvent(const std::string& function);
+
+/// Whether chronyd takes the time pairs, and how many it took.
+/// @param problem why it does not; empty when it does.
+Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem);
+
 Event stoppingEvent(const std::string& cause);
 Event stoppedEvent();
 Event summaryEvent(double seconds, const Tally& tally);

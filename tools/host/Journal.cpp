@@ -1,5 +1,7 @@
 #include "Journal.h"
 
+#include <cerrno>
+#include <system_error>
 #include <utility>
 
 namespace vantelhost {
@@ -13,8 +15,19 @@ std::int64_t difference(std::uint64_t local, std::uint64_t reference) {
 
 } // namespace
 
-Journal::Journal(EventPrinter printer, std::function<void()> onLostOutput)
-    : printer_(printer), onLostOutput_(std::move(onLostOutput)) {}
+Journal::Journal(EventSink output, std::function<void()> onLostOutput,
+                 Moment::Clock::time_point begin)
+    : begin_(begin) {
+    outputs_.push_back({"output", std::move(output), std::move(onLostOutput), false});
+}
+
+void Journal::addOutput(const std::string& name, EventSink output) {
+    outputs_.push_back({name, std::move(output), [] {}, false});
+}
+
+void Journal::handPairsTo(PairTaker taker) {
+    pairTaker_ = std::move(taker);
+}
 
 void Journal::note(const Event& event) {
     const std::lock_guard lock(mutex_);
@@ -43,6 +56,12 @@ void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     const std::lock_guard lock(mutex_);
     tally_.offsets.add(offset);
     print(event);
+    if (!pairTaker_) {
+        return;
+    }
+    if (const auto news = pairTaker_(reference, local)) {
+        print(*news);
+    }
 }
 
 void Journal::metadata(const std::string& text) {
@@ -62,19 +81,20 @@ void Journal::timeRequest() {
     ++tally_.timeRequests;
 }
 
-void Journal::refusal() {
+void Journal::refusal(const std::string& function) {
     const std::lock_guard lock(mutex_);
     ++tally_.refused;
+    print(refusedEvent(function));
 }
 
 void Journal::summary() {
     const std::lock_guard lock(mutex_);
-    print(summaryEvent(printer_.seconds(), tally_));
+    print(summaryEvent(Moment::now(begin_).seconds, tally_));
 }
 
 bool Journal::isClean() const {
     const std::lock_guard lock(mutex_);
-    return tally_.errors == 0 && !outputLost_;
+    return tally_.errors == 0;
 }
 
 Tally Journal::tally() const {
@@ -83,9 +103,21 @@ Tally Journal::tally() const {
 }
 
 void Journal::print(const Event& event) {
-    if (!outputLost_ && !printer_.print(event)) {
-        outputLost_ = true;
-        onLostOutput_();
+    pass(event, Moment::now(begin_));
+}
+
+void Journal::pass(const Event& event, const Moment& moment) {
+    std::vector<Event> losses;
+    for (auto& output : outputs_) {
+        if (!output.lost && !output.take(event, moment)) {
+            losses.push_back(failureEvent(output.name, std::system_category().message(errno)));
+            output.lost = true;
+            output.onLost();
+        }
+    }
+    for (const auto& loss : losses) {
+        ++tally_.errors;
+        pass(loss, moment);
     }
 }
 

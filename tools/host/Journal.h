@@ -4,20 +4,41 @@
 #include <cstdint>
 #include <functional>
 #include <mutex>
+#include <optional>
 #include <string>
+#include <vector>
 
-#include "EventPrinter.h"
+#include "Events.h"
+#include "Moment.h"
 #include "Tally.h"
 
 namespace vantelhost {
 
-/// Takes everything that happens in a run, prints it and sums it up. Thread-safe: lines come out in
-/// the order in which they are counted.
+/// Takes one event.
+/// @return false when it is lost; errno says why.
+using EventSink = std::function<bool(const Event&, const Moment&)>;
+
+/// Takes a time pair, in nanoseconds.
+/// @return an event, if there is something to tell.
+using PairTaker = std::function<std::optional<Event>(std::uint64_t reference, std::uint64_t local)>;
+
+/// Takes everything that happens in a run, passes it on and sums it up. Thread-safe: events come
+/// out in the order in which they are counted.
+///
+/// An output that loses an event gets no more, and the others are told: an error.
 class Journal {
 public:
-    /// @param onLostOutput called once when a line cannot be written; nothing is printed after
-    /// that.
-    Journal(EventPrinter printer, std::function<void()> onLostOutput);
+    /// @param onLostOutput called once when this output loses an event.
+    /// @param begin        the moments of events are counted from then.
+    Journal(EventSink output, std::function<void()> onLostOutput,
+            Moment::Clock::time_point begin = Moment::Clock::now());
+
+    /// One more output. To be called before other threads use the journal, as the next.
+    /// @param name for people
+    void addOutput(const std::string& name, EventSink output);
+
+    /// Who gets the time pairs besides.
+    void handPairsTo(PairTaker taker);
 
     /// Something without a count.
     void note(const Event& event);
@@ -33,9 +54,10 @@ public:
     void metadata(const std::string& text);
 
     void timeRequest();
-    void refusal();
 
-    /// Prints the summary.
+    /// A call of this function was refused because the host is stopping.
+    void refusal(const std::string& function);
+
     void summary();
 
     /// Whether there was no error and no lost output.
@@ -44,12 +66,20 @@ public:
     Tally tally() const;
 
 private:
+    struct Output {
+        std::string name;
+        EventSink take;
+        std::function<void()> onLost;
+        bool lost;
+    };
+
     void print(const Event& event);
+    void pass(const Event& event, const Moment& moment);
 
     mutable std::mutex mutex_;
-    EventPrinter printer_;
-    std::function<void()> onLostOutput_;
-    bool outputLost_ = false;
+    const Moment::Clock::time_point begin_;
+    std::vector<Output> outputs_;
+    PairTaker pairTaker_;
     std::string lastQuality_;
     Tally tally_;
 };

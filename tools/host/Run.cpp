@@ -1,13 +1,17 @@
 #include "Run.h"
 
+#include <algorithm>
 #include <chrono>
+#include <cstdlib>
 #include <exception>
+#include <string_view>
 #include <utility>
 
 #include <fmt/format.h>
 #include <unistd.h>
 
 #include "Settings.h"
+#include "SettingsOptions.h"
 #include "Text.h"
 #include "UsageError.h"
 
@@ -17,8 +21,13 @@ namespace {
 
 using Clock = StopSignal::Clock;
 
-Format formatOf(const RunOptions& options) {
-    return options.jsonLines ? Format::jsonLines : Format::readable;
+/// How long the live view may stand still.
+constexpr std::chrono::milliseconds refreshTime(500);
+
+bool showsLive(const RunOptions& options) {
+    const char* const kind = std::getenv("TERM");
+    return !options.jsonLines && !options.plain && ::isatty(STDOUT_FILENO) == 1 &&
+           kind != nullptr && std::string_view(kind) != "dumb";
 }
 
 Clock::time_point after(Clock::time_point begin, double seconds) {
@@ -37,11 +46,39 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText,
     : options_(options),
       configText_(std::move(configText)),
       stopSignal_(stopSignal),
-      journal_(EventPrinter(STDOUT_FILENO, formatOf(options)), StopSignal::request),
-      callbacks_(journal_, options.refuseWhileStopping) {}
+      journal_(output(), StopSignal::request, begin_),
+      callbacks_(journal_, options.refuseWhileStopping) {
+    connectOutputs();
+}
+
+EventSink Run::output() {
+    if (!showsLive(options_)) {
+        return EventPrinter(STDOUT_FILENO,
+                            options_.jsonLines ? Format::jsonLines : Format::readable);
+    }
+    view_.emplace(STDOUT_FILENO, begin_);
+    return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };
+}
+
+void Run::connectOutputs() {
+    if (!options_.recordFile.empty()) {
+        record_.emplace(options_.recordFile);
+        journal_.addOutput("record " + options_.recordFile,
+                           EventPrinter(record_->descriptor(), Format::jsonLines));
+    }
+    if (!options_.chronySocket.empty()) {
+        chrony_.emplace(options_.chronySocket);
+        journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
+            return chrony_->take(reference, local);
+        });
+    }
+}
 
 int Run::execute() {
     session();
+    if (chrony_) {
+        journal_.note(chrony_->state());
+    }
     journal_.summary();
     return journal_.isClean() ? exitClean : exitFailed;
 }
@@ -50,7 +87,8 @@ void Run::session() {
     const PlugIn plugIn(options_.pluginPath);
     journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
     Schema schema;
-    if (!readSchema(plugIn, schema)) {
+    // Nothing is begun when the output or the record is lost already.
+    if (!journal_.isClean() || !readSchema(plugIn, schema)) {
         return;
     }
     const Json settings = completedSettings(schema);
@@ -78,8 +116,7 @@ bool Run::readSchema(const PlugIn& plugIn, Schema& schema) {
 }
 
 Json Run::completedSettings(const Schema& schema) const {
-    const Settings settings = completeSettings(
-        schema, {configText_, options_.assignments, options_.interfaces, !options_.noInterfaces});
+    const Settings settings = completeSettings(schema, userSettings(options_, configText_));
     for (const auto& warning : settings.warnings) {
         complain("warning: " + warning);
     }
@@ -103,12 +140,18 @@ bool Run::initialise(const PlugIn& plugIn, const Json& settings) {
 }
 
 void Run::startAndStop(const PlugIn& plugIn) {
+    if (view_) {
+        view_->open();
+    }
     // Also stopped after a start that failed: whatever that left running ends here, or finalise
     // could wait for it for ever.
     journal_.note(stoppingEvent(startAndWait(plugIn)));
     callbacks_.stoppingBegins();
     plugIn.stop(callbacks_.slot());
     journal_.note(stoppedEvent());
+    if (view_) {
+        view_->close();
+    }
 }
 
 std::string Run::startAndWait(const PlugIn& plugIn) {
@@ -135,7 +178,7 @@ std::string Run::waitForEnd() {
         if (options_.seconds && offset.seconds > *options_.seconds) {
             break;
         }
-        if (const auto signal = stopSignal_.waitUntil(after(begin, offset.seconds))) {
+        if (const auto signal = waitUntil(after(begin, offset.seconds))) {
             return *signal;
         }
         writeOffset(offset.nanoseconds);
@@ -144,7 +187,24 @@ std::string Run::waitForEnd() {
     if (options_.seconds) {
         end = after(begin, *options_.seconds);
     }
-    return stopSignal_.waitUntil(end).value_or("duration");
+    return waitUntil(end).value_or("duration");
+}
+
+std::optional<std::string> Run::waitUntil(std::optional<Clock::time_point> deadline) {
+    for (;;) {
+        auto next = deadline;
+        if (view_) {
+            view_->refresh();
+            const auto soon = Clock::now() + refreshTime;
+            next = deadline ? std::min(*deadline, soon) : soon;
+        }
+        if (auto signal = stopSignal_.waitUntil(next)) {
+            return signal;
+        }
+        if (deadline && Clock::now() >= *deadline) {
+            return std::nullopt;
+        }
+    }
 }
 
 void Run::openFifo() {

@@ -5,12 +5,15 @@
 #include <string>
 
 #include "Callbacks.h"
-#include "CommandLine.h"
+#include "ChronyClock.h"
 #include "EpochFifo.h"
 #include "HostStatus.h"
 #include "Journal.h"
 #include "Json.h"
+#include "LiveView.h"
 #include "PlugIn.h"
+#include "RecordFile.h"
+#include "RunOptions.h"
 #include "Schema.h"
 #include "StopSignal.h"
 
@@ -21,6 +24,7 @@ class Run {
 public:
     /// @param configText the content of the configuration file, if there is one
     /// @param stopSignal made before any thread
+    /// Throws UsageError.
     Run(const RunOptions& options, std::optional<std::string> configText,
         const StopSignal& stopSignal);
 
@@ -29,6 +33,9 @@ public:
     int execute();
 
 private:
+    EventSink output();
+    void connectOutputs();
+
     /// The steps of a run. A step that says false ends the run; the journal then knows why.
     void session();
     bool readSchema(const PlugIn& plugIn, Schema& schema);
@@ -40,6 +47,7 @@ private:
     /// @return why the run ends.
     std::string startAndWait(const PlugIn& plugIn);
     std::string waitForEnd();
+    std::optional<std::string> waitUntil(std::optional<StopSignal::Clock::time_point> deadline);
     void openFifo();
     void writeOffset(std::int64_t nanoseconds);
 
@@ -50,6 +58,10 @@ private:
     const RunOptions& options_;
     std::optional<std::string> configText_;
     const StopSignal& stopSignal_;
+    const Moment::Clock::time_point begin_ = Moment::Clock::now();
+    std::optional<LiveView> view_;
+    std::optional<RecordFile> record_;
+    std::optional<ChronyClock> chrony_;
     Journal journal_;
     Callbacks callbacks_;
     std::optional<EpochFifo> fifo_;

@@ -2,15 +2,10 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdio>
 
 #include <fmt/format.h>
 
-#include "Events.h"
-#include "HostStatus.h"
-#include "PlugIn.h"
 #include "Text.h"
-#include "UsageError.h"
 
 namespace vantelhost {
 
@@ -23,10 +18,6 @@ Row row(const Parameter& parameter) {
     return {parameter.key, nameOf(parameter.type),
             range ? fmt::format("{} to {}", range->low, range->high) : "",
             toAscii(parameter.defaultValue), parameter.hidden ? "yes" : "no"};
-}
-
-std::string shownStatus(const HostStatus& status) {
-    return statusEvent("schema", status.code(), status.text()).text;
 }
 
 } // namespace
@@ -52,24 +43,6 @@ std::string schemaTable(const Schema& schema) {
         table += onOneLine(line) + "\n";
     }
     return table;
-}
-
-int showSchema(const SchemaOptions& options) {
-    const PlugIn plugIn(options.pluginPath);
-    HostStatus status;
-    const std::string text = plugIn.schema(status);
-    if (status.isError()) {
-        fmt::print(stderr, "vantel-host: {}\n", onOneLine(shownStatus(status)));
-        return exitFailed;
-    }
-    try {
-        const std::string shownText = options.raw ? text : schemaTable(parseSchema(text));
-        std::fputs(shownText.c_str(), stdout);
-        return std::fflush(stdout) == 0 ? exitClean : exitFailed;
-    } catch (const SchemaError& error) {
-        fmt::print(stderr, "vantel-host: {}\n", onOneLine(error.what()));
-        return exitFailed;
-    }
 }
 
 } // namespace vantelhost

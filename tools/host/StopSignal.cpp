@@ -25,13 +25,41 @@ timespec leftUntil(StopSignal::Clock::time_point deadline) {
     return result;
 }
 
+bool isIgnored(int number) {
+    struct sigaction action {};
+    ::sigaction(number, nullptr, &action);
+    return action.sa_handler == SIG_IGN;
+}
+
+/// The name of a signal that ends the run; nothing for one that does not.
+std::optional<std::string> nameOf(int number) {
+    switch (number) {
+    case SIGINT:
+        return "SIGINT";
+    case SIGTERM:
+        return "SIGTERM";
+    case SIGHUP:
+        return "SIGHUP";
+    case SIGQUIT:
+        return "SIGQUIT";
+    default:
+        return std::nullopt;
+    }
+}
+
 } // namespace
 
 StopSignal::StopSignal() {
-    sigemptyset(&stopping_);
-    sigaddset(&stopping_, SIGINT);
-    sigaddset(&stopping_, SIGTERM);
-    sigset_t blocked = stopping_;
+    sigemptyset(&awaited_);
+    sigaddset(&awaited_, SIGINT);
+    sigaddset(&awaited_, SIGTERM);
+    sigaddset(&awaited_, SIGWINCH);
+    for (const int number : {SIGHUP, SIGQUIT}) {
+        if (!isIgnored(number)) {
+            sigaddset(&awaited_, number);
+        }
+    }
+    sigset_t blocked = awaited_;
     sigaddset(&blocked, SIGPIPE);
     const int error = pthread_sigmask(SIG_BLOCK, &blocked, nullptr);
     if (error != 0) {
@@ -44,12 +72,12 @@ std::optional<std::string> StopSignal::waitUntil(std::optional<Clock::time_point
         int signal = -1;
         if (deadline) {
             const timespec left = leftUntil(*deadline);
-            signal = sigtimedwait(&stopping_, nullptr, &left);
+            signal = sigtimedwait(&awaited_, nullptr, &left);
         } else {
-            signal = sigwaitinfo(&stopping_, nullptr);
+            signal = sigwaitinfo(&awaited_, nullptr);
         }
         if (signal > 0) {
-            return signal == SIGINT ? "SIGINT" : "SIGTERM";
+            return nameOf(signal);
         }
         if (deadline && Clock::now() >= *deadline) {
             return std::nullopt;

@@ -9,7 +9,8 @@
 
 namespace vantelhost {
 
-/// SIGINT and SIGTERM as something to wait for. To be made before any thread.
+/// SIGINT, SIGTERM, SIGHUP and SIGQUIT as something to wait for; the last two not when they are
+/// ignored, as under nohup. To be made before any thread.
 ///
 /// The signals stay blocked in the whole process, also after the object's end: a second one must
 /// not interrupt an orderly stop. SIGPIPE is blocked too, so that a reader that goes away cannot
@@ -22,14 +23,15 @@ public:
     StopSignal();
 
     /// Waits for a signal until the deadline, for ever without one.
-    /// @return the signal's name, or nothing when the deadline came first.
+    /// @return the signal's name, or nothing when the deadline or a new size of the terminal
+    ///         (SIGWINCH) came first.
     std::optional<std::string> waitUntil(std::optional<Clock::time_point> deadline) const;
 
     /// Makes a waiting thread see SIGTERM. From any thread.
     static void request();
 
 private:
-    sigset_t stopping_;
+    sigset_t awaited_;
 };
 
 } // namespace vantelhost

@@ -11,6 +11,7 @@
 
 #include <vantel_bc/zekel.h>
 
+#include "EventPrinter.h"
 #include "HostStatus.h"
 #include "Tool.h"
 

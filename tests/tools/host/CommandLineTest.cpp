@@ -1,27 +1,54 @@
 #include "CommandLine.h"
 
+#include <optional>
+
+#include <CLI/CLI.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include "RunOptions.h"
 
 using namespace vantelhost;
 using testing::ElementsAre;
 
 namespace {
 
-std::variant<int, RunOptions, SchemaOptions> read(const std::vector<const char*>& words) {
-    std::vector<const char*> argv{"vantel-host"};
+using Words = std::vector<const char*>;
+
+/// The options of the last "run" that was accepted.
+std::optional<RunOptions> accepted;
+
+std::function<int()> prepareRun(CLI::App& command) {
+    const auto options = std::make_shared<RunOptions>();
+    addRunOptions(command, *options);
+    return [options] {
+        accepted = *options;
+        return 42;
+    };
+}
+
+std::function<int()> prepareOther(CLI::App&) {
+    return [] { return 43; };
+}
+
+/// The exit status.
+int read(const Words& words) {
+    accepted.reset();
+    Words argv{"vantel-host"};
     argv.insert(argv.end(), words.begin(), words.end());
     testing::internal::CaptureStdout();
     testing::internal::CaptureStderr();
-    auto result = readCommandLine(static_cast<int>(argv.size()), argv.data());
+    const int status = execute({{"run", "", prepareRun}, {"other", "", prepareOther}},
+                               static_cast<int>(argv.size()), argv.data());
     testing::internal::GetCapturedStdout();
     testing::internal::GetCapturedStderr();
-    return result;
+    return status;
 }
 
-RunOptions run(std::vector<const char*> words) {
+RunOptions run(Words words) {
     words.insert(words.begin(), "run");
-    return std::get<RunOptions>(read(words));
+    EXPECT_EQ(read(words), 42);
+    return accepted.value();
 }
 
 } // namespace
@@ -32,21 +59,42 @@ TEST(CommandLine, DefaultsOfRun) {
     EXPECT_EQ(options.configFile, "");
     EXPECT_EQ(options.seconds, std::nullopt);
     EXPECT_EQ(options.fifo, "/tmp/quillEpochOffset");
-    EXPECT_FALSE(options.useFifo || options.createFifo || options.jsonLines ||
+    EXPECT_FALSE(options.useFifo || options.createFifo || options.jsonLines || options.plain ||
                  options.noInterfaces || options.refuseWhileStopping);
 }
 
 TEST(CommandLine, AllOptionsOfRun) {
-    const auto options =
-        run({"--library", "l.so", "--config", "-", "--set", "a=1", "--set", "b=x,y", "--interface",
-             "eth0", "--interface", "eth1", "--seconds", "2.5", "--json", "--create-fifo", "--fifo",
-             "f", "--refuse-while-stopping"});
+    const auto options = run({"--library",
+                              "l.so",
+                              "--config",
+                              "-",
+                              "--set",
+                              "a=1",
+                              "--set",
+                              "b=x,y",
+                              "--interface",
+                              "eth0",
+                              "--interface",
+                              "eth1",
+                              "--seconds",
+                              "2.5",
+                              "--json",
+                              "--create-fifo",
+                              "--fifo",
+                              "f",
+                              "--refuse-while-stopping",
+                              "--record",
+                              "r.jsonl",
+                              "--chrony",
+                              "c.sock"});
     EXPECT_EQ(options.pluginPath, "l.so");
     EXPECT_EQ(options.configFile, "-");
     EXPECT_THAT(options.assignments, ElementsAre("a=1", "b=x,y"));
     EXPECT_THAT(options.interfaces, ElementsAre("eth0", "eth1"));
     EXPECT_EQ(options.seconds, 2.5);
     EXPECT_EQ(options.fifo, "f");
+    EXPECT_EQ(options.recordFile, "r.jsonl");
+    EXPECT_EQ(options.chronySocket, "c.sock");
     EXPECT_TRUE(options.useFifo && options.createFifo && options.jsonLines &&
                 options.refuseWhileStopping);
 }
@@ -70,26 +118,25 @@ TEST(CommandLine, TimedOffsetsComeInTheOrderOfTheirTimes) {
     EXPECT_TRUE(options.useFifo);
 }
 
-TEST(CommandLine, OptionsOfSchema) {
-    const auto options = std::get<SchemaOptions>(read({"schema", "--library", "l", "--json"}));
-    EXPECT_EQ(options.pluginPath, "l");
-    EXPECT_TRUE(options.raw);
+TEST(CommandLine, TheNamedSubcommandGivesTheStatus) {
+    EXPECT_EQ(read({"run"}), 42);
+    EXPECT_EQ(read({"other"}), 43);
 }
 
 TEST(CommandLine, HelpIsNoMistake) {
-    for (const auto& words : std::vector<std::vector<const char*>>{
-             {"--help"}, {"run", "--help"}, {"schema", "--help"}}) {
-        EXPECT_EQ(std::get<int>(read(words)), 0);
+    for (const auto& words :
+         std::vector<Words>{{"--help"}, {"run", "--help"}, {"other", "--help"}}) {
+        EXPECT_EQ(read(words), 0);
     }
 }
 
 TEST(CommandLine, MistakesGiveTheStatusOfUsageErrors) {
-    for (const auto& words : std::vector<std::vector<const char*>>{
+    for (const auto& words : std::vector<Words>{
              {},
              {"walk"},
              {"run", "--nonsense"},
              {"run", "extra"},
-             {"run", "schema"},
+             {"run", "other"},
              {"run", "--seconds", "-1"},
              {"run", "--seconds", "soon"},
              {"run", "--seconds"},
@@ -99,9 +146,11 @@ TEST(CommandLine, MistakesGiveTheStatusOfUsageErrors) {
              {"run", "--epoch-offset-at", "-1:5"},
              {"run", "--epoch-offset-at", "1:"},
              {"run", "--no-interfaces", "--interface", "eth0"},
+             {"run", "--json", "--plain"},
+             {"run", "--record"},
+             {"run", "--chrony"},
          }) {
-        const auto result = read(words);
-        ASSERT_TRUE(std::holds_alternative<int>(result)) << testing::PrintToString(words);
-        EXPECT_EQ(std::get<int>(result), 2) << testing::PrintToString(words);
+        EXPECT_EQ(read(words), 2) << testing::PrintToString(words);
+        EXPECT_FALSE(accepted.has_value());
     }
 }

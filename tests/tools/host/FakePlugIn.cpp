@@ -87,7 +87,11 @@ public:
         : context_(context),
           record_(config["record"]),
           script_(config["script"]),
-          fifo_(config["fifo"]) {}
+          fifo_(config["fifo"]) {
+        if (config.contains("configFile")) {
+            std::ofstream(std::string(config["configFile"])) << config.value("content", "");
+        }
+    }
 
     bool does(const std::string& word) const {
         return (" " + script_ + " ").find(" " + word + " ") != std::string::npos;

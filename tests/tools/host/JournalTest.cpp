@@ -1,12 +1,15 @@
 #include "Journal.h"
 
 #include <array>
+#include <cerrno>
+#include <optional>
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include "EventPrinter.h"
 #include "Tool.h"
 
 using namespace vantelhost;
@@ -71,7 +74,7 @@ TEST_F(JournalTest, MetadataMustBeAJsonObject) {
 
 TEST_F(JournalTest, RefusalsAndNotesLeaveTheRunClean) {
     journal.note(startedEvent());
-    journal.refusal();
+    journal.refusal("zekel_getTime");
     journal.timeRequest();
     EXPECT_TRUE(journal.isClean());
     journal.error(failureEvent("x", "y"));
@@ -91,4 +94,58 @@ TEST_F(JournalTest, LostOutputIsToldOnceAndIsNotClean) {
     EXPECT_EQ(lost, 1);
     EXPECT_FALSE(lossy.isClean());
     ::close(full);
+}
+
+TEST_F(JournalTest, ARefusalNamesTheFunction) {
+    journal.refusal("zekel_getTime");
+    EXPECT_EQ(events().at(0)["event"], "refused");
+    EXPECT_EQ(events().at(0)["function"], "zekel_getTime");
+}
+
+TEST_F(JournalTest, ALostSecondOutputIsAnErrorThatTheOthersAreToldOnce) {
+    int offered = 0;
+    journal.addOutput("record r", [&](const Event&, const Moment&) {
+        ++offered;
+        errno = ENOSPC;
+        return false;
+    });
+    journal.note(startedEvent());
+    journal.note(stoppedEvent());
+    EXPECT_EQ(offered, 1);
+    EXPECT_EQ(lost, 0);
+    EXPECT_FALSE(journal.isClean());
+    const auto shown = events();
+    ASSERT_EQ(shown.size(), 3U);
+    EXPECT_EQ(shown[1]["event"], "error");
+    EXPECT_EQ(shown[1]["operation"], "record r");
+    EXPECT_EQ(shown[1]["problem"], "No space left on device");
+    EXPECT_EQ(shown[2]["event"], "stopped");
+}
+
+TEST_F(JournalTest, EveryOutputGetsTheSameMoment) {
+    std::vector<Moment> moments;
+    for (int i = 0; i < 2; ++i) {
+        journal.addOutput("", [&](const Event&, const Moment& moment) {
+            moments.push_back(moment);
+            return true;
+        });
+    }
+    journal.note(startedEvent());
+    ASSERT_EQ(moments.size(), 2U);
+    EXPECT_EQ(moments[0].seconds, moments[1].seconds);
+    EXPECT_EQ(moments[0].realtime, moments[1].realtime);
+    EXPECT_EQ(events().at(0)["time"], moments[0].realtime);
+}
+
+TEST_F(JournalTest, WhatThePairTakerTellsFollowsThePair) {
+    journal.handPairsTo([](std::uint64_t reference, std::uint64_t local) {
+        return local == 2 ? std::optional(chronyEvent(reference, local, "")) : std::nullopt;
+    });
+    journal.pair(0, 1);
+    journal.pair(1, 2);
+    const auto shown = events();
+    ASSERT_EQ(shown.size(), 3U);
+    EXPECT_EQ(shown[1]["event"], "pair");
+    EXPECT_EQ(shown[2]["event"], "chrony");
+    EXPECT_EQ(shown[2]["sent"], 1);
 }

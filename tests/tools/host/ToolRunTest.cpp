@@ -146,6 +146,7 @@ TEST_F(ToolTest, CallsDuringTheStopAreRefusedIfAskedFor) {
     const auto result = play("late", {"--refuse-while-stopping"});
     EXPECT_EQ(result.status, 0);
     EXPECT_TRUE(result.events("quality").empty());
+    EXPECT_EQ(result.events("refused").at(0)["function"], "zekel_setTRQuality");
     EXPECT_EQ(result.events("summary").at(0)["refused"], 1);
     EXPECT_THAT(record(), testing::Contains(StartsWith("answer quality -52009 {")));
 }

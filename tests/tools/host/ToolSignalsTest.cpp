@@ -15,12 +15,13 @@ constexpr char startedEvent[] = "\"event\":\"started\"";
 
 } // namespace
 
-TEST_F(ToolTest, SigtermAndSigintStopTheRunCleanly) {
+TEST_F(ToolTest, EachStopSignalStopsTheRunCleanly) {
     struct Row {
         int number;
         const char* name;
     };
-    for (const auto& row : {Row{SIGTERM, "SIGTERM"}, Row{SIGINT, "SIGINT"}}) {
+    for (const auto& row : {Row{SIGTERM, "SIGTERM"}, Row{SIGINT, "SIGINT"}, Row{SIGHUP, "SIGHUP"},
+                            Row{SIGQUIT, "SIGQUIT"}}) {
         Child child(command({"--json", "--interface", "eth0"}));
         ASSERT_TRUE(child.waitForOutput(startedEvent));
         child.signal(row.number);

@@ -1,5 +1,7 @@
+#include "Client.h"
 #include "Daemon.h"
 
+#include <csignal>
 #include <filesystem>
 #include <gtest/gtest.h>
 
@@ -18,6 +20,21 @@ TEST(Simptp4lScript, EveryExampleParses) {
         ++count;
     }
     EXPECT_GE(count, 24U);
+}
+
+TEST(Simptp4lScript, EveryExampleRuns) {
+    for (const auto& entry : std::filesystem::directory_iterator(SIMPTP4L_EXAMPLES)) {
+        const std::string name = entry.path().stem();
+        Daemon daemon(readFile(entry.path()), {"eth0", "eth1"});
+        const auto isBound = [&] { return std::filesystem::exists(daemon.socketPath()); };
+        EXPECT_TRUE(eventually([&] { return isBound() || !daemon.process.isRunning(); })) << name;
+        if (isBound()) {
+            const Client client(daemon.folder.path("me"), daemon.socketPath());
+            EXPECT_TRUE(client.send(requests::timeStatus())) << name;
+            daemon.process.signal(name == "ignore-sigterm" ? SIGINT : SIGTERM);
+        }
+        EXPECT_EQ(daemon.process.finish().status, name == "exit-at-once" ? 3 : 0) << name;
+    }
 }
 
 TEST(Simptp4lScript, CommentsAndBlankLinesSayNothing) {

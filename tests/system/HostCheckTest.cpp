@@ -1,0 +1,83 @@
+// The reference host's command "check" with a network of its own.
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+#include "system/Scene.h"
+#include "tools/host/Child.h"
+
+using nlohmann::json;
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+namespace {
+
+using Words = std::vector<std::string>;
+
+class HostCheck : public testing::Test {
+protected:
+    void SetUp() override {
+        if (sceneInterfaces().empty()) {
+            GTEST_SKIP() << "SKIPPED: to be run in scripts/testbed.sh";
+        }
+    }
+
+    /// The checks, by name, of settings that fit the scene.
+    static json check(const std::string& udsAddress = sceneSocket()) {
+        Child host({VANTEL_HOST, "check", "--json", "--library", VANTEL_BC_LIBRARY, "--interface",
+                    sceneInterfaces()[0], "--create-fifo", "--set", "networkTransport=UDPv4",
+                    "--set", "ptpDstMac=01:1B:19:00:00:00", "--set", "udsAddress=" + udsAddress,
+                    "--set", "configFile=" + sceneVariable("TESTBED_FOLDER") + "/boundary.conf"});
+        EXPECT_EQ(host.wait(), 1);
+        const json output = json::parse(host.output());
+        json results = json::object();
+        for (const auto& each : output["checks"]) {
+            results[each["check"].get<std::string>()] = each;
+        }
+        return results;
+    }
+
+    static Words failed(const json& results) {
+        Words names;
+        for (const auto& [name, each] : results.items()) {
+            if (each["result"] == "fail") {
+                names.push_back(name);
+            }
+        }
+        return names;
+    }
+
+    static void setInterface(const char* state) {
+        Child ip({"/bin/ip", "link", "set", sceneInterfaces()[0], state});
+        ASSERT_EQ(ip.wait(), 0) << ip.errors();
+    }
+};
+
+} // namespace
+
+TEST_F(HostCheck, OnlyTimeStampsInHardwareAreMissingOnAVeth) {
+    const json results = check();
+    EXPECT_THAT(failed(results), ElementsAre("time stamping bc0")) << results.dump(1);
+    EXPECT_THAT(results["time stamping bc0"]["found"].get<std::string>(),
+                HasSubstr("missing: hardware-transmit, hardware-receive, hardware-raw-clock, "));
+    EXPECT_EQ(results["interface bc0"]["result"], "ok");
+    EXPECT_EQ(results["configuration"]["result"], "ok");
+    EXPECT_EQ(results["capabilities"]["result"], "ok");
+}
+
+TEST_F(HostCheck, TheSocketOfARunningDaemonIsInUse) {
+    const json results = check(sceneVariable("TESTBED_GRANDMASTER_UDS"));
+    EXPECT_THAT(failed(results), ElementsAre("time stamping bc0", "udsAddress in use"));
+    EXPECT_EQ(results["other daemons"]["found"],
+              "ptp4l runs already: process " + sceneVariable("TESTBED_GRANDMASTER_PID"));
+}
+
+TEST_F(HostCheck, AnInterfaceThatIsDownIsAWarning) {
+    setInterface("down");
+    const json results = check();
+    setInterface("up");
+    EXPECT_EQ(results["interface bc0"]["result"], "warn");
+    EXPECT_EQ(results["interface bc0"]["found"], "down");
+    EXPECT_EQ(results["interface bc0"]["mend"], "ip link set bc0 up");
+}

@@ -1,0 +1,90 @@
+#include "Report/Statistics.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+using namespace vantelhost;
+using testing::Each;
+using testing::ElementsAre;
+
+namespace {
+
+/// From first to last, ascending.
+std::vector<std::int64_t> range(std::int64_t first, std::int64_t last) {
+    std::vector<std::int64_t> values;
+    for (auto value = first; value <= last; ++value) {
+        values.push_back(value);
+    }
+    return values;
+}
+
+} // namespace
+
+TEST(Percentile, IsTheSmallestValueThatSoManyDoNotExceed) {
+    const std::vector<std::int64_t> values{15, 20, 35, 40, 50};
+    EXPECT_EQ(percentile(values, 0), 15);
+    EXPECT_EQ(percentile(values, 50), 15);
+    EXPECT_EQ(percentile(values, 200), 15);
+    EXPECT_EQ(percentile(values, 300), 20);
+    EXPECT_EQ(percentile(values, 400), 20);
+    EXPECT_EQ(percentile(values, 401), 35);
+    EXPECT_EQ(percentile(values, 500), 35);
+    EXPECT_EQ(percentile(values, 1000), 50);
+}
+
+TEST(Percentile, OfHundredValuesIsTheirNumber) {
+    const auto values = range(1, 100);
+    EXPECT_EQ(percentile(values, 10), 1);
+    EXPECT_EQ(percentile(values, 950), 95);
+    EXPECT_EQ(percentile(values, 990), 99);
+}
+
+TEST(Histogram, CountsEveryValueOnce) {
+    const auto result = histogram({-3, -1, 0, 0, 2, 5}, 9);
+    EXPECT_EQ(result.low, -3);
+    EXPECT_EQ(result.width, 1);
+    EXPECT_THAT(result.counts, ElementsAre(1, 0, 1, 2, 0, 1, 0, 0, 1));
+    EXPECT_EQ(result.below + result.above, 0U);
+}
+
+TEST(Histogram, HasBinsOfARoundWidthThatBeginAtAMultipleOfIt) {
+    const auto result = histogram(range(-7, 92), 25);
+    EXPECT_EQ(result.width, 5);
+    EXPECT_EQ(result.low, -10);
+    EXPECT_EQ(result.counts.size(), 21U);
+    EXPECT_EQ(result.counts.front(), 2U);
+    EXPECT_EQ(result.counts[1], 5U);
+    EXPECT_EQ(result.counts.back(), 3U);
+}
+
+TEST(Histogram, FewValuesFarAwayAreOnlyCounted) {
+    auto values = range(0, 999);
+    values.insert(values.begin(), -1000000);
+    values.insert(values.end(), {2000000, 3000000});
+    const auto result = histogram(values, 60);
+    EXPECT_EQ(result.below, 1U);
+    EXPECT_EQ(result.above, 2U);
+    EXPECT_EQ(result.width, 50);
+    EXPECT_EQ(result.low, -500);
+}
+
+TEST(Histogram, OfEqualValuesIsOneBin) {
+    const auto result = histogram({7, 7, 7}, 60);
+    EXPECT_EQ(result.low, 7);
+    EXPECT_THAT(result.counts, ElementsAre(3));
+}
+
+TEST(Histogram, OfEqualValuesButOneReachesThatOne) {
+    std::vector<std::int64_t> values(1000, 0);
+    values.push_back(100);
+    const auto result = histogram(values, 10);
+    EXPECT_EQ(result.counts.front(), 1000U);
+    EXPECT_EQ(result.counts.back(), 1U);
+}
+
+TEST(Histogram, TakesTheWholeRangeOfOffsets) {
+    const auto result = histogram({INT64_MIN, 0, INT64_MAX}, 60);
+    EXPECT_EQ(result.counts.front(), 1U);
+    EXPECT_EQ(result.counts.back(), 1U);
+    EXPECT_LE(result.counts.size(), 62U);
+}

@@ -1,0 +1,111 @@
+// What a run leaves in the record and hands to chronyd.
+
+#include <csignal>
+#include <ctime>
+
+#include <sys/stat.h>
+
+#include "Child.h"
+#include "Tool.h"
+
+using testing::HasSubstr;
+using vantelhost::Json;
+
+namespace {
+
+class ToolRecordTest : public ToolTest {
+protected:
+    Result recorded() const { return {0, contentOf(file), ""}; }
+
+    std::string file = folder.path("run.jsonl");
+};
+
+} // namespace
+
+TEST_F(ToolRecordTest, HasTheLinesOfTheJsonOutput) {
+    const auto result = play("quality pairs metadata bad-metadata", {"--record", file});
+    EXPECT_EQ(contentOf(file), result.output);
+    EXPECT_EQ(recorded().events("pair").size(), 3U);
+    EXPECT_EQ(recorded().events().back()["event"], "summary");
+}
+
+TEST_F(ToolRecordTest, IsTheSameWithReadableOutput) {
+    ASSERT_EQ(run({"--interface", "eth0", "--seconds", "0", "--set", "script=pairs metadata",
+                   "--record", file})
+                  .status,
+              0);
+    EXPECT_EQ(recorded().events("pair").at(0)["reference"], 1000);
+    EXPECT_EQ(recorded().events("metadata").at(0)["metadata"]["gmClockClass"], 6);
+}
+
+TEST_F(ToolRecordTest, EveryLineHasTheMomentInBothClocks) {
+    const auto before = std::time(nullptr);
+    play("pairs", {"--record", file});
+    const auto events = recorded().events();
+    double last = 0;
+    for (const auto& event : events) {
+        const double seconds = event["time"].get<double>() / 1e9;
+        EXPECT_GE(seconds, static_cast<double>(before));
+        EXPECT_LE(seconds, static_cast<double>(std::time(nullptr) + 1));
+        EXPECT_GE(event["t"].get<double>(), last);
+        last = event["t"].get<double>();
+    }
+}
+
+TEST_F(ToolRecordTest, AKilledHostLosesNothing) {
+    Child child(command(
+        {"--json", "--interface", "eth0", "--set", "script=quality pairs", "--record", file}));
+    ASSERT_TRUE(child.waitForOutput("\"event\":\"started\""));
+    child.signal(SIGKILL);
+    EXPECT_EQ(child.wait(), 1000 + SIGKILL);
+    EXPECT_EQ(recorded().events("pair").size(), 3U);
+    EXPECT_EQ(contentOf(file).back(), '\n');
+}
+
+TEST_F(ToolRecordTest, AnOldFileIsReplaced) {
+    writeFile(file, "old\n");
+    play("", {"--record", file});
+    EXPECT_EQ(recorded().events().at(0)["event"], "loaded");
+}
+
+TEST_F(ToolRecordTest, AnUnwritablePathIsAMistake) {
+    const auto result = play("", {"--record", folder.path("none/run.jsonl")});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.errors, "vantel-host: cannot write " + folder.path("none/run.jsonl") +
+                                 ": No such file or directory\n");
+    EXPECT_TRUE(record().empty());
+}
+
+TEST_F(ToolRecordTest, AFullDiskIsToldBeforeAnythingBegins) {
+    const auto result = play("", {"--record", "/dev/full"});
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.events("error").at(0)["operation"], "record /dev/full");
+    EXPECT_EQ(result.events("error").at(0)["problem"], "No space left on device");
+    EXPECT_TRUE(record().empty());
+}
+
+TEST_F(ToolRecordTest, AFileThatFillsLaterIsToldOnceAndTheRunGoesOn) {
+    // A pipe whose reader goes away after the first events.
+    const std::string pipe = folder.path("pipe");
+    ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+    Child reader({"/bin/sh", "-c", "head -n 3 " + pipe});
+    const auto result =
+        play("pairs", {"--record", pipe, "--create-fifo", "--fifo", folder.path("epoch"),
+                       "--epoch-offset-at", "0:1", "--seconds", "1"});
+    EXPECT_EQ(reader.wait(), 0);
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.events("stopping").at(0)["cause"], "duration");
+    ASSERT_EQ(result.events("error").size(), 1U);
+    EXPECT_EQ(result.events("error")[0]["problem"], "Broken pipe");
+    EXPECT_EQ(ToolTest::record().back(), "finalise");
+}
+
+TEST_F(ToolRecordTest, WithoutChronydTheRunIsCleanAndSaysSoOnceAndAtTheEnd) {
+    const auto result = play("pairs", {"--chrony", folder.path("none")});
+    EXPECT_EQ(result.status, 0);
+    const auto told = result.events("chrony");
+    ASSERT_EQ(told.size(), 2U);
+    EXPECT_EQ(told[0]["reachable"], false);
+    EXPECT_EQ(told[1]["failed"], 3);
+    EXPECT_EQ(told[1]["sent"], 0);
+}

@@ -1,0 +1,308 @@
+// The command "report".
+
+#include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <regex>
+#include <sstream>
+
+#include "Child.h"
+#include "Tool.h"
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::Not;
+using vantelhost::Json;
+
+namespace {
+
+/// The program's file; empty when it is not installed.
+std::string installed(const std::string& program) {
+    const char* path = std::getenv("PATH");
+    std::istringstream folders(path == nullptr ? "" : path);
+    for (std::string folder; std::getline(folders, folder, ':');) {
+        if (std::filesystem::exists(folder + "/" + program)) {
+            return folder + "/" + program;
+        }
+    }
+    return "";
+}
+
+std::size_t count(const std::string& text, const std::string& word) {
+    std::size_t number = 0;
+    for (auto at = text.find(word); at != std::string::npos; at = text.find(word, at + 1)) {
+        ++number;
+    }
+    return number;
+}
+
+/// A host that was started at 1000 s, and had a pair each 125 ms but for a gap.
+class Record {
+public:
+    Record& add(const std::string& event, double seconds, const std::string& members = "") {
+        Json object{{"event", event},
+                    {"t", seconds},
+                    {"time", static_cast<std::uint64_t>((1000 + seconds) * 1e9)}};
+        object.update(Json::parse("{" + members + "}"));
+        text += object.dump() + "\n";
+        return *this;
+    }
+
+    Record& pairs(int number, double first) {
+        for (int i = 0; i < number; ++i) {
+            const auto local = static_cast<std::uint64_t>((1000 + first + i * 0.125) * 1e9);
+            const auto offset = i * i - 20;
+            const auto members = Json{
+                {"local", local},
+                {"reference", local - static_cast<std::uint64_t>(offset)},
+                {"offset", offset}}.dump();
+            add("pair", first + i * 0.125 + 0.003, members.substr(1, members.size() - 2));
+        }
+        return *this;
+    }
+
+    std::string text;
+};
+
+/// A recording with everything, and with texts that are no harm as long as they are escaped.
+std::string wholeRecord() {
+    Record record;
+    record.add("loaded", 0.1, R"("name":"<b>IEEE</b>","library":"x.so")")
+        .add("initialised", 0.2, R"("configuration":{"priority1":128,"interface":["<i>"]})")
+        .add("quality", 0.3, R"("quality":"unusable","reason":"<script>alert(1)</script>")")
+        .add("metadata", 0.4, R"("valid":true,"metadata":{"gmClockId":"a&b"})")
+        .add("metadata", 0.5,
+             R"("valid":true,"metadata":{"gmClockId":"a&b",
+                "Port1":{"portState":"PTP_LISTENING","interface":"\"; system('x')\nq"},
+                "Port2":{"portState":"PTP_MASTER","interface":"eth1"}})")
+        .add("metadata", 1,
+             R"("valid":true,"metadata":{"gmClockId":"a&b",
+                "Port1":{"portState":"PTP_SLAVE","interface":"\"; system('x')\nq"},
+                "Port2":{"portState":"PTP_MASTER","interface":"eth1"}})")
+        .add("quality", 1, R"("quality":"usable","reason":"PTP role has changed.")")
+        .pairs(6, 2)
+        .pairs(12, 10)
+        .add("error", 12, R"("operation":"<u>","problem":"it's broken")")
+        .add("summary", 13);
+    return record.text;
+}
+
+class ToolReportTest : public ToolTest {
+protected:
+    Result report(const Words& words, const std::vector<std::string>& environment = {}) const {
+        Words command{HOST_TOOL, "report"};
+        command.insert(command.end(), words.begin(), words.end());
+        Child child(command, environment);
+        const int status = child.wait();
+        return {status, child.output(), child.errors()};
+    }
+
+    /// The page of this record. A report that fails, fails the test.
+    std::string pageOf(const std::string& record) const {
+        writeFile(recording, record);
+        const auto result = report({recording, "-o", page});
+        EXPECT_EQ(result.status, 0) << result.errors;
+        EXPECT_EQ(result.output + result.errors, "");
+        return contentOf(page);
+    }
+
+    std::string recording = folder.path("run.jsonl");
+    std::string page = folder.path("run.html");
+};
+
+/// Those that draw.
+class ToolReportDrawingTest : public ToolReportTest {
+protected:
+    void SetUp() override {
+        if (installed("gnuplot").empty()) {
+            GTEST_SKIP() << "SKIPPED: there is no gnuplot (package gnuplot-nox)";
+        }
+    }
+
+    /// The drawing of this name in a page.
+    static std::string drawing(const std::string& html, const std::string& name) {
+        const auto begin = html.find("<g id=\"" + name + "\"");
+        return begin == std::string::npos ? ""
+                                          : html.substr(begin, html.find("</svg>", begin) - begin);
+    }
+
+    /// The data of a line: what follows d= in the path of the line's colour.
+    static std::string pathOf(const std::string& drawing) {
+        const std::string start = "stroke='rgb( 43, 108, 176)'  d='";
+        const auto begin = drawing.find(start);
+        if (begin == std::string::npos) {
+            return "";
+        }
+        return drawing.substr(begin + start.size(),
+                              drawing.find('\'', begin + start.size()) - begin - start.size());
+    }
+};
+
+} // namespace
+
+TEST_F(ToolReportDrawingTest, HasEverySection) {
+    const auto html = pageOf(wholeRecord());
+    for (const char* title :
+         {"Summary", "Offset", "Distribution of the offset", "Allan deviation", "Pair intervals",
+          "Poll delay", "Quality", "Port states", "Errors", "Last metadata", "Settings"}) {
+        EXPECT_THAT(html, HasSubstr("<h2>" + std::string(title) + "</h2>"));
+    }
+    EXPECT_EQ(count(html, "<svg role=\"img\""), 7U);
+    EXPECT_EQ(count(html, "<title>"), 8U);
+    EXPECT_THAT(html, HasSubstr("<tr><td>Time pairs</td><td>18</td></tr>"));
+    EXPECT_THAT(html, HasSubstr("<tr><td>Quality usable</td><td>12 s (92.3 %)</td></tr>"));
+    EXPECT_THAT(html, Not(HasSubstr("class=\"note\"")));
+}
+
+TEST_F(ToolReportDrawingTest, OffsetIsALineThroughEveryPairThatIsBrokenInTheGap) {
+    const auto path = pathOf(drawing(pageOf(wholeRecord()), "offset"));
+    EXPECT_EQ(count(path, "M"), 2U) << path;
+    EXPECT_EQ(count(path, "L"), 16U) << path;
+}
+
+TEST_F(ToolReportDrawingTest, AllanDeviationHasAPointForEachOctave) {
+    // 82 places of 125 ms: 1, 2 and 4 of them fit into the pairs between gaps.
+    const auto html = pageOf(wholeRecord());
+    EXPECT_EQ(count(pathOf(drawing(html, "deviation")), "L"), 2U);
+    EXPECT_THAT(html, HasSubstr("<tr><td>0.125 s</td><td>1.131e-08</td><td>14</td></tr>"));
+    EXPECT_THAT(html, HasSubstr("missed Syncs and gaps: 58."));
+}
+
+TEST_F(ToolReportDrawingTest, TimeLinesHaveABarForEachState) {
+    const auto html = pageOf(wholeRecord());
+    EXPECT_EQ(count(drawing(html, "quality"), "<polygon"), 2U);
+    EXPECT_EQ(count(drawing(html, "ports"), "<polygon"), 3U);
+    EXPECT_THAT(drawing(html, "ports"), HasSubstr("Port2 eth1"));
+}
+
+TEST_F(ToolReportDrawingTest, NothingOfTheRecordingIsTakenForHtmlOrForACommand) {
+    const auto html = pageOf(wholeRecord());
+    for (const char* harm : {"<script", "<b>", "<i>", "<u>", "a&b"}) {
+        EXPECT_THAT(html, Not(HasSubstr(harm)));
+    }
+    EXPECT_THAT(html, HasSubstr("&lt;script&gt;alert(1)&lt;/script&gt;"));
+    EXPECT_THAT(drawing(html, "ports"), HasSubstr("Port1 ?? system??x"));
+}
+
+TEST_F(ToolReportDrawingTest, NeedsNothingFromElsewhere) {
+    const auto html = pageOf(wholeRecord());
+    EXPECT_EQ(count(html, "http"), count(html, "xmlns=\"http") + count(html, "xmlns:xlink=\"http"));
+    EXPECT_THAT(html, AllOf(Not(HasSubstr("src=")), Not(HasSubstr("url(")),
+                            Not(HasSubstr("@import")), Not(HasSubstr("<link"))));
+    EXPECT_EQ(count(html, "href="), count(html, "href='#"));
+}
+
+TEST_F(ToolReportDrawingTest, IsWellFormedAndEveryIdIsUnique) {
+    const auto checker = installed("xmllint");
+    if (checker.empty()) {
+        GTEST_SKIP() << "SKIPPED: there is no xmllint (package libxml2-utils)";
+    }
+    const auto html = pageOf(wholeRecord());
+    Child child({checker, "--nonet", "--noout", page});
+    EXPECT_EQ(child.wait(), 0) << child.errors();
+    std::vector<std::string> ids;
+    const std::regex id(R"(\bid=['"]([^'"]*)['"])");
+    for (std::sregex_iterator each(html.begin(), html.end(), id), end; each != end; ++each) {
+        ids.push_back((*each)[1]);
+    }
+    std::sort(ids.begin(), ids.end());
+    EXPECT_GT(ids.size(), 7U);
+    EXPECT_EQ(std::adjacent_find(ids.begin(), ids.end()), ids.end());
+}
+
+TEST_F(ToolReportDrawingTest, ABrowserShowsAllOfIt) {
+    const auto browser = installed("chromium");
+    if (browser.empty()) {
+        GTEST_SKIP() << "SKIPPED: there is no chromium";
+    }
+    pageOf(wholeRecord());
+    Child child({browser, "--headless", "--no-sandbox", "--disable-gpu",
+                 "--user-data-dir=" + folder.path("browser"), "--dump-dom", "file://" + page});
+    ASSERT_EQ(child.wait(), 0) << child.errors();
+    EXPECT_EQ(count(child.output(), "<section>"), 11U);
+    EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 7U);
+    EXPECT_EQ(count(child.output(), "</svg>"), 7U);
+}
+
+TEST_F(ToolReportDrawingTest, OnePairAloneIsEnough) {
+    const auto html = pageOf(Record().pairs(1, 1).text);
+    EXPECT_THAT(html, HasSubstr("There is one pair only."));
+    EXPECT_EQ(count(pathOf(drawing(html, "offset")), "L"), 1U);
+}
+
+TEST_F(ToolReportDrawingTest, ExtremeOffsetsAreDrawn) {
+    const std::string members = R"("reference":0,"local":5,"offset":)";
+    const auto html = pageOf(Record()
+                                 .add("pair", 1, members + "9223372036854775807")
+                                 .add("pair", 2, members + "-9223372036854775808")
+                                 .text);
+    EXPECT_THAT(html, HasSubstr("9.223e+09 s"));
+    EXPECT_NE(drawing(html, "histogram"), "");
+}
+
+TEST_F(ToolReportDrawingTest, ManyPairsAreThinnedOut) {
+    const auto html = pageOf(Record().pairs(20000, 1).text);
+    EXPECT_THAT(html, HasSubstr("the lowest and the highest value of each of 1500"));
+    EXPECT_LE(count(pathOf(drawing(html, "offset")), "L"), 3000U);
+    EXPECT_GE(count(pathOf(drawing(html, "offset")), "L"), 1500U);
+}
+
+TEST_F(ToolReportTest, AnEmptyRecordingGivesAPageThatSaysSo) {
+    EXPECT_THAT(pageOf(""), HasSubstr("The recording is empty."));
+}
+
+TEST_F(ToolReportTest, ARecordingOfNothingButTheStartNeedsNoDrawing) {
+    const auto html = pageOf(Record().add("started", 1).text);
+    EXPECT_THAT(html,
+                AllOf(HasSubstr("There are no time pairs."), HasSubstr("No quality was reported."),
+                      HasSubstr("No port"), HasSubstr("No errors, warnings or refused calls.")));
+}
+
+TEST_F(ToolReportTest, AKilledHostAndACutLineAreTold) {
+    const auto html = pageOf(Record().add("started", 1).text + R"({"event":"pa)");
+    EXPECT_THAT(html, AllOf(HasSubstr("The last line of the recording is cut"),
+                            HasSubstr("the host still ran, or was killed")));
+}
+
+TEST_F(ToolReportTest, WithoutGnuplotThereIsAnErrorAndNoPage) {
+    writeFile(recording, wholeRecord());
+    const auto result = report({recording, "-o", page}, {"PATH=" + folder.path("nowhere")});
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.errors, "vantel-host: there is no gnuplot; Debian's package is gnuplot-nox\n");
+    EXPECT_FALSE(std::filesystem::exists(page));
+}
+
+TEST_F(ToolReportTest, AFileThatIsNoRecordingIsAMistake) {
+    writeFile(recording, Record().add("started", 1).text + "hello\n");
+    const auto result = report({recording, "-o", page});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_THAT(result.errors, HasSubstr(recording + ":2: this is no record of vantel-host: "));
+    EXPECT_FALSE(std::filesystem::exists(page));
+}
+
+TEST_F(ToolReportTest, WhatCannotBeReadOrWrittenIsNamed) {
+    EXPECT_EQ(report({"/nowhere/a", "-o", page}).errors,
+              "vantel-host: cannot read /nowhere/a: No such file or directory\n");
+    EXPECT_EQ(report({"/", "-o", page}).errors, "vantel-host: cannot read /: Is a directory\n");
+    writeFile(recording, "");
+    EXPECT_EQ(report({recording, "-o", "/nowhere/a"}).errors,
+              "vantel-host: cannot write /nowhere/a: No such file or directory\n");
+    const auto full = report({recording, "-o", "/dev/full"});
+    EXPECT_EQ(full.status, 1);
+    EXPECT_EQ(full.errors, "vantel-host: cannot write /dev/full: No space left on device\n");
+}
+
+TEST_F(ToolReportTest, TheRecordingIsNotReplacedByItsPage) {
+    writeFile(recording, wholeRecord());
+    EXPECT_EQ(report({recording, "-o", recording}).status, 2);
+    EXPECT_EQ(contentOf(recording), wholeRecord());
+}
+
+TEST_F(ToolReportDrawingTest, MakesAPageOfARealRecord) {
+    EXPECT_EQ(play("quality pairs metadata bad-metadata", {"--record", recording}).status, 1);
+    const auto result = report({recording, "-o", page});
+    EXPECT_EQ(result.status, 0) << result.errors;
+    EXPECT_THAT(contentOf(page),
+                AllOf(HasSubstr("<td>Time pairs</td><td>3</td>"),
+                      HasSubstr("<td>Errors</td><td>1</td>"), Not(HasSubstr("class=\"note\""))));
+}

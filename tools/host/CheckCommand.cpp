@@ -1,0 +1,73 @@
+#include "CheckCommand.h"
+
+#include <cstdio>
+#include <memory>
+#include <string>
+
+#include <CLI/CLI.hpp>
+#include <fmt/format.h>
+
+#include "Checks/CheckText.h"
+#include "Checks/Checks.h"
+#include "Checks/PlugInTrial.h"
+#include "Checks/Subject.h"
+#include "SettingsOptions.h"
+#include "Text.h"
+#include "UsageError.h"
+
+namespace vantelhost {
+
+namespace {
+
+struct Options : SettingsOptions {
+    Subject subject; ///< with the paths that the user named
+    bool json = false;
+};
+
+void addPath(CLI::App& command, const char* name, std::string& path, const char* description) {
+    command.add_option(name, path, description)->type_name("PATH")->capture_default_str();
+}
+
+int check(const Options& options) {
+    PlugInTrial trial(options.pluginPath, userSettings(options, readConfig(options)));
+    CheckResults results = trial.run();
+    Subject subject = options.subject;
+    subject.settings = trial.settings();
+    subject.rendered = trial.rendered();
+    subject.interfaces = subject.settings
+                             ? subject.settings->at("interface").get<std::vector<std::string>>()
+                             : options.interfaces;
+    for (auto& result : checkMachine(subject)) {
+        results.push_back(std::move(result));
+    }
+    const std::string text =
+        options.json ? toAscii(checkJson(results)) + "\n" : checkLines(results);
+    std::fputs(text.c_str(), stdout);
+    return std::fflush(stdout) == 0 && allHold(results) ? exitClean : exitFailed;
+}
+
+} // namespace
+
+std::function<int()> prepareCheck(CLI::App& command) {
+    const auto options = std::make_shared<Options>();
+    addSettingsOptions(command, *options);
+    Subject& subject = options->subject;
+    addPath(command, "--ptp4l", subject.daemon,
+            "The daemon that the plug-in was built to start (VANTEL_PTP4L_PATH)");
+    addPath(command, "--socket-prefix", subject.socketPrefix,
+            "The plug-in's own socket as built, without the process id "
+            "(VANTEL_LOCAL_SOCKET_PREFIX)");
+    addPath(command, "--fifo", subject.fifo, "The FIFO of epoch offsets");
+    command.add_flag("--create-fifo", subject.createFifo,
+                     "The run will create the FIFO if it is absent");
+    command.add_flag("--json", options->json, "Print a JSON object");
+    command.footer(
+        "A line for each check: \"ok\", \"FAIL\", \"warn\" or \"skip\", what was found, and how to "
+        "mend it.\nNothing is started or left behind: the plug-in writes ptp4l's file into a "
+        "temporary folder, and\nptp4l reads it without an interface.\nExit status: 0 when no check "
+        "fails (warnings do not count); 1 when one does, or the output is\nlost; 2 for a bad "
+        "option or configuration file.");
+    return [options] { return check(*options); };
+}
+
+} // namespace vantelhost

@@ -1,0 +1,180 @@
+#include "Checks/DaemonChecks.h"
+
+#include <cctype>
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+
+#include <fmt/format.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "Checks/Access.h"
+#include "Checks/TimedProgram.h"
+
+namespace vantelhost {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+/// Where Debian has it.
+constexpr char usualDaemon[] = "/usr/sbin/ptp4l";
+
+bool isExecutable(const std::string& path) {
+    struct stat state {};
+    return ::stat(path.c_str(), &state) == 0 && S_ISREG(state.st_mode) && isAllowed(path, X_OK);
+}
+
+/// The only section of the plug-in's file. Another one could be that of an interface, with which
+/// ptp4l would start a clock.
+bool hasOtherSections(const std::string& text) {
+    const std::string section = "[global]";
+    const auto begin = text.find(section);
+    return text.find('[') != begin ||
+           (begin != std::string::npos && text.find('[', begin + 1) != std::string::npos);
+}
+
+std::string contentOf(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+std::string firstLine(const std::string& text) {
+    const auto begin = text.find_first_not_of(" \n");
+    return begin == std::string::npos ? "" : text.substr(begin, text.find('\n', begin) - begin);
+}
+
+std::string shownEnd(const ProgramEnd& end) {
+    const std::string line = firstLine(end.output);
+    if (!line.empty()) {
+        return "it says: " + line;
+    }
+    return WIFSIGNALED(end.status)
+               ? fmt::format("it was ended by signal {}, without a word", WTERMSIG(end.status))
+               : fmt::format("it ended with status {}, without a word", WEXITSTATUS(end.status));
+}
+
+bool isWordAt(const std::string& text, std::size_t begin, std::size_t length) {
+    const auto isPart = [&](std::size_t place) {
+        return place < text.size() &&
+               (std::isalnum(static_cast<unsigned char>(text[place])) != 0 || text[place] == '_');
+    };
+    return !(begin > 0 && isPart(begin - 1)) && !isPart(begin + length);
+}
+
+bool hasWord(const std::string& text, const std::string& word) {
+    for (auto at = text.find(word); at != std::string::npos; at = text.find(word, at + 1)) {
+        if (isWordAt(text, at, word.size())) {
+            return true;
+        }
+    }
+    return false;
+}
+
+} // namespace
+
+Finding checkDaemon(const Subject& subject) {
+    const std::string& path = subject.daemon;
+    if (isExecutable(path)) {
+        return good(path);
+    }
+    struct stat state {};
+    if (::stat(path.c_str(), &state) != 0) {
+        const std::string problem = fmt::format("{}: {}", path, std::strerror(errno));
+        return bad(problem,
+                   isExecutable(usualDaemon)
+                       ? fmt::format("ln -sf {} {}", usualDaemon, path)
+                       : fmt::format("install linuxptp, then ln -sf {} {}", usualDaemon, path));
+    }
+    return S_ISREG(state.st_mode)
+               ? bad(path + ": is not executable", fmt::format("chmod +x {}", path))
+               : bad(path + ": is not a program", "put ptp4l, or a link to it, there");
+}
+
+std::string mendFor(const std::string& complaint) {
+    static constexpr struct {
+        const char* option; ///< of ptp4l
+        const char* key;    ///< the plug-in's parameter
+    } rows[] = {
+        {"priority1", "priority1"},
+        {"priority2", "priority2"},
+        {"offsetScaledLogVariance", "offsetScaledLogVariance"},
+        {"logAnnounceInterval", "logAnnounceInterval"},
+        {"logSyncInterval", "logSyncInterval"},
+        {"syncReceiptTimeout", "syncReceiptTimeout"},
+        {"neighborPropDelayThresh", "neighborPropDelayThreshold"},
+        {"assume_two_step", "assumeTwoStep"},
+        {"path_trace_enabled", "pathTraceEnabled"},
+        {"follow_up_info", "followUpInfo"},
+        {"transportSpecific", "transportSpecific"},
+        {"ptp_dst_mac", "ptpDstMac"},
+        {"delay_mechanism", "delayMechanism"},
+    };
+    if (hasWord(complaint, "network_transport")) {
+        return "--set networkTransport=UDPv4 --set ptpDstMac=01:1B:19:00:00:00; UDPv4RAW needs "
+               "another ptp4l than that of linuxptp";
+    }
+    for (const auto& row : rows) {
+        if (hasWord(complaint, row.option)) {
+            return fmt::format("another value: --set {}=...", row.key);
+        }
+    }
+    return {};
+}
+
+Finding checkConfiguration(const Subject& subject) {
+    return checkConfigurationWithin(subject, std::chrono::seconds(10));
+}
+
+Finding checkConfigurationWithin(const Subject& subject, std::chrono::milliseconds longest) {
+    if (!subject.rendered) {
+        return skipped("the plug-in wrote no file");
+    }
+    if (!isExecutable(subject.daemon)) {
+        return skipped("there is no daemon");
+    }
+    if (hasOtherSections(contentOf(*subject.rendered))) {
+        return skipped("a setting adds a section, with which ptp4l could start a clock");
+    }
+    const auto end = runTimed({subject.daemon, "-f", *subject.rendered, "-m", "-q"}, longest);
+    if (end.error != 0) {
+        return bad(fmt::format("{}: {}", subject.daemon, std::strerror(end.error)),
+                   "put ptp4l, or a link to it, there");
+    }
+    if (end.timedOut) {
+        return bad(fmt::format("{} did not end without an interface", subject.daemon),
+                   "put ptp4l, or a link to it, there");
+    }
+    // ptp4l's last complaint, when its file is read.
+    if (end.output.find("no interface specified") != std::string::npos) {
+        return good("ptp4l takes it");
+    }
+    return bad(shownEnd(end), mendFor(end.output));
+}
+
+Finding checkOtherDaemons(const Subject& subject) {
+    std::string processes;
+    std::error_code error;
+    for (fs::directory_iterator each(subject.proc, error), end; !error && each != end;
+         each.increment(error)) {
+        const std::string name = each->path().filename();
+        const bool isProcess = name.find_first_not_of("0123456789") == std::string::npos;
+        if (isProcess && contentOf(each->path() / "comm") == "ptp4l\n") {
+            processes += " " + name;
+        }
+    }
+    if (error) {
+        return skipped(fmt::format("{}: {}", subject.proc, error.message()));
+    }
+    if (!processes.empty()) {
+        return doubtful("ptp4l runs already: process" + processes,
+                        "end it, unless it uses other interfaces and sockets");
+    }
+    return good("none");
+}
+
+} // namespace vantelhost

@@ -1,0 +1,39 @@
+/// @file
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "Checks/TimeStamping.h"
+#include "Json.h"
+
+namespace vantelhost {
+
+/// What is checked, and where the machine shows itself.
+struct Subject {
+    /// The paths that are compiled into the plug-in.
+    std::string daemon = "/usr/bin/ptp4l";
+    std::string socketPrefix = "/var/run/ptp4lTimeRef."; ///< the process id follows
+    std::string fifo = "/tmp/quillEpochOffset";
+    bool createFifo = false; ///< by whoever will run the plug-in
+
+    std::vector<std::string> interfaces;
+    std::optional<Json> settings;        ///< complete and accepted, if there are such
+    std::optional<std::string> rendered; ///< the file that the plug-in wrote, if it did
+
+    std::string proc = "/proc";
+    std::string dev = "/dev";
+    TimeStamping (*timeStamping)(const std::string& interface) = readTimeStamping;
+};
+
+/// A setting that is a string; nothing when there are no settings, or it is none.
+inline std::optional<std::string> setting(const Subject& subject, const char* key) {
+    if (!subject.settings || !subject.settings->contains(key) ||
+        !subject.settings->at(key).is_string()) {
+        return std::nullopt;
+    }
+    return subject.settings->at(key).get<std::string>();
+}
+
+} // namespace vantelhost

@@ -1,0 +1,60 @@
+#include "ChronyClock.h"
+
+#include <cerrno>
+#include <cstring>
+#include <system_error>
+#include <utility>
+
+#include <fmt/format.h>
+#include <sys/socket.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+#include "SockSample.h"
+#include "UsageError.h"
+
+namespace vantelhost {
+
+ChronyClock::ChronyClock(std::string path) : path_(std::move(path)) {
+    if (path_.size() >= sizeof(sockaddr_un::sun_path)) {
+        throw UsageError(fmt::format("the path of chronyd's socket is too long: {}", path_));
+    }
+    descriptor_ = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0);
+    if (descriptor_ < 0) {
+        throw std::system_error(errno, std::system_category(), "a socket for chronyd");
+    }
+}
+
+ChronyClock::~ChronyClock() {
+    ::close(descriptor_);
+}
+
+std::optional<Event> ChronyClock::take(std::uint64_t reference, std::uint64_t local) {
+    const int error = send(sockSample(reference, local));
+    ++(error == 0 ? sent_ : failed_);
+    const bool isNews = error_ < 0 || (error == 0) != (error_ == 0);
+    error_ = error;
+    return isNews ? std::optional(state()) : std::nullopt;
+}
+
+Event ChronyClock::state() const {
+    if (error_ < 0) {
+        return chronyEvent(sent_, failed_, "there was none");
+    }
+    return chronyEvent(
+        sent_, failed_,
+        error_ == 0 ? "" : fmt::format("{}: {}", path_, std::system_category().message(error_)));
+}
+
+/// To the path each time: chronyd may come later, and makes a new socket when it is restarted.
+/// @return 0 or an errno.
+int ChronyClock::send(const std::string& datagram) const {
+    sockaddr_un address{};
+    address.sun_family = AF_UNIX;
+    std::memcpy(address.sun_path, path_.data(), path_.size());
+    const ssize_t sent = ::sendto(descriptor_, datagram.data(), datagram.size(), MSG_NOSIGNAL,
+                                  reinterpret_cast<const sockaddr*>(&address), sizeof(address));
+    return sent < 0 ? errno : 0;
+}
+
+} // namespace vantelhost

@@ -1,0 +1,39 @@
+/// @file
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+
+#include "Events.h"
+
+namespace vantelhost {
+
+/// Hands time pairs to chronyd's reference clock SOCK. Never waits: a pair that chronyd does not
+/// take is dropped and counted, the next one is tried again.
+class ChronyClock {
+public:
+    /// @param path chronyd's socket, which need not be there yet. Throws UsageError when it is too
+    ///             long, std::system_error when there is no socket to send from.
+    explicit ChronyClock(std::string path);
+    ~ChronyClock();
+    ChronyClock(const ChronyClock&) = delete;
+    ChronyClock& operator=(const ChronyClock&) = delete;
+
+    /// @return an event when handing over begins to work or to fail.
+    std::optional<Event> take(std::uint64_t reference, std::uint64_t local);
+
+    /// How it stands.
+    Event state() const;
+
+private:
+    int send(const std::string& datagram) const;
+
+    const std::string path_;
+    int descriptor_ = -1;
+    std::uint64_t sent_ = 0;
+    std::uint64_t failed_ = 0;
+    int error_ = -1; ///< errno of the last pair; 0 after success, -1 before the first
+};
+
+} // namespace vantelhost

@@ -1,0 +1,22 @@
+/// @file
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+
+namespace vantelhost {
+
+/// CLOCK_REALTIME: nanoseconds since 1970.
+std::uint64_t realtimeNanoseconds();
+
+/// When something happened, in both clocks.
+struct Moment {
+    using Clock = std::chrono::steady_clock;
+
+    static Moment now(Clock::time_point begin);
+
+    double seconds;         ///< since the beginning
+    std::uint64_t realtime; ///< nanoseconds since 1970
+};
+
+} // namespace vantelhost

@@ -1,0 +1,27 @@
+/// @file
+/// Parts of an HTML page. Texts are escaped here; what is called html is not.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace vantelhost {
+
+/// The text as content or as the value of an attribute. Control characters become \xNN.
+std::string escaped(std::string_view text);
+
+std::string paragraph(std::string_view text);
+
+/// A paragraph that must not be missed.
+std::string note(std::string_view text);
+
+std::string section(std::string_view title, std::string_view html);
+
+using Row = std::vector<std::string>;
+
+/// @param head the texts of the heading; may be empty
+/// @param rows the texts of the cells
+std::string table(const Row& head, const std::vector<Row>& rows);
+
+} // namespace vantelhost

@@ -1,0 +1,18 @@
+/// @file
+/// Drawings of time lines, as HTML.
+#pragma once
+
+#include <string>
+
+#include "Report/Drawing.h"
+#include "Report/TimeLine.h"
+
+namespace vantelhost {
+
+/// @param duration of the axis, seconds
+std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, double duration);
+
+/// What the colours of a time line mean, as HTML.
+std::string timeLineLegend(const TimeLine& timeLine);
+
+} // namespace vantelhost

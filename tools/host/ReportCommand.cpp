@@ -1,0 +1,66 @@
+#include "ReportCommand.h"
+
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <memory>
+#include <stdexcept>
+#include <string>
+
+#include <CLI/CLI.hpp>
+#include <fmt/format.h>
+
+#include "RecordFile.h"
+#include "Report/Page.h"
+#include "Report/RecordingReader.h"
+#include "UsageError.h"
+#include "WriteAll.h"
+
+namespace vantelhost {
+
+namespace {
+
+struct Options {
+    std::string recording;
+    std::string page;
+};
+
+Recording readRecording(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    if (!file) {
+        throw UsageError(fmt::format("cannot read {}: {}", path, std::strerror(errno)));
+    }
+    return RecordingReader::read(file, path);
+}
+
+/// The page is complete before the file is touched.
+int makeReport(const Options& options) {
+    std::error_code ignored;
+    if (std::filesystem::equivalent(options.recording, options.page, ignored)) {
+        throw UsageError("the page would replace the recording " + options.recording);
+    }
+    const auto name = std::filesystem::path(options.recording).filename().string();
+    const std::string page = reportPage(readRecording(options.recording), name);
+    const RecordFile file(options.page);
+    if (!writeAll(file.descriptor(), page)) {
+        throw std::runtime_error(
+            fmt::format("cannot write {}: {}", options.page, std::strerror(errno)));
+    }
+    return exitClean;
+}
+
+} // namespace
+
+std::function<int()> prepareReport(CLI::App& command) {
+    const auto options = std::make_shared<Options>();
+    command.add_option("recording", options->recording, "What 'run --record' has written")
+        ->type_name("FILE")
+        ->required();
+    command.add_option("-o,--output", options->page, "The HTML page to write")
+        ->type_name("FILE")
+        ->required();
+    return [options] { return makeReport(*options); };
+}
+
+} // namespace vantelhost

@@ -1,0 +1,119 @@
+#include "RunOptions.h"
+
+#include <algorithm>
+
+#include <CLI/CLI.hpp>
+#include <fmt/format.h>
+
+#include "Numbers.h"
+
+namespace vantelhost {
+
+namespace {
+
+[[noreturn]] void refuse(const std::string& option, const std::string& expected,
+                         const std::string& text) {
+    throw CLI::ValidationError(option, fmt::format("must be {}, not \"{}\"", expected, text));
+}
+
+std::int64_t integer(const std::string& option, const std::string& text) {
+    const auto value = parseInteger(text);
+    if (!value) {
+        refuse(option, "an integer of nanoseconds", text);
+    }
+    return *value;
+}
+
+TimedOffset timedOffset(const std::string& option, const std::string& text) {
+    const auto colon = text.find(':');
+    const auto seconds = parseSeconds(text.substr(0, colon));
+    const auto offset =
+        colon == std::string::npos ? std::nullopt : parseInteger(text.substr(colon + 1));
+    if (!seconds || !offset) {
+        refuse(option, "SECONDS:NS", text);
+    }
+    return {*seconds, *offset};
+}
+
+void addBehaviour(CLI::App& command, RunOptions& options) {
+    command
+        .add_option_function<std::string>(
+            "--seconds",
+            [&options](const std::string& text) {
+                options.seconds = parseSeconds(text);
+                if (!options.seconds) {
+                    refuse("--seconds", "a number of seconds", text);
+                }
+            },
+            "Stop after this time; else at SIGINT, SIGTERM, SIGHUP or SIGQUIT")
+        ->type_name("N");
+    command.add_flag("--refuse-while-stopping", options.refuseWhileStopping,
+                     "Refuse the plug-in's calls while stopping");
+}
+
+void addOutput(CLI::App& command, RunOptions& options) {
+    auto* json = command.add_flag("--json", options.jsonLines, "Print JSON Lines");
+    command
+        .add_flag("--plain", options.plain,
+                  "Print a line per event also on a terminal, not the live view")
+        ->excludes(json);
+    command
+        .add_option("--record", options.recordFile,
+                    "Write every event to this file, as JSON Lines; an old one is replaced")
+        ->type_name("FILE");
+    command
+        .add_option("--chrony", options.chronySocket,
+                    "Hand every time pair to chronyd's reference clock (refclock SOCK) here")
+        ->type_name("SOCKET");
+}
+
+void addFifo(CLI::App& command, RunOptions& options) {
+    command.add_option("--fifo", options.fifo, "The FIFO of epoch offsets")
+        ->type_name("PATH")
+        ->capture_default_str();
+    command.add_flag("--create-fifo", options.createFifo,
+                     "Create the FIFO if it is absent, and remove it at the end");
+    command
+        .add_option_function<std::string>(
+            "--epoch-offset",
+            [&options](const std::string& text) {
+                options.epochOffset = integer("--epoch-offset", text);
+            },
+            "Write this epoch offset before the start")
+        ->type_name("NS");
+    command
+        .add_option_function<std::vector<std::string>>(
+            "--epoch-offset-at",
+            [&options](const std::vector<std::string>& texts) {
+                for (const auto& text : texts) {
+                    options.timedOffsets.push_back(timedOffset("--epoch-offset-at", text));
+                }
+            },
+            "Write an epoch offset some time after the start; repeatable")
+        ->type_name("SECONDS:NS")
+        ->expected(1)
+        ->take_all();
+}
+
+void finish(RunOptions& options, bool fifoNamed) {
+    options.useFifo =
+        fifoNamed || options.createFifo || options.epochOffset || !options.timedOffsets.empty();
+    std::stable_sort(options.timedOffsets.begin(), options.timedOffsets.end(),
+                     [](const auto& a, const auto& b) { return a.seconds < b.seconds; });
+}
+
+} // namespace
+
+void addRunOptions(CLI::App& command, RunOptions& options) {
+    addSettingsOptions(command, options);
+    addBehaviour(command, options);
+    addOutput(command, options);
+    addFifo(command, options);
+    command.footer(
+        "Exit status: 0 after a clean run; 1 when the plug-in reported an error or broke "
+        "the rules of\nthe interface, or the output was lost; 2 for a bad option, "
+        "setting, library or FIFO.");
+    command.final_callback([&command, &options] { finish(options, command.count("--fifo") > 0); });
+}
+
+} // namespace vantelhost

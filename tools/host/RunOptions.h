@@ -1,0 +1,41 @@
+/// @file
+/// The options of the subcommand "run".
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "SettingsOptions.h"
+
+namespace CLI {
+class App;
+}
+
+namespace vantelhost {
+
+/// An epoch offset to write some time after the start.
+struct TimedOffset {
+    double seconds;
+    std::int64_t nanoseconds;
+};
+
+struct RunOptions : SettingsOptions {
+    std::optional<double> seconds;
+    bool jsonLines = false;
+    bool plain = false;       ///< lines also on a terminal
+    std::string recordFile;   ///< empty when nothing is recorded
+    std::string chronySocket; ///< empty when chronyd gets nothing
+    bool useFifo = false;
+    bool createFifo = false;
+    std::string fifo = "/tmp/quillEpochOffset";
+    std::optional<std::int64_t> epochOffset;
+    std::vector<TimedOffset> timedOffsets; ///< in the order of their times
+    bool refuseWhileStopping = false;
+};
+
+/// Adds the options to a command. They are filled when the command line is read.
+void addRunOptions(CLI::App& command, RunOptions& options);
+
+} // namespace vantelhost

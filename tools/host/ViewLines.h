@@ -1,0 +1,24 @@
+/// @file
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "ViewState.h"
+
+namespace vantelhost {
+
+struct ScreenSize {
+    std::size_t rows;
+    std::size_t columns;
+};
+
+/// The live view, line by line, in printable ASCII. Lines are cut to the width; of ports, as many
+/// are left out as the height asks for, then of all from the end.
+std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSize size);
+
+/// Nanoseconds as people read them, with a unit that leaves at most four digits before the point.
+std::string shownOffset(double nanoseconds);
+
+} // namespace vantelhost

@@ -1,0 +1,70 @@
+#include "ViewState.h"
+
+namespace vantelhost {
+
+namespace {
+
+constexpr std::size_t mostProblems = 5;
+
+void addProblem(ViewState& state, double seconds, const std::string& text) {
+    auto& problems = state.problems;
+    if (!problems.empty() && problems.back().text == text) {
+        problems.pop_back();
+    }
+    problems.push_back({seconds, text});
+    if (problems.size() > mostProblems) {
+        problems.pop_front();
+    }
+}
+
+void updateQuality(ViewState& state, const Json& members, double seconds) {
+    const std::string quality = members["quality"];
+    const std::string reason = members["reason"];
+    if (quality != state.quality || reason != state.reason) {
+        state.quality = quality;
+        state.reason = reason;
+        state.qualitySince = seconds;
+    }
+    // The one in start only says that there is nothing yet.
+    if (state.started && quality != "usable") {
+        addProblem(state, seconds, quality + ": " + reason);
+    }
+}
+
+void updateMetadata(ViewState& state, const Event& event, double seconds) {
+    if (event.members["valid"]) {
+        state.metadata = event.members["metadata"];
+    } else {
+        addProblem(state, seconds, "metadata: " + event.text);
+    }
+}
+
+} // namespace
+
+void update(ViewState& state, const Event& event, double seconds) {
+    const Json& members = event.members;
+    if (event.name == "loaded") {
+        state.plugIn = members["name"];
+    } else if (event.name == "started") {
+        state.started = true;
+        state.phase = "running";
+    } else if (event.name == "stopping") {
+        state.phase = "stopping (" + event.text + ")";
+    } else if (event.name == "stopped") {
+        state.phase = "stopped";
+    } else if (event.name == "quality") {
+        updateQuality(state, members, seconds);
+    } else if (event.name == "pair") {
+        ++state.pairs;
+        state.offset = members["offset"];
+        state.offsets.add(seconds, *state.offset);
+    } else if (event.name == "metadata") {
+        updateMetadata(state, event, seconds);
+    } else if (event.name == "chrony") {
+        state.chrony = event.text;
+    } else if (event.name == "error" || event.name == "warning" || event.name == "refused") {
+        addProblem(state, seconds, event.text);
+    }
+}
+
+} // namespace vantelhost

@@ -1,0 +1,22 @@
+#include "WriteAll.h"
+
+#include <cerrno>
+#include <cstddef>
+
+#include <unistd.h>
+
+namespace vantelhost {
+
+bool writeAll(int descriptor, std::string_view text) {
+    while (!text.empty()) {
+        const ssize_t written = ::write(descriptor, text.data(), text.size());
+        if (written >= 0) {
+            text.remove_prefix(static_cast<std::size_t>(written));
+        } else if (errno != EINTR) {
+            return false;
+        }
+    }
+    return true;
+}
+
+} // namespace vantelhost
