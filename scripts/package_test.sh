@@ -27,11 +27,14 @@ else
   mirrors=("deb [trusted=yes] copy:$repository ./")
 fi
 
-# Debian's own mirror, whatever else this machine uses.
+# From where this machine has its packages. The words in the format are apt's.
+# shellcheck disable=SC2016
+mirror=$(apt-get indextargets --format '$(REPO_URI)' "Codename: $suite" 'Component: main' |
+  sort -u | head -n 1)
 status=0
 mmdebstrap --architectures="$architecture" --format=null --dpkgopt=force-unsafe-io \
   --aptopt='Acquire::Retries "3"' \
-  "${options[@]}" "$suite" - http://deb.debian.org/debian "${mirrors[@]}" \
+  "${options[@]}" "$suite" - "$mirror" "${mirrors[@]}" \
   2>&1 | tee "$log" || status=$?
 if [[ $status -ne 0 ]] && ! grep -q '^installed_test: the root is there' "$log"; then
   echo "SKIPPED: no clean root can be made here: $(grep -m 1 '^E: ' "$log")"
