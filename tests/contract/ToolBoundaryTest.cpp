@@ -42,18 +42,19 @@ void forEachInclude(const fs::path& folder, Visitor visit) {
     }
 }
 
-/// The headers of others that a tool includes from a folder that is the project's.
+bool isOfTheProject(const std::string& name) {
+    return fs::exists(root / "source" / name) || fs::exists(root / "support" / name) ||
+           fs::exists(root / "include" / name);
+}
+
+/// What a tool includes that is neither its own nor a library's.
 std::set<std::string> foreignHeaders(const fs::path& folder) {
     std::set<std::string> names;
     forEachInclude(folder, [&](const fs::path& file, const std::string& header) {
         const std::string name = header.substr(1, header.find_first_of("\">", 1) - 1);
-        const bool quoted = header[0] == '"';
-        const bool own = fs::exists(folder / name) || fs::exists(file.parent_path() / name);
-        if (quoted != own || name.find("..") != std::string::npos) {
-            names.insert(header);
-        } else if (!own &&
-                   (fs::exists(root / "source" / name) || fs::exists(root / "support" / name) ||
-                    fs::exists(root / "include" / name))) {
+        const bool own = name.find("..") == std::string::npos &&
+                         (fs::exists(folder / name) || fs::exists(file.parent_path() / name));
+        if ((header[0] == '"') != own || (!own && isOfTheProject(name))) {
             names.insert(header);
         }
     });

@@ -90,10 +90,13 @@ usr/include/vantel_bc/zekel.h
 usr/include/vantel_bc/zekeltr.h
 usr/lib/TRIPLET/libvantel_bc.so -> libvantel_bc.so.19
 usr/share/doc/libvantel-bc-dev/changelog.gz
+usr/share/doc/libvantel-bc-dev/configuration.md
 usr/share/doc/libvantel-bc-dev/copyright
 usr/share/doc/libvantel-bc-dev/examples/minimal_host.c
 usr/share/doc/libvantel-bc-dev/host-interface.md
-usr/share/doc/libvantel-bc-dev/oddities.md" "$(files libvantel-bc-dev)"
+usr/share/doc/libvantel-bc-dev/oddities.md
+usr/share/doc/libvantel-bc-dev/operations.md
+usr/share/doc/libvantel-bc-dev/wire-format.md" "$(files libvantel-bc-dev)"
 }
 
 HostPackageHoldsBothToolsWithManualPagesAndScripts() {

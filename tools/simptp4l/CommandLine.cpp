@@ -93,7 +93,7 @@ const char* helpText() {
            "  -i INTERFACE   one port; may be repeated\n"
            "  --script FILE  what to simulate (default: CONFIG.sim, if it exists)\n"
            "  --check        only read CONFIG and script; status 0 when both are right\n"
-           "  --help         show this text\n"
+           "  -h, --help     show this text\n"
            "\n"
            "Other options of ptp4l are accepted and ignored.\n";
 }
