@@ -119,10 +119,17 @@ public:
             require(answers.size() == count, "a clean exchange has all its answers");
         } else if (zeerr::isError(status_)) {
             require(answers.size() < received, "the answer that failed is not appended");
+            require(status_.code != endOfData || isTooShort<Tlv>(interface_.received.back()),
+                    "an answer of the minimum length, or longer, is taken");
         } else {
             require(received == count, "a warning does not end the exchange");
         }
         require(cleanBefore || answers.empty(), "answers are appended only to a clean status");
+        for (std::size_t index = 0; index < received; ++index) {
+            const bool mayHaveFailed = zeerr::isError(status_) && index + 1 == received;
+            require(mayHaveFailed || !isTooShort<Tlv>(interface_.received[index]),
+                    "an answer below the minimum length ends the exchange");
+        }
         for (std::size_t index = 0; index < answers.size(); ++index) {
             checkAnswer(answers[index], interface_.received[index]);
         }
@@ -130,17 +137,31 @@ public:
     }
 
 private:
-    static void checkAnswer(const tPortDataSet& data, const std::vector<std::uint8_t>& octets) {
-        require(octets.size() >= 80, "an answer has its minimum length");
+    using Octets = std::vector<std::uint8_t>;
+
+    static std::size_t minimum(const tPortDataSet& /*type*/, const Octets& /*octets*/) {
+        return 80;
+    }
+    static std::size_t minimum(const tPortDataSetNp& /*type*/, const Octets& /*octets*/) {
+        return 62;
+    }
+    static std::size_t minimum(const tPortProperties& /*type*/, const Octets& octets) {
+        return 67U + (octets.size() < 67 ? 0 : octets[66]);
+    }
+
+    template <typename Tlv>
+    static bool isTooShort(const Octets& octets) {
+        return octets.size() < minimum(typename Tlv::Data(), octets);
+    }
+
+    static void checkAnswer(const tPortDataSet& data, const Octets& octets) {
         require(data.versionNumber == octets[79], "answers stay in the order of arrival");
     }
-    static void checkAnswer(const tPortDataSetNp& data, const std::vector<std::uint8_t>& octets) {
-        require(octets.size() >= 62, "an answer has its minimum length");
+    static void checkAnswer(const tPortDataSetNp& data, const Octets& octets) {
         require((data.neighborPropDelayThresh & 0xff) == octets[57],
                 "answers stay in the order of arrival");
     }
-    static void checkAnswer(const tPortProperties& data, const std::vector<std::uint8_t>& octets) {
-        require(octets.size() >= 67U + data.interface.lengthField(), "a name is received whole");
+    static void checkAnswer(const tPortProperties& data, const Octets& octets) {
         require(data.interface.lengthField() == octets[66], "the length of a name is kept");
         const std::string name = data.interface.text();
         require(name.size() <= octets[66], "a name is no longer than its length");

@@ -10,9 +10,11 @@ if [[ $# -gt 1 || ${1:---update} != --update ]]; then
 fi
 
 preset=release
+scripts/setup.sh tests
 cmake --preset "$preset" >/dev/null
 cmake --build --preset "$preset" --target contract_tests -j "$(nproc)"
 tests=build/$preset/tests/contract
+rm -f "$tests/abi.txt"
 status=0
 "$tests/contract_tests" --gtest_filter=AbiTest.IsAsDescribed --gtest_brief=1 || status=$?
 if [[ ${1-} == --update ]]; then

@@ -18,7 +18,9 @@ options=()
 while [[ $# -gt 0 ]]; do
   case $1 in
     --seed)
-      seed=${2:?--seed needs a number}
+      # Without zeros in front: it would be read as octal.
+      [[ ${2-} =~ ^(0|[1-9][0-9]{0,17})$ ]] || usage
+      seed=$2
       shift
       ;;
     --plan) options+=(--plan) ;;

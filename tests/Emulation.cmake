@@ -1,10 +1,5 @@
 # Programs of another architecture run in an emulator here, and so must those that tests start.
 
-# Known as runsEmulated() to the tests.
-if(CMAKE_CROSSCOMPILING_EMULATOR)
-  add_compile_definitions(VANTEL_EMULATED)
-endif()
-
 # Sets result to the file that tests start for the program of a target: itself, or a script that runs
 # it in the emulator, with the same process id, arguments and environment.
 function(vantel_get_started_file result target)

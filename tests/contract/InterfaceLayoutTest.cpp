@@ -1,8 +1,7 @@
 // What passes between host and plug-in has the same size and octets with 32-bit and with 64-bit
-// pointers, but for the pointers themselves. The functions and the status are in AbiTest.
+// pointers. The functions and the status, with the types of their members, are in AbiTest.
 
 #include <array>
-#include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <limits>
@@ -10,7 +9,6 @@
 #include <gmock/gmock.h>
 
 #include <vantel_bc/quality.h>
-#include <vantel_bc/zekeltr.h>
 
 namespace {
 
@@ -35,35 +33,6 @@ TEST(InterfaceLayoutTest, QualityIsThreeIeee754DoublesOf64Bits) {
                 ElementsAreArray({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xC0, //
                                   0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xC0, //
                                   0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF0, 0xBF}));
-}
-
-TEST(InterfaceLayoutTest, NothingButPointersAndTheSizesOfMemoryIsNarrowOn32Bits) {
-    struct Row {
-        const char* type;
-        std::size_t size;
-        std::size_t alignment;
-        std::size_t wide;
-        std::size_t narrow;
-    };
-    for (const auto& row : {
-             Row{"code", sizeof(std::int32_t), alignof(std::int32_t), 4, 4},
-             Row{"capacity", sizeof(std::uint32_t), alignof(std::uint32_t), 4, 4},
-             Row{"version", sizeof(zekeltr_getAPIVersion()), alignof(std::uint32_t), 4, 4},
-             Row{"time", sizeof(std::uint64_t), alignof(std::uint64_t), 8, 8},
-             Row{"quality value", sizeof(double), alignof(double), 8, 8},
-             Row{"success of resize", sizeof(bool), alignof(bool), 1, 1},
-             Row{"name character", sizeof(char), alignof(char), 1, 1},
-             Row{"slot", sizeof(void**), alignof(void**), 8, 4},
-             Row{"text", sizeof(char*), alignof(char*), 8, 4},
-             Row{"resize", sizeof(zeerr_Resize), alignof(zeerr_Resize), 8, 4},
-             Row{"reallocate", sizeof(zekeltr_Reallocate), alignof(zekeltr_Reallocate), 8, 4},
-             Row{"size for reallocate", sizeof(std::size_t), alignof(std::size_t), 8, 4},
-         }) {
-        const std::size_t expected = sizeof(void*) == 4 ? row.narrow : row.wide;
-        EXPECT_EQ(row.size, expected) << row.type;
-        EXPECT_EQ(row.alignment, expected) << row.type;
-    }
-    EXPECT_EQ(ZEKELTR_NAME_SIZE, 18);
 }
 
 } // namespace

@@ -1,9 +1,6 @@
 // The static probe points of the shipped library, which docs/tracing.md lists.
 
-#include <array>
-#include <cstdio>
 #include <cstdlib>
-#include <memory>
 #include <regex>
 #include <set>
 #include <string>
@@ -12,21 +9,12 @@
 #include <gtest/gtest.h>
 
 #include "NamedTests.h"
+#include "support/CommandOutput.h"
 #include "support/TemporaryFolder.h"
 
 namespace {
 
 using Texts = std::multiset<std::string>;
-
-std::string outputOf(const std::string& command) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), &pclose);
-    std::string output;
-    std::array<char, 4096> piece{};
-    while (pipe && std::fgets(piece.data(), piece.size(), pipe.get()) != nullptr) {
-        output += piece.data();
-    }
-    return output;
-}
 
 /// Each probe point of a library: its name, and the octets of its arguments, negative for signed.
 Texts probePoints(const std::string& library) {

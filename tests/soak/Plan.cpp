@@ -1,6 +1,7 @@
 #include "Plan.h"
 
 #include <algorithm>
+#include <array>
 
 #include <fmt/format.h>
 
@@ -13,6 +14,10 @@ constexpr double stopping = 2;    // what zekeltr_stop takes, about
 constexpr double killing = 10;    // the same, when SIGTERM does not help
 constexpr double longestEnding = 25;
 constexpr double shortestPair = 12; // of sessions, the second of which recovers
+
+constexpr std::array faultsAtStop{
+    HostFault::error,     HostFault::stopping,         HostFault::warning,
+    HostFault::exception, HostFault::foreignException, HostFault::block};
 
 bool hasNoFaults(Ending ending) {
     return ending == Ending::exitedAtOnce || ending == Ending::noProgram ||
@@ -44,6 +49,9 @@ bool Plan::next(SessionPlan& session) {
         addFaults(session);
     }
     end(session);
+    if (dice_.below(2) == 0) {
+        session.faultAtStop = dice_.pick(faultsAtStop);
+    }
     planned_ += session.length + stopping + (isSlow(ending) ? killing : 0);
     return true;
 }

@@ -95,5 +95,8 @@ std::string textOf(const SessionPlan& plan) {
         }
         text += '\n';
     }
+    if (plan.faultAtStop != HostFault::none) {
+        text += fmt::format("# at the stop host {}\n", nameOf(plan.faultAtStop));
+    }
     return text;
 }

@@ -67,8 +67,9 @@ struct SessionPlan {
     double fifoPeriod = 1; ///< between two epoch offsets
     bool fifoAtStart = true;
     int ports = 1;
-    std::string script;      ///< of the simulated daemon
-    std::vector<Deed> deeds; ///< in the order of their times
+    HostFault faultAtStop = HostFault::none; ///< from shortly before zekeltr_stop
+    std::string script;                      ///< of the simulated daemon
+    std::vector<Deed> deeds;                 ///< in the order of their times
     std::vector<Fault> faults;
 };
 

@@ -17,7 +17,17 @@ constexpr std::chrono::milliseconds tick{20};
 constexpr std::chrono::seconds longestPoll{30};
 constexpr double recoveryLimit = 20;
 constexpr double deathLimit = 15;
-constexpr std::uint64_t enough = 3; // polls and pairs, to have recovered
+// What may be under way when the session is stopped, after the windows with faults: one answer that
+// does not come, the watchdog's sleep, the calls of a poll, and the daemon that has to be killed.
+constexpr double answer = 2;
+constexpr double watchdog = 1;
+constexpr double blockingCalls = 4;
+constexpr double untilKilled = 10;
+// What a busy machine adds: to everything, and to a thousand sleeps until the daemon is killed.
+constexpr double slack = 2;
+constexpr double slackUntilKilled = 3;
+constexpr std::chrono::milliseconds beforeStop{200}; // longer than a worker's sleep
+constexpr std::uint64_t enough = 3;                  // polls and pairs, to have recovered
 constexpr int pipeIsFull = 60000;
 constexpr char half[] = "\1\2\3";
 constexpr char otherHalf[] = "\4\5\6\7\10";
@@ -55,7 +65,8 @@ std::string SessionRun::run(const std::string& program, const std::function<bool
     if (failure.empty() && plan_.ending != Ending::startRefused) {
         failure = attend(goesOn);
     }
-    end();
+    const std::string stopFailure = end();
+    failure = failure.empty() ? stopFailure : failure;
     return failure.empty() ? host_.violation() : failure;
 }
 
@@ -107,13 +118,28 @@ std::string SessionRun::attend(const std::function<bool()>& goesOn) {
     return failure;
 }
 
-void SessionRun::end() {
-    host_.misbehave(HostFault::none);
+std::string SessionRun::end() {
+    host_.misbehave(plan_.faultAtStop);
+    std::this_thread::sleep_for(beforeStop);
+    const double begin = seconds();
     plugIn_.stop(&slot_);
+    stopSeconds_ = seconds() - begin;
     plugIn_.finalise(&slot_);
+    host_.misbehave(HostFault::none);
     host_.expect(nullptr);
     // A daemon that had to be killed is not waited for by the plug-in.
     endChildren();
+    if (stopSeconds_ > stopLimit()) {
+        return fmt::format("zekeltr_stop took {:.2f} s of {} allowed", stopSeconds_, stopLimit());
+    }
+    return "";
+}
+
+double SessionRun::stopLimit() const {
+    const bool blocks = plan_.faultAtStop == HostFault::block;
+    const bool isKilled = daemonIsFrozen_ || plan_.ending == Ending::stoppedWhileIgnoring;
+    return answer + watchdog + slack + (blocks ? blockingCalls : 0) +
+           (isKilled ? untilKilled + slackUntilKilled : 0);
 }
 
 bool SessionRun::isOver() {
@@ -166,8 +192,10 @@ void SessionRun::perform(const Deed& deed) {
     };
     switch (deed.what) {
     case Deed::What::freezeDaemon:
+        daemonIsFrozen_ = true;
         return signalDaemon(SIGSTOP);
     case Deed::What::thawDaemon:
+        daemonIsFrozen_ = false;
         return signalDaemon(SIGCONT);
     case Deed::What::killDaemon:
         return signalDaemon(SIGKILL);

@@ -24,6 +24,9 @@ public:
     /// Since the start of the session.
     double seconds() const;
 
+    /// How long zekeltr_stop took.
+    double stopSeconds() const { return stopSeconds_; }
+
 private:
     using Clock = SoakHost::Clock;
 
@@ -31,7 +34,8 @@ private:
     std::string initialise();
     std::string start();
     std::string attend(const std::function<bool()>& goesOn);
-    void end();
+    std::string end();
+    double stopLimit() const;
     bool isOver();
     bool hasRecovered();
     std::string overdue() const;
@@ -49,6 +53,8 @@ private:
     std::size_t performed_ = 0;
     double nextOffset_ = 0;
     bool fifoIsTorn_ = false;
+    bool daemonIsFrozen_ = false;
+    double stopSeconds_ = 0;
     std::uint64_t deathsBefore_;
     std::optional<SoakHost::Counts> beforeRecovery_;
 };

@@ -36,7 +36,7 @@ void say(const char* format, const Arguments&... arguments) {
 Soak::Soak(Options options, const volatile int& interrupted)
     : options_(std::move(options)),
       interrupted_(interrupted),
-      plugIn_(options_.library),
+      plugIn_(options_.plugIn),
       warmUp_(warmUpOf(options_.seconds)),
       resident_(windowOf(options_.seconds)),
       descriptors_(windowOf(options_.seconds)) {}
@@ -54,6 +54,7 @@ bool Soak::run() {
 }
 
 void Soak::runSession(const SessionPlan& plan) {
+    double stopSeconds = 0;
     {
         SessionRun run(plugIn_, host_, plan);
         const std::string failure = run.run(options_.daemon, [this] { return watch(); });
@@ -63,8 +64,9 @@ void Soak::runSession(const SessionPlan& plan) {
             fail(failure);
             return;
         }
+        stopSeconds = run.stopSeconds();
     }
-    takeStock(plan);
+    takeStock(plan, stopSeconds);
 }
 
 bool Soak::watch() {
@@ -86,7 +88,7 @@ bool Soak::watch() {
     return failure_.empty();
 }
 
-void Soak::takeStock(const SessionPlan& plan) {
+void Soak::takeStock(const SessionPlan& plan, double stopSeconds) {
     // The system lists a thread for a moment after it was joined.
     waitUntil([&] { return sessions_ == 0 || threadCount() <= quietAtStart_.threads; },
               std::chrono::seconds(2));
@@ -95,7 +97,9 @@ void Soak::takeStock(const SessionPlan& plan) {
         quietAtStart_ = quiet_;
     }
     ++sessions_;
-    ++endings_[nameOf(plan.ending)];
+    Stops& stops = endings_[nameOf(plan.ending)];
+    ++stops.count;
+    stops.longest = std::max(stops.longest, stopSeconds);
     for (const SessionPlan::Fault& fault : plan.faults) {
         ++faults_[fault.kind];
     }
@@ -158,8 +162,8 @@ void Soak::reportFaults() const {
         say("  {:<20} {:>6}", kind, count);
     }
     say("sessions       {}, each with a daemon of its own; they ended", sessions_);
-    for (const auto& [ending, count] : endings_) {
-        say("  {:<20} {:>6}", ending, count);
+    for (const auto& [ending, stops] : endings_) {
+        say("  {:<20} {:>6}   longest stop {:5.2f} s", ending, stops.count, stops.longest);
     }
 }
 

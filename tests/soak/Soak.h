@@ -20,7 +20,7 @@ public:
     struct Options {
         int seconds = 600;
         std::uint64_t seed = 1;
-        std::string library;
+        std::string plugIn;     ///< the library
         std::string daemon;     ///< the simulated one
         std::string skipMemory; ///< why memory cannot be judged here; empty: it can
     };
@@ -34,9 +34,15 @@ public:
 private:
     using Clock = SoakHost::Clock;
 
+    /// Of the sessions that ended alike.
+    struct Stops {
+        std::uint64_t count = 0;
+        double longest = 0; ///< s that zekeltr_stop took
+    };
+
     void runSession(const SessionPlan& plan);
     bool watch();
-    void takeStock(const SessionPlan& plan);
+    void takeStock(const SessionPlan& plan, double stopSeconds);
     void judge();
     void report() const;
     void reportProgress() const;
@@ -64,6 +70,6 @@ private:
 
     std::uint64_t sessions_ = 0;
     std::map<std::string, std::uint64_t> faults_;
-    std::map<std::string, std::uint64_t> endings_;
+    std::map<std::string, Stops> endings_;
     std::string failure_;
 };

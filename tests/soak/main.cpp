@@ -29,7 +29,7 @@ void printPlan(const Soak::Options& options) {
 
 int main(int argc, char** argv) {
     Soak::Options options;
-    options.library = VANTEL_BC_LIBRARY;
+    options.plugIn = VANTEL_BC_LIBRARY;
     options.daemon = VANTEL_SIMPTP4L;
     bool planOnly = false;
 

@@ -47,7 +47,7 @@ std::string summarySection(const Recording& recording) {
     std::vector<Row> rows{
         {"Begin", shownMoment(recording.begin)},
         {"Duration", shownDuration(recording.duration)},
-        {"Plug-in", recording.plugIn + ", " + recording.library},
+        {"Plug-in", recording.plugIn + ", " + recording.plugInFile},
         {"End", recording.stopCause.empty() ? "not recorded" : recording.stopCause},
         {"Time pairs", fmt::format("{}", recording.pairs.size())},
         {"Rate of pairs", pairRate(recording.pairs)},

@@ -78,7 +78,7 @@ struct Recording {
     std::uint64_t begin = 0; ///< the host's start in its clock: nanoseconds since 1970
     double duration = 0;     ///< seconds until the last event
     std::string plugIn;      ///< its name; empty when it was not loaded
-    std::string library;
+    std::string plugInFile;
     std::string stopCause; ///< empty when the host was not stopped
     std::vector<Pair> pairs;
     First<QualityChange> qualities; ///< only what differs from the one before

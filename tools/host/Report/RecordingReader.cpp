@@ -163,11 +163,11 @@ void RecordingReader::takeProblem(const Json& line) {
 
 void RecordingReader::takeOther(const std::string& event, const Json& line) {
     if (event == "loaded") {
-        if (!recording_.library.empty()) {
+        if (!recording_.plugInFile.empty()) {
             throw std::runtime_error("another recording begins");
         }
         recording_.plugIn = line.at("name").get<std::string>();
-        recording_.library = line.at("library").get<std::string>();
+        recording_.plugInFile = line.at("library").get<std::string>();
     } else if (event == "initialised") {
         recording_.configuration = line.at("configuration");
     } else if (event == "epoch-offset") {
