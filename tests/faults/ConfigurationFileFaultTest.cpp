@@ -20,13 +20,13 @@ using testing::Each;
 using testing::IsEmpty;
 using testing::Not;
 
-/// A file system without room for one octet, while this object lives.
+/// A file system with room for so many octets of a file, while this object lives.
 class FullFileSystem {
 public:
-    FullFileSystem() : ignored_(SIGXFSZ, SIG_IGN) {
+    explicit FullFileSystem(rlim_t room) : ignored_(SIGXFSZ, SIG_IGN) {
         getrlimit(RLIMIT_FSIZE, &before_);
-        const rlimit none{0, before_.rlim_max};
-        setrlimit(RLIMIT_FSIZE, &none);
+        const rlimit limit{room, before_.rlim_max};
+        setrlimit(RLIMIT_FSIZE, &limit);
     }
     ~FullFileSystem() { setrlimit(RLIMIT_FSIZE, &before_); }
     FullFileSystem(const FullFileSystem&) = delete;
@@ -44,6 +44,13 @@ protected:
         const std::string usual = SimulatedDaemon::configFile;
         session.initialise(text.replace(text.find(usual), usual.size(), path));
         EXPECT_THAT(log.lines(), IsEmpty());
+    }
+
+    /// With a daemon that leaves the socket of its configuration alone: it does not know it.
+    void initialiseWithRoomFor(rlim_t octets) {
+        writeFile("full.conf.sim", "start-delay 1000000\n");
+        const FullFileSystem full(octets);
+        initialise("full.conf");
     }
 
     /// Runs the session with a daemon that never gets as far as to answer.
@@ -88,12 +95,21 @@ TEST_F(ConfigurationFileFaultTest, FifoAtThePathHoldsTheDaemonOnly) {
 }
 
 TEST_F(ConfigurationFileFaultTest, FullFileSystemLeavesTheDaemonUnreachable) {
-    writeFile("full.conf.sim", "start-delay 1000000\n");
-    {
-        const FullFileSystem full;
-        initialise("full.conf");
-    }
+    initialiseWithRoomFor(0);
     EXPECT_EQ(readFile("full.conf"), "");
+    expectUnreachable();
+    expectStopWithin({});
+}
+
+TEST_F(ConfigurationFileFaultTest, FileSystemThatFillsUpCutsTheFile) {
+    initialiseWithRoomFor(100);
+    EXPECT_EQ(readFile("full.conf"), R"([global]
+#
+# Default Data Set
+#
+twoStepFlag             1
+gmCapable               1
+priority1       )");
     expectUnreachable();
     expectStopWithin({});
 }

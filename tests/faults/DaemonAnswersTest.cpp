@@ -1,12 +1,13 @@
 // A daemon that answers late, wrongly, too much or not at all.
 
 #include <gmock/gmock.h>
+#include <syslog.h>
 
 #include "FaultTest.h"
 
 namespace {
 
-using testing::ElementsAre;
+using testing::Each;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::SizeIs;
@@ -22,7 +23,7 @@ TEST_F(DaemonAnswersTest, NeverComes) {
 
 // Each answer of a poll may take 2 s. A clock without ports gives three.
 TEST_F(DaemonAnswersTest, EachJustInTimeMakesAPollTakeTheSum) {
-    beginWell("on any after 6 do delay 1.7\n");
+    beginWell("on any after 6 do delay 1.5\n");
     ASSERT_TRUE(waitUntilAnswerIsAwaited());
     expectStopWithin({3});
     EXPECT_THAT(host.calls(Function::getTime), SizeIs(2));
@@ -56,6 +57,18 @@ TEST_F(DaemonAnswersTest, GarbageOfManyLengths) {
     // At first, and twice behind the lengths.
     EXPECT_THAT(host.calls(Function::getTime), SizeIs(3));
     EXPECT_THAT(newQualities(), testing::Each(unreachable));
+    expectStopWithin({});
+}
+
+// The measurement is told by its length alone.
+TEST_F(DaemonAnswersTest, GarbageOfTheRightLengthIsBelieved) {
+    beginWell("clock fixed 1000\non TIME_STATUS_NP after 1 do garbage 104\n");
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, 3));
+    EXPECT_EQ(host.calls(Function::adjustTime).at(0).localTime, 1000U);
+    EXPECT_NE(host.calls(Function::adjustTime).at(1).localTime, 1000U);
+    EXPECT_THAT(newQualities(), Each(usable));
+    EXPECT_THAT(newQualities(), testing::Not(IsEmpty()));
+    EXPECT_THAT(log.lines(), Each(testing::Field(&SyslogCapture::Line::priority, LOG_INFO)));
     expectStopWithin({});
 }
 

@@ -9,6 +9,7 @@
 #include <syslog.h>
 
 #include "FaultTest.h"
+#include "InterposedWaits.h"
 #include "RefusedCalls.h"
 #include "support/Descriptors.h"
 
@@ -31,6 +32,26 @@ protected:
         EXPECT_THAT(metaData(), Each(defaultMetaData));
         EXPECT_THAT(log.lines(), Contains(SyslogCapture::Line{LOG_INFO, failureLine(code)}));
         EXPECT_THAT(host.calls(Function::getTime), IsEmpty());
+    }
+
+    /// Begins, with no descriptor from the first good poll on, when the socket is open. Expects
+    /// that there is no pair.
+    std::shared_ptr<std::optional<RefusedCalls>> beginWithoutFifo() {
+        auto refused = std::make_shared<std::optional<RefusedCalls>>();
+        onEachPoll([=](int poll) {
+            if (poll == 0) {
+                refused->emplace(EMFILE);
+            }
+        });
+        begin("clock fixed 1000\n");
+        const SyslogCapture::Line error{LOG_ERR,
+                                        "Unable to call into KEL in vantel, got error: -52008"};
+        EXPECT_TRUE(waitForLog(error.text, 3));
+        EXPECT_THAT(log.lines(), Contains(error));
+        EXPECT_THAT(host.calls(Function::adjustTime), IsEmpty());
+        EXPECT_THAT(qualities(), Contains(usable));
+        EXPECT_EQ(metaData().size(), 1U);
+        return refused;
     }
 
     void expectRecovery() {
@@ -58,24 +79,14 @@ TEST_F(DescriptorFaultTest, OneForTheSocketLaterBringsAll) {
 }
 
 TEST_F(DescriptorFaultTest, NoneForTheFifoGivesNoPair) {
-    const auto refused = std::make_shared<std::optional<RefusedCalls>>();
-    // The socket is open by then.
-    onEachPoll([=](int poll) {
-        if (poll == 0) {
-            refused->emplace(EMFILE);
-        }
-    });
-    begin("clock fixed 1000\n");
-    const SyslogCapture::Line error{LOG_ERR,
-                                    "Unable to call into KEL in vantel, got error: -52008"};
-    ASSERT_TRUE(waitForLog(error.text, 3));
-    EXPECT_THAT(log.lines(), Contains(error));
-    EXPECT_THAT(host.calls(Function::adjustTime), IsEmpty());
-    EXPECT_THAT(qualities(), Contains(usable));
-    EXPECT_EQ(metaData().size(), 1U);
+    beginWithoutFifo();
+    expectStopWithin({});
+}
+
+TEST_F(DescriptorFaultTest, OneForTheFifoLaterBringsThePair) {
+    const auto refused = beginWithoutFifo();
     refused->reset();
     expectRecovery();
-    refused->emplace(EMFILE);
     expectStopWithin({});
 }
 
@@ -86,8 +97,10 @@ TEST_F(DescriptorFaultTest, BeyondTheRoomOfASetFailsEachPollAtOnce) {
         if (!occupied.leaveRoom()) {
             GTEST_SKIP() << "this system allows no more than " << FD_SETSIZE << " descriptors";
         }
+        const int before = answersAwaited();
         begin("clock fixed 1000\n");
         ASSERT_TRUE(waitForLog(failureLine(-52007), 3));
+        EXPECT_EQ(answersAwaited(), before);
         EXPECT_THAT(qualities(), testing::Not(Contains(usable)));
         EXPECT_THAT(metaData(), Each(defaultMetaData));
     }

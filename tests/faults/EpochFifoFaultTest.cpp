@@ -2,6 +2,7 @@
 
 #include <atomic>
 #include <filesystem>
+#include <stdexcept>
 #include <thread>
 
 #include <gmock/gmock.h>
@@ -116,16 +117,20 @@ TEST_F(EpochFifoFaultTest, WriterThatNeverPausesCannotHoldTheWorker) {
 TEST_F(EpochFifoFaultTest, BusyWriterIsServed) {
     fifo.emplace();
     std::atomic<bool> done{false};
+    std::atomic<int> refused{0}; // by a full pipe
     std::thread writer([&] {
         while (!done) {
-            if (fifo->queued() < 32768) {
+            try {
                 fifo->write({77});
+            } catch (const std::runtime_error&) {
+                ++refused;
             }
         }
     });
     beginMeasuring();
     helpers.threads = 2;
     EXPECT_TRUE(waitForCalls(Function::adjustTime, 3));
+    EXPECT_TRUE(waitUntil([&, before = refused.load()] { return refused > before; }));
     expectStopWithin({});
     done = true;
     writer.join();

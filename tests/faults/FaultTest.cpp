@@ -11,6 +11,7 @@
 
 #include "Interposed.h"
 #include "InterposedWaits.h"
+#include "support/Markdown.h"
 
 namespace {
 
@@ -23,6 +24,9 @@ constexpr milliseconds slack{1500};
 
 /// What a stop may take beyond its bound before it counts as one that never returns.
 constexpr seconds patience{20};
+
+const std::string unableToCommunicate =
+    "Unable to communicate with PTP sub process while attempting to retrieve data,got error: ";
 
 void giveUp(int /*signal*/) {
     constexpr char message[] = "stop does not return: giving up\n";
@@ -51,10 +55,30 @@ double inSeconds(milliseconds time) {
     return std::chrono::duration<double>(time).count();
 }
 
-void print(milliseconds took, milliseconds bound) {
+/// "Suite.Behaviour", without the names of an instantiation and of its parameter.
+std::string nameOfThisTest() {
     const auto& test = *testing::UnitTest::GetInstance()->current_test_info();
-    std::printf("[ STOP ] %s.%s: %.3f s of at most %.1f s\n", test.test_suite_name(), test.name(),
-                inSeconds(took), inSeconds(bound));
+    const std::string suite = test.test_suite_name();
+    const std::string name = test.name();
+    return suite.substr(suite.find('/') + 1) + '.' + name.substr(0, name.find('/'));
+}
+
+/// What the row of this test in docs/testing.md promises.
+std::string boundInTheTable() {
+    static const auto rows =
+        markdown::tables(readFile(VANTEL_PROJECT_FOLDER "/docs/testing.md"),
+                         {"fault", "the host sees", "stop takes at most", "test"});
+    for (const auto& row : rows) {
+        if (markdown::unquoted(row.at(3)) == nameOfThisTest()) {
+            return row.at(2);
+        }
+    }
+    return "no row";
+}
+
+void print(milliseconds took, milliseconds bound, milliseconds late) {
+    std::printf("[ STOP ] %s: %.3f s of at most %.1f s + %.1f s late\n", nameOfThisTest().c_str(),
+                inSeconds(took), inSeconds(bound), inSeconds(late));
     std::fflush(stdout);
 }
 
@@ -71,13 +95,36 @@ bool hasEnded(pid_t child) {
 } // namespace
 
 milliseconds FaultTest::UnderWay::sum() const {
-    return seconds(2) * answers + seconds(watchdog ? 1 : 0) + hostCall + seconds(grace ? 10 : 0);
+    return seconds(2) * answers + second() + hostCall + seconds(grace ? 10 : 0);
+}
+
+milliseconds FaultTest::UnderWay::atOnce() const {
+    return std::max<milliseconds>(seconds(2) * answers + hostCall, second()) +
+           seconds(grace ? 10 : 0);
+}
+
+milliseconds FaultTest::UnderWay::second() const {
+    return seconds(watchdog ? 1 : 0);
+}
+
+FaultTest::FaultTest() : promised_(boundInTheTable()) {
+    forgetWorkerSleeps();
+}
+
+void FaultTest::TearDown() {
+    EXPECT_TRUE(hasMeasured_ || IsSkipped()) << "no stop was measured";
 }
 
 std::string FaultTest::failureLine(int code) {
-    return "Unable to communicate with PTP sub process while attempting to retrieve data,"
-           "got error: " +
-           std::to_string(code);
+    return unableToCommunicate + std::to_string(code);
+}
+
+int FaultTest::endedPolls() const {
+    int ended = static_cast<int>(host.calls(Function::getTime).size());
+    for (const auto& line : log.lines()) {
+        ended += line.text.rfind(unableToCommunicate, 0) == 0 ? 1 : 0;
+    }
+    return ended;
 }
 
 void FaultTest::beginWell(const std::string& script, const std::string& interfaces) {
@@ -140,16 +187,29 @@ bool FaultTest::waitUntilRequestIsSent() {
 }
 
 void FaultTest::expectStopWithin(const UnderWay& underWay) {
+    expectStopWithin(underWay, [this] { session.stop(); });
+}
+
+void FaultTest::expectStopWithin(const UnderWay& underWay, const std::function<void()>& stop) {
     const milliseconds bound = underWay.sum();
+    EXPECT_EQ(promised_, std::to_string(std::chrono::duration_cast<seconds>(bound).count()) + " s");
     const Deadline deadline(std::chrono::duration_cast<seconds>(bound) + patience);
-    const auto begun = steady_clock::now();
     const auto oversleptBefore = overslept();
-    session.stop();
+    int sleeps = 0;
+    int polls = 0;
+    do { // until no poll begins while polls are counted
+        sleeps = workerSleeps();
+        polls = endedPolls();
+    } while (sleeps != workerSleeps());
+    const auto begun = steady_clock::now();
+    stop();
     const auto took = std::chrono::duration_cast<milliseconds>(steady_clock::now() - begun);
-    print(took, bound);
     // The period of grace is a thousand short sleeps, each of which may be late.
     const auto late = std::chrono::duration_cast<milliseconds>(overslept() - oversleptBefore);
-    EXPECT_LE(took.count(), (bound + slack + late).count()) << "milliseconds";
+    print(took, bound, late);
+    hasMeasured_ = true;
+    EXPECT_LE(took.count(), (underWay.atOnce() + late + slack).count()) << "milliseconds";
+    EXPECT_LE(endedPolls() - polls, 1) << "polls went on";
     expectNothingLeft(underWay.grace);
     session.finalise();
 }

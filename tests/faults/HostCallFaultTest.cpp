@@ -15,6 +15,7 @@
 #include <syslog.h>
 
 #include "FaultTest.h"
+#include "Interposed.h"
 
 namespace {
 
@@ -129,6 +130,34 @@ TEST_P(HostFailureTest, EndsThePollAndIsForgotten) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Kinds, HostFailureTest, testing::ValuesIn(misdeeds),
+                         [](const auto& testInfo) { return testInfo.param.name; });
+
+/// Each of them for as long as ptp4l's death is to be reported.
+class WatchdogFailureTest : public HostCallTest, public testing::WithParamInterface<Misdeed> {};
+
+TEST_P(WatchdogFailureTest, IsRetriedEachSecondUntilStop) {
+    host.onCall([death = died.reason](const RecordingHost::Call& call, zeerr_Status& status) {
+        if (call.text == death) {
+            GetParam().reaction(call, status);
+        }
+    });
+    begin("exit-at-once 0\n");
+    auto line = GetParam().line;
+    if (line.priority == LOG_ERR) {
+        line.text.replace(0, unableToCall.size(),
+                          "PTP4l process has died, watchdog unable to set quality to "
+                          "unusable,got error: ");
+    }
+    ASSERT_TRUE(waitForLog(line.text));
+    EXPECT_THAT(log.lines(), Contains(line));
+    EXPECT_THAT(qualities(), Contains(died));
+    expectOwnThreads(2);
+    expectStopWithin({});
+    EXPECT_THAT(sentSignals(), testing::IsEmpty());
+}
+
+INSTANTIATE_TEST_SUITE_P(Kinds, WatchdogFailureTest,
+                         testing::Values(misdeeds[0], misdeeds[2], misdeeds[5]),
                          [](const auto& testInfo) { return testInfo.param.name; });
 
 TEST_F(HostCallTest, WarningIsNoError) {

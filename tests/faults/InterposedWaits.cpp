@@ -4,24 +4,17 @@
 #include <cstring>
 #include <string>
 
-#include <dlfcn.h>
 #include <sys/select.h>
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <unistd.h>
 
+#include "support/NextFunction.h"
+
 namespace {
 
 std::atomic<int> selects{0};
 std::atomic<int> sends{0};
-
-template <typename Function>
-Function next(const char* name) {
-    void* const address = dlsym(RTLD_NEXT, name);
-    Function function = nullptr;
-    std::memcpy(&function, &address, sizeof(function));
-    return function;
-}
 
 /// Sockets of the tests have other names.
 bool isThePlugins(int descriptor) {
@@ -37,14 +30,14 @@ extern "C" {
 
 [[gnu::visibility("default")]] int select(int count, fd_set* readable, fd_set* writable,
                                           fd_set* exceptional, timeval* timeout) {
-    static const auto original = next<decltype(&select)>("select");
+    static const auto original = nextFunction<decltype(select)>("select");
     ++selects;
     return original(count, readable, writable, exceptional, timeout);
 }
 
 [[gnu::visibility("default")]] ssize_t sendto(int descriptor, const void* octets, size_t size,
                                               int flags, const sockaddr* to, socklen_t length) {
-    static const auto original = next<decltype(&sendto)>("sendto");
+    static const auto original = nextFunction<decltype(sendto)>("sendto");
     if (isThePlugins(descriptor)) {
         ++sends;
     }

@@ -2,6 +2,8 @@
 
 #include <atomic>
 #include <filesystem>
+#include <functional>
+#include <memory>
 #include <optional>
 #include <system_error>
 #include <thread>
@@ -92,45 +94,48 @@ protected:
         std::filesystem::remove(folder.path("gone"));
     }
 
-    /// Expects that one poll is lost, and that the next one has a socket again.
-    void expectOneLostPoll() {
+    /// Expects that a fault costs one poll, and that the next one has a socket again. Then stops in
+    /// the wait that it makes once more. What makes the fault is called in a poll, so that the next
+    /// one meets it.
+    void expectOneLostPoll(const std::function<void()>& makeFault) {
+        const auto isDue = std::make_shared<std::atomic<bool>>(false);
+        onEachPoll([=](int) {
+            if (isDue->exchange(false)) {
+                makeFault();
+            }
+        });
+        beginWell();
+        *isDue = true;
         expectFailure(-52007);
         expectSilentRecovery();
         EXPECT_EQ(log.count(failureLine(-52007)), 1);
         EXPECT_TRUE(std::filesystem::is_socket(socketPath()));
+        *isDue = true;
+        ASSERT_TRUE(waitUntil([=] { return !*isDue; }));
+        ASSERT_TRUE(waitUntilAnswerIsAwaited());
+        expectStopWithin({1});
+        EXPECT_EQ(log.count(failureLine(-52007)), 2);
     }
 };
 
 TEST_F(OwnSocketTest, RemovedLosesOnePoll) {
-    beginWell();
-    remove();
-    expectOneLostPoll();
-    remove();
-    ASSERT_TRUE(waitUntilAnswerIsAwaited());
-    expectStopWithin({1});
+    expectOneLostPoll(remove);
 }
 
 TEST_F(OwnSocketTest, ReplacedByAFileLosesOnePoll) {
-    beginWell();
-    remove();
-    writeFile(socketPath(), "no socket");
-    expectOneLostPoll();
-    remove();
-    writeFile(socketPath(), "no socket");
-    ASSERT_TRUE(waitUntilAnswerIsAwaited());
-    expectStopWithin({1});
+    expectOneLostPoll([] {
+        remove();
+        writeFile(socketPath(), "no socket");
+    });
 }
 
 TEST_F(OwnSocketTest, ReplacedByAnotherLosesOnePoll) {
-    beginWell();
-    remove();
-    std::optional<DatagramSocket> thief(socketPath());
-    expectOneLostPoll();
-    EXPECT_TRUE(thief->receiveQueued());
-    remove();
-    thief.emplace(socketPath());
-    ASSERT_TRUE(waitUntilAnswerIsAwaited());
-    expectStopWithin({1});
+    const auto thief = std::make_shared<std::optional<DatagramSocket>>();
+    expectOneLostPoll([=] {
+        remove();
+        thief->emplace(socketPath());
+    });
+    EXPECT_TRUE((*thief)->receiveQueued());
 }
 
 TEST_F(OwnSocketTest, ReplacedByAFolderIsAFailureUntilItGoes) {

@@ -1,5 +1,6 @@
 // A host that gets signals, in any of its threads.
 
+#include <algorithm>
 #include <atomic>
 #include <chrono>
 #include <csignal>
@@ -111,6 +112,56 @@ TEST_F(SignalFaultTest, DoesNotShortenASleep) {
     EXPECT_EQ(qualities().at(1), usable);
     expectNothingWorseThanFailures();
     host.onCall(nullptr);
+    expectStopWithin({});
+}
+
+// The host refuses the death, so that the watchdog reports it again after each second.
+TEST_F(SignalFaultTest, DoesNotShortenTheWatchdogsSecond) {
+    host.onCall([death = died.reason](const RecordingHost::Call& call, zeerr_Status& status) {
+        status.code = call.text == death ? -52009 : 0;
+    });
+    beginAndFindThreads("exit-at-once 0\n");
+    const int before = handledSignals();
+    const SignalRain rain(threads);
+    helpers.threads = 1;
+    const auto deaths = [this] {
+        Calls chosen = host.calls(Function::setTRQuality);
+        chosen.erase(std::remove_if(chosen.begin(), chosen.end(),
+                                    [this](const auto& call) { return call.text != died.reason; }),
+                     chosen.end());
+        return chosen;
+    };
+    ASSERT_TRUE(waitUntil([=] { return deaths().size() >= 2; }));
+    EXPECT_GT(handledSignals(), before + 50);
+    EXPECT_GE(deaths().at(1).at - deaths().at(0).at, seconds(1));
+    expectStopWithin({});
+}
+
+// Each of the system calls there, as often as it takes for signals to meet them.
+TEST_F(SignalFaultTest, InInitialiseAndStartChangesNothing) {
+    SimulatedDaemon::script("gm present\n");
+    session.initialise();
+    session.finalise();
+    const std::string configuration = readFile(SimulatedDaemon::configFile);
+    const SignalRain rain({gettid()});
+    helpers.threads = 1;
+    for (const int before = handledSignals(); handledSignals() < before + 50;) {
+        session.initialise();
+        session.finalise();
+        ASSERT_EQ(readFile(SimulatedDaemon::configFile), configuration);
+    }
+    for (int start = 0; start < 8; ++start) {
+        const ShortSleeps hurry;
+        session.initialise();
+        session.start();
+        session.stop();
+        session.finalise();
+    }
+    const std::size_t former = host.calls(Function::adjustTime).size();
+    begin("clock fixed 1000\n");
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, former + 1));
+    EXPECT_EQ(qualities().back(), usable);
+    expectNothingWorseThanFailures();
     expectStopWithin({});
 }
 

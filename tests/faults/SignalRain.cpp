@@ -1,12 +1,12 @@
 #include "SignalRain.h"
 
-#include <chrono>
 #include <csignal>
 #include <filesystem>
 #include <fstream>
 #include <string>
 #include <utility>
 
+#include <poll.h>
 #include <sys/syscall.h>
 #include <unistd.h>
 
@@ -66,7 +66,7 @@ SignalRain::SignalRain(std::vector<pid_t> threads, std::function<bool()> conditi
             for (std::size_t i = 0; i < threads.size() && condition(); ++i) {
                 sendTo(threads[i]);
             }
-            std::this_thread::sleep_for(std::chrono::milliseconds(1));
+            poll(nullptr, 0, 1); // Its nanosleep would count as the plug-in's.
         }
     });
 }

@@ -6,16 +6,16 @@
 #include <chrono>
 #include <condition_variable>
 #include <csignal>
-#include <cstring>
 #include <ctime>
 #include <limits>
 #include <mutex>
 
-#include <dlfcn.h>
+#include <linux/futex.h>
 #include <pthread.h>
 #include <sys/syscall.h>
 #include <unistd.h>
 
+#include "support/NextFunction.h"
 #include "support/OwnAllocations.h"
 
 // A sanitizer's, when there is one: it must know of every thread.
@@ -25,9 +25,12 @@ extern "C" [[gnu::weak]] int __interceptor_pthread_create(pthread_t* thread,
 
 namespace {
 
-constexpr long beforeFirstPoll = 125000000;
+using std::chrono::nanoseconds;
+using std::chrono::steady_clock;
 
-thread_local std::chrono::nanoseconds oversleptByThisThread{0};
+constexpr std::chrono::milliseconds beforeFirstPoll{125};
+
+thread_local nanoseconds oversleptByThisThread{0};
 
 constexpr int unlimited = std::numeric_limits<int>::max();
 
@@ -43,28 +46,69 @@ Signals& signals() {
     return instance;
 }
 
-struct Sleeps {
+struct Hold {
     std::mutex mutex;
     std::condition_variable changed;
-    bool areShort = false;
-    bool areHeld = false;
+    bool isOn = false;
 };
 
-Sleeps& sleeps() {
-    static Sleeps instance;
+Hold& hold() {
+    static Hold instance;
     return instance;
 }
 
-using CreateThread = int (*)(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*);
+/// Whether sleeps of a second and more are short: a futex, so that what waits for it is interrupted
+/// by signals as nanosleep is.
+std::atomic<int> sleepsAreShort{0};
+static_assert(sizeof(sleepsAreShort) == sizeof(int) && std::atomic<int>::is_always_lock_free);
 
-CreateThread nextCreateThread() {
-    if (__interceptor_pthread_create != nullptr) {
-        return &__interceptor_pthread_create;
+std::atomic<int> workerSleepCount{0};
+std::atomic<nanoseconds> shortestWorkerSleep{nanoseconds::max()};
+std::atomic<nanoseconds> longestWorkerSleep{nanoseconds::min()};
+
+/// The worker alone sleeps less than a second without being the first thread.
+void countWorkersSleep(nanoseconds duration) {
+    if (gettid() == getpid()) {
+        return;
     }
-    void* const address = dlsym(RTLD_NEXT, "pthread_create");
-    CreateThread function = nullptr;
-    std::memcpy(&function, &address, sizeof(function));
-    return function;
+    shortestWorkerSleep = std::min(shortestWorkerSleep.load(), duration);
+    longestWorkerSleep = std::max(longestWorkerSleep.load(), duration);
+    ++workerSleepCount;
+}
+
+timespec toTimespec(nanoseconds duration) {
+    const auto whole = std::chrono::duration_cast<std::chrono::seconds>(duration);
+    timespec result{};
+    result.tv_sec = static_cast<decltype(result.tv_sec)>(whole.count());
+    result.tv_nsec = static_cast<decltype(result.tv_nsec)>((duration - whole).count());
+    return result;
+}
+
+/// As nanosleep, but over at once when sleeps are short, or get short.
+int sleepLong(const timespec* duration, nanoseconds end, timespec* rest) {
+    syscall(SYS_futex, &sleepsAreShort, FUTEX_WAIT_PRIVATE, 0, duration, nullptr, 0);
+    const nanoseconds left = end - steady_clock::now().time_since_epoch();
+    if (sleepsAreShort != 0 || left <= nanoseconds(0)) {
+        return 0;
+    }
+    if (rest != nullptr) {
+        *rest = toTimespec(left);
+    }
+    errno = EINTR;
+    return -1;
+}
+
+int sleepBriefly(const timespec* duration, nanoseconds end, timespec* rest) {
+    const int result = static_cast<int>(syscall(SYS_nanosleep, duration, rest));
+    oversleptByThisThread += std::max(nanoseconds(0), steady_clock::now().time_since_epoch() - end);
+    return result;
+}
+
+using CreateThread = int(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*);
+
+CreateThread* nextCreateThread() {
+    return __interceptor_pthread_create != nullptr ? &__interceptor_pthread_create
+                                                   : nextFunction<CreateThread>("pthread_create");
 }
 
 } // namespace
@@ -81,24 +125,17 @@ extern "C" {
 }
 
 [[gnu::visibility("default")]] int nanosleep(const timespec* duration, timespec* rest) {
-    if (duration->tv_sec == 0) {
-        if (duration->tv_nsec == beforeFirstPoll) {
-            std::unique_lock<std::mutex> lock(sleeps().mutex);
-            sleeps().changed.wait(lock, [] { return !sleeps().areHeld; });
-        }
-        const auto end =
-            std::chrono::steady_clock::now() + std::chrono::nanoseconds(duration->tv_nsec);
-        const int result = static_cast<int>(syscall(SYS_nanosleep, duration, rest));
-        oversleptByThisThread +=
-            std::max(std::chrono::nanoseconds(0),
-                     std::chrono::nanoseconds(std::chrono::steady_clock::now() - end));
-        return result;
+    const auto asked = std::chrono::seconds(duration->tv_sec) + nanoseconds(duration->tv_nsec);
+    if (asked < std::chrono::seconds(1)) {
+        countWorkersSleep(asked);
     }
-    std::unique_lock<std::mutex> lock(sleeps().mutex);
-    sleeps().changed.wait_for(
-        lock, std::chrono::seconds(duration->tv_sec) + std::chrono::nanoseconds(duration->tv_nsec),
-        [] { return sleeps().areShort; });
-    return 0;
+    if (asked == beforeFirstPoll) {
+        std::unique_lock<std::mutex> lock(hold().mutex);
+        hold().changed.wait(lock, [] { return !hold().isOn; });
+    }
+    const nanoseconds end = steady_clock::now().time_since_epoch() + asked;
+    return asked < std::chrono::seconds(1) ? sleepBriefly(duration, end, rest)
+                                           : sleepLong(duration, end, rest);
 }
 
 [[gnu::visibility("default")]] int pthread_create(pthread_t* thread,
@@ -126,8 +163,25 @@ void forgetSentSignals() {
     signals().sent.clear();
 }
 
-std::chrono::nanoseconds overslept() {
+nanoseconds overslept() {
     return oversleptByThisThread;
+}
+
+int workerSleeps() {
+    return workerSleepCount;
+}
+
+nanoseconds shortestSleepOfWorker() {
+    return shortestWorkerSleep;
+}
+
+nanoseconds longestSleepOfWorker() {
+    return longestWorkerSleep;
+}
+
+void forgetWorkerSleeps() {
+    shortestWorkerSleep = nanoseconds::max();
+    longestWorkerSleep = nanoseconds::min();
 }
 
 ThreadLimit::ThreadLimit(int allowed) {
@@ -139,23 +193,21 @@ ThreadLimit::~ThreadLimit() {
 }
 
 ShortSleeps::ShortSleeps() {
-    const std::lock_guard<std::mutex> lock(sleeps().mutex);
-    sleeps().areShort = true;
-    sleeps().changed.notify_all();
+    sleepsAreShort = 1;
+    syscall(SYS_futex, &sleepsAreShort, FUTEX_WAKE_PRIVATE, std::numeric_limits<int>::max());
 }
 
 ShortSleeps::~ShortSleeps() {
-    const std::lock_guard<std::mutex> lock(sleeps().mutex);
-    sleeps().areShort = false;
+    sleepsAreShort = 0;
 }
 
 HeldPolls::HeldPolls() {
-    const std::lock_guard<std::mutex> lock(sleeps().mutex);
-    sleeps().areHeld = true;
+    const std::lock_guard<std::mutex> lock(hold().mutex);
+    hold().isOn = true;
 }
 
 HeldPolls::~HeldPolls() {
-    const std::lock_guard<std::mutex> lock(sleeps().mutex);
-    sleeps().areHeld = false;
-    sleeps().changed.notify_all();
+    const std::lock_guard<std::mutex> lock(hold().mutex);
+    hold().isOn = false;
+    hold().changed.notify_all();
 }

@@ -27,6 +27,14 @@ void forgetSentSignals();
 /// a busy machine wakes up late.
 std::chrono::nanoseconds overslept();
 
+/// The sleeps below a second of all threads but the first: the worker's, one before each poll, when
+/// no thread of the test uses nanosleep. How many there have been so far, and the shortest and the
+/// longest so far, or since they were last forgotten.
+int workerSleeps();
+std::chrono::nanoseconds shortestSleepOfWorker();
+std::chrono::nanoseconds longestSleepOfWorker();
+void forgetWorkerSleeps();
+
 /// Lets thread creation fail while this object lives.
 class ThreadLimit {
 public:

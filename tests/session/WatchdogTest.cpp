@@ -135,17 +135,6 @@ TEST_F(WatchdogTest, RetriesEachSecondUntilTheHostAccepts) {
                                             SyslogCapture::Line{LOG_ERR, threw}));
 }
 
-TEST_F(WatchdogTest, StopEndsTheRetries) {
-    host.onCall([](const RecordingHost::Call& call, zeerr_Status& status) {
-        status.code = call.text == death ? -1 : 0;
-    });
-    begin("exit-at-once 0\n");
-    ASSERT_TRUE(waitForLog(refused));
-    session.stop();
-    expectOwnThreads(0);
-    EXPECT_THAT(sentSignals(), IsEmpty());
-}
-
 TEST_F(WatchdogTest, CallsTheHostAtTheSameTimeAsTheWorker) {
     // Each of the two waits in the host until the other is there, too.
     struct Meeting {

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <atomic>
 #include <cctype>
-#include <map>
 #include <sstream>
 #include <thread>
 
@@ -107,51 +106,64 @@ private:
     std::thread thread_;
 };
 
-class WireFormatTest : public SessionTest {};
+class WireFormatTest : public SessionTest {
+protected:
+    /// The pair that the host heard first, as it is shown.
+    std::string firstPair() const {
+        const auto pair = host.calls(Function::adjustTime).at(0);
+        return "reference " + std::to_string(pair.referenceTime) + " local " +
+               std::to_string(pair.localTime) + "\n";
+    }
+};
 
-TEST_F(WireFormatTest, ExampleIsWhatIsSentAndUnderstood) {
-    ShownDaemon shownDaemon("ptp4l.sock");
-    begin("start-delay 1000000\n", R"(["bc0"])");
-    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
-    auto requests = shownDaemon.stop();
-    const auto expected = shown('>');
+void expectEqual(const std::vector<Octets>& requests, const std::vector<Datagram>& expected) {
     ASSERT_EQ(expected.size(), 6U);
     ASSERT_GE(requests.size(), 6U);
     for (std::size_t index = 0; index < 6; ++index) {
         EXPECT_EQ(requests[index], expected[index].octets) << expected[index].title;
     }
+}
+
+TEST_F(WireFormatTest, ExampleIsWhatIsSentAndUnderstood) {
+    ShownDaemon shownDaemon("ptp4l.sock");
+    begin("start-delay 1000000\n", R"(["bc0"])");
+    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
+    expectEqual(shownDaemon.stop(), shown('>'));
     EXPECT_EQ(metaData().at(1), withoutBlanks(shownBlock("{")));
-    const auto pair = host.calls(Function::adjustTime).at(0);
-    EXPECT_EQ("reference " + std::to_string(pair.referenceTime) + " local " +
-                  std::to_string(pair.localTime) + "\n",
-              shownBlock("reference "));
+    EXPECT_EQ(firstPair(), shownBlock("reference "));
     EXPECT_EQ(qualities().at(1), (QualityReport{"PTP role has changed.", true}));
 }
 
-TEST_F(WireFormatTest, TitlesAndTheTableOfDataSetsHaveTheLengths) {
-    std::vector<std::string> titles, lengths;
+TEST_F(WireFormatTest, TitlesTellTheLengths) {
+    for (const char direction : {'>', '<'}) {
+        for (const auto& datagram : shown(direction)) {
+            EXPECT_EQ(datagram.title.substr(datagram.title.find(", ")),
+                      ", " + std::to_string(datagram.octets.size()) + " octets");
+        }
+    }
+}
+
+int fieldOf(const Octets& octets, std::size_t at) {
+    return octets.at(at) * 256 + octets.at(at + 1);
+}
+
+TEST_F(WireFormatTest, TableOfDataSetsIsThatOfTheRequests) {
     const auto rows = markdown::tables(document(), {"data set", "managementId",
                                                     "request: octets, messageLength, lengthField",
                                                     "answers", "an answer has"});
     const auto requests = shown('>');
     ASSERT_EQ(rows.size(), requests.size());
     for (std::size_t index = 0; index < rows.size(); ++index) {
+        const auto& row = rows[index];
         const Octets& octets = requests[index].octets;
-        const auto field = [&](std::size_t at) { return octets[at] * 256 + octets[at + 1]; };
-        const std::string length = std::to_string(octets.size());
-        EXPECT_EQ(requests[index].title, rows[index][0] + ", " + length + " octets");
-        EXPECT_EQ(std::stoi(rows[index][1], nullptr, 16), field(52));
-        const bool padded = rows[index][0] == "PORT_PROPERTIES_NP";
-        EXPECT_EQ(rows[index][2], length + ", " + (padded ? "67 or " : "") + length + ", " +
-                                      std::to_string(field(50)));
-        EXPECT_EQ(rows[index][4],
-                  (index > 2 ? "at least " : "") + std::to_string(field(2)) + " octets");
+        const std::string size = std::to_string(octets.size());
+        const std::string length = std::to_string(fieldOf(octets, 2));
+        EXPECT_EQ(requests[index].title, row[0] + ", " + size + " octets");
+        EXPECT_EQ(std::stoi(row[1], nullptr, 16), fieldOf(octets, 52));
+        EXPECT_EQ(row[2], size + ", " + (length == size ? "" : length + " or ") + size + ", " +
+                              std::to_string(fieldOf(octets, 50)));
+        EXPECT_EQ(row[4], (row[3] == "1" ? "" : "at least ") + length + " octets");
     }
-    for (const auto& answer : shown('<')) {
-        titles.push_back(answer.title.substr(answer.title.find(", ") + 2));
-        lengths.push_back(std::to_string(answer.octets.size()) + " octets");
-    }
-    EXPECT_EQ(titles, lengths);
 }
 
 /// Where each table of fields ends that has no gap. A field of n octets ends its table.

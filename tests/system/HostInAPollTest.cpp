@@ -9,7 +9,6 @@
 #include <filesystem>
 #include <ostream>
 
-#include <dlfcn.h>
 #include <gtest/gtest.h>
 #include <sys/prctl.h>
 #include <sys/socket.h>
@@ -18,6 +17,7 @@
 
 #include "contract/PluginFixture.h"
 #include "support/EpochFifo.h"
+#include "support/NextFunction.h"
 #include "system/ManagementClient.h"
 #include "system/Scene.h"
 
@@ -49,8 +49,7 @@ extern "C" [[gnu::visibility("default")]] ssize_t sendto(int socket, const void*
                                                          std::size_t length, int flags,
                                                          const sockaddr* address,
                                                          socklen_t addressLength) {
-    using Function = ssize_t (*)(int, const void*, std::size_t, int, const sockaddr*, socklen_t);
-    static const auto next = reinterpret_cast<Function>(dlsym(RTLD_NEXT, "sendto"));
+    static const auto next = nextFunction<decltype(sendto)>("sendto");
     const ssize_t sent = next(socket, octets, length, flags, address, addressLength);
     if (fatalRequest != 0 && managementIdOf(octets, length) == fatalRequest) {
         fatalRequest = 0;
