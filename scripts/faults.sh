@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Runs every row of the fault matrix of docs/testing.md so many times (default 3), and prints what
-# stop took at most in each, beside what it may take. Fails when a row fails.
+# stop took at most in each, beside what it may take and by how much sleeps in it were late. Fails
+# when a row fails, or has measured no stop and was not skipped.
 # usage: scripts/faults.sh [times]
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -18,23 +19,46 @@ cmake --build --preset release -j "$(nproc)" --target faults -- --quiet
 
 # Each row is a process in a folder of its own, which sleeps most of the time.
 status=0
-ctest --test-dir build/release/tests/faults --verbose --repeat "until-fail:$times" \
+ctest --test-dir build/release/tests/faults --no-tests=error --verbose --repeat "until-fail:$times" \
   -j $((2 * $(nproc))) >"$log" || status=$?
 
+# First the rows, then what was printed.
 awk '
-  match($0, /\[ STOP \] .* s of at most .* s$/) {
-    split(substr($0, RSTART + 9, RLENGTH - 9), part, / s$|: | s of at most /)
+  FNR == NR {
+    if (match($0, /s \| `[A-Za-z]+\.[A-Za-z0-9]+` \|$/))
+      rows[substr($0, RSTART + 5, RLENGTH - 8)]
+    next
+  }
+  match($0, /\[ STOP \] .* s of at most .* s late$/) {
+    split(substr($0, RSTART + 9, RLENGTH - 9), part, /: | s of at most | s \+ | s late$/)
     name = part[1]
-    if (part[2] > worst[name]) worst[name] = part[2]
+    if (!(name in runs) || part[2] - part[4] > worst[name] - late[name]) {
+      worst[name] = part[2]
+      late[name] = part[4]
+    }
     bound[name] = part[3]
     ++runs[name]
   }
+  match($0, /\[  SKIPPED \] [^ ]+ \(/) {
+    name = substr($0, RSTART + 13, RLENGTH - 15)
+    sub(/^[^.]*\//, "", name)
+    sub(/\/.*/, "", name)
+    skipped[name]
+  }
   END {
-    printf "%-90s %9s %9s %5s\n", "row", "worst", "bound", "runs"
+    printf "%-72s %9s %9s %9s %5s\n", "row", "worst", "bound", "late", "runs"
     fflush()
     for (name in runs)
-      printf "%-90s %7.3f s %7.1f s %5d\n", name, worst[name], bound[name], runs[name] | "sort"
-  }' "$log"
+      printf "%-72s %7.3f s %7.1f s %7.1f s %5d\n", name, worst[name], bound[name], late[name],
+        runs[name] | "sort"
+    close("sort")
+    for (name in rows)
+      if (!(name in runs) && !(name in skipped)) {
+        print "no stop was measured: " name
+        missing = 1
+      }
+    exit missing
+  }' docs/testing.md "$log" || status=1
 # What failed and what was skipped, from the summary of ctest on.
 sed -n '/tests passed/,$p' "$log"
 if [[ $status -ne 0 ]]; then

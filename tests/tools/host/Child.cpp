@@ -12,6 +12,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "ProgramArguments.h"
+
 namespace {
 
 using Clock = std::chrono::steady_clock;
@@ -37,22 +39,6 @@ void closeIfOpen(int& descriptor) {
     }
 }
 
-std::vector<char*> pointers(std::vector<std::string>& texts) {
-    std::vector<char*> result;
-    for (auto& text : texts) {
-        result.push_back(text.data());
-    }
-    result.push_back(nullptr);
-    return result;
-}
-
-std::vector<std::string> wholeEnvironment(std::vector<std::string> texts) {
-    for (char** variable = environ; *variable != nullptr; ++variable) {
-        texts.emplace_back(*variable);
-    }
-    return texts;
-}
-
 /// @return false at the end of the data; the descriptor is then closed.
 bool append(int& descriptor, std::string& text) {
     std::array<char, 65536> buffer;
@@ -69,10 +55,8 @@ bool append(int& descriptor, std::string& text) {
 
 Child::Child(const std::vector<std::string>& command, const std::vector<std::string>& environment,
              const std::string& input) {
-    auto arguments = command;
-    auto variables = wholeEnvironment(environment);
-    const auto argv = pointers(arguments);
-    const auto envp = pointers(variables);
+    const ProgramArguments arguments(command);
+    const ProgramArguments variables(environmentWith(environment));
     Pipe in;
     Pipe out;
     Pipe err;
@@ -86,7 +70,7 @@ Child::Child(const std::vector<std::string>& command, const std::vector<std::str
         ::dup2(in.reading, STDIN_FILENO);
         ::dup2(out.writing, STDOUT_FILENO);
         ::dup2(err.writing, STDERR_FILENO);
-        ::execve(argv[0], argv.data(), envp.data());
+        ::execve(command[0].c_str(), arguments.get(), variables.get());
         ::_exit(127);
     }
     outputDescriptor_ = out.reading;

@@ -12,19 +12,12 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "ProgramArguments.h"
+
 namespace {
 
 using Clock = std::chrono::steady_clock;
 constexpr std::chrono::seconds patience(20);
-
-std::vector<char*> pointers(std::vector<std::string>& texts) {
-    std::vector<char*> result;
-    for (auto& text : texts) {
-        result.push_back(text.data());
-    }
-    result.push_back(nullptr);
-    return result;
-}
 
 int countOf(const std::string& text, const std::string& in) {
     int count = 0;
@@ -38,13 +31,8 @@ int countOf(const std::string& text, const std::string& in) {
 
 Terminal::Terminal(const std::vector<std::string>& command,
                    const std::vector<std::string>& environment) {
-    auto arguments = command;
-    auto variables = environment;
-    for (char** variable = environ; *variable != nullptr; ++variable) {
-        variables.emplace_back(*variable);
-    }
-    const auto argv = pointers(arguments);
-    const auto envp = pointers(variables);
+    const ProgramArguments arguments(command);
+    const ProgramArguments variables(environmentWith(environment));
     winsize size{};
     size.ws_row = 24;
     size.ws_col = 80;
@@ -55,7 +43,7 @@ Terminal::Terminal(const std::vector<std::string>& command,
         if (::getppid() != parent) {
             ::_exit(126);
         }
-        ::execve(argv[0], argv.data(), envp.data());
+        ::execve(command[0].c_str(), arguments.get(), variables.get());
         ::_exit(127);
     }
     if (pid_ < 0) {

@@ -1,5 +1,9 @@
 #include "Checks/TimeStamping.h"
 
+#include <cerrno>
+
+#include <net/if.h>
+
 #include <linux/ethtool.h>
 #include <linux/net_tstamp.h>
 #include <linux/sockios.h>
@@ -22,11 +26,15 @@ constexpr std::uint32_t eventFilters =
 } // namespace
 
 TimeStamping readTimeStamping(const std::string& interface) {
+    TimeStamping result;
+    if (::if_nametoindex(interface.c_str()) == 0) {
+        result.error = errno;
+        return result;
+    }
     ethtool_ts_info info{};
     info.cmd = ETHTOOL_GET_TS_INFO;
     InterfaceRequest request(interface);
     request.get().ifr_data = reinterpret_cast<char*>(&info);
-    TimeStamping result;
     result.error = request.ask(SIOCETHTOOL);
     result.capabilities = info.so_timestamping;
     result.clock = info.phc_index;
