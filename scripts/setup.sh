@@ -4,6 +4,7 @@
 #   demo      build, and run the plug-in with the real daemon
 #   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd
 #   armhf     what tests needs, for 32-bit ARM under emulation
+#   bench     what tests needs, and counters for scripts/bench.sh
 #   packages  build Debian packages, check and install them
 set -euo pipefail
 
@@ -17,6 +18,7 @@ checks=(clang libclang-rt-14-dev clang-format-14 clang-tidy-14 gcovr shellcheck 
 armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
   libcjson-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
   libbenchmark-dev:armhf)
+bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap uidmap)
 
 packages=()
@@ -26,9 +28,10 @@ for group in "${@:-tests}"; do
     demo) packages+=("${build[@]}" "${daemon[@]}") ;;
     checks) packages+=("${checks[@]}") ;;
     armhf) packages+=("${armhf[@]}") ;;
+    bench) packages+=("${bench[@]}") ;;
     packages) packages+=("${debs[@]}") ;;
     *)
-      echo "usage: $0 [tests|demo|checks|armhf|packages]..." >&2
+      echo "usage: $0 [tests|demo|checks|armhf|bench|packages]..." >&2
       exit 2
       ;;
   esac

@@ -44,11 +44,7 @@ public:
     }
 
     /// Octets that are neither interpreted nor kept.
-    void reserved(unsigned octets) const {
-        for (unsigned octet = 0; octet < octets; ++octet) {
-            buffer_.readU8(status_);
-        }
-    }
+    void reserved(unsigned octets) const { buffer_.skip(octets, status_); }
 
 private:
     template <typename Field>

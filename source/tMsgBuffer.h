@@ -1,6 +1,7 @@
 /// @file
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
 #include <cstring>
@@ -41,6 +42,9 @@ public:
     std::uint32_t readU32(zeerr::Status& status);
     std::uint64_t readU64(zeerr::Status& status);
 
+    /// Reads so many octets and keeps none.
+    void skip(std::uint32_t octets, zeerr::Status& status);
+
     void writeU8(std::uint8_t value, zeerr::Status& status);
     void writeU16(std::uint16_t value, zeerr::Status& status);
     void writeU32(std::uint32_t value, zeerr::Status& status);
@@ -51,6 +55,10 @@ private:
     /// which consumes what there is.
     template <typename Integer>
     bool readAtOnce(Integer& octets, const zeerr::Status& status);
+
+    /// Writes a value for which there is room. One that the end cuts is written octet by octet.
+    template <typename Integer>
+    bool writeAtOnce(Integer octets, const zeerr::Status& status);
 
     static void reportReadPastEnd(zeerr::Status& status);
     static void reportWritePastEnd(zeerr::Status& status);
@@ -84,7 +92,7 @@ inline std::uint8_t tMsgBuffer::readU8(zeerr::Status& status) {
 
 template <typename Integer>
 bool tMsgBuffer::readAtOnce(Integer& octets, const zeerr::Status& status) {
-    if (zeerr::isError(status) || length_ - readPos_ < sizeof(octets)) {
+    if (zeerr::isError(status) || readPos_ + sizeof(octets) > length_) {
         return false;
     }
     std::memcpy(&octets, &data_[readPos_], sizeof(octets));
@@ -116,6 +124,18 @@ inline std::uint64_t tMsgBuffer::readU64(zeerr::Status& status) {
     return high << 32 | readU32(status);
 }
 
+inline void tMsgBuffer::skip(std::uint32_t octets, zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    if (readPos_ + octets > length_) {
+        readPos_ = std::max(readPos_, length_);
+        reportReadPastEnd(status);
+        return;
+    }
+    readPos_ += octets;
+}
+
 inline void tMsgBuffer::writeU8(std::uint8_t value, zeerr::Status& status) {
     if (zeerr::isError(status)) {
         return;
@@ -130,17 +150,37 @@ inline void tMsgBuffer::writeU8(std::uint8_t value, zeerr::Status& status) {
     }
 }
 
+template <typename Integer>
+bool tMsgBuffer::writeAtOnce(Integer octets, const zeerr::Status& status) {
+    if (zeerr::isError(status) || maximumLength - writePos_ < sizeof(octets)) {
+        return false;
+    }
+    std::memcpy(&data_[writePos_], &octets, sizeof(octets));
+    writePos_ += sizeof(octets);
+    length_ += sizeof(octets);
+    return true;
+}
+
 inline void tMsgBuffer::writeU16(std::uint16_t value, zeerr::Status& status) {
+    if (writeAtOnce(htobe16(value), status)) {
+        return;
+    }
     writeU8(static_cast<std::uint8_t>(value >> 8), status);
     writeU8(static_cast<std::uint8_t>(value & 0xff), status);
 }
 
 inline void tMsgBuffer::writeU32(std::uint32_t value, zeerr::Status& status) {
+    if (writeAtOnce(htobe32(value), status)) {
+        return;
+    }
     writeU16(static_cast<std::uint16_t>(value >> 16), status);
     writeU16(static_cast<std::uint16_t>(value & 0xffff), status);
 }
 
 inline void tMsgBuffer::writeU64(std::uint64_t value, zeerr::Status& status) {
+    if (writeAtOnce(htobe64(value), status)) {
+        return;
+    }
     writeU32(static_cast<std::uint32_t>(value >> 32), status);
     writeU32(static_cast<std::uint32_t>(value & 0xffffffff), status);
 }

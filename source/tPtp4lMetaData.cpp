@@ -154,14 +154,13 @@ void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
     }
     for (std::size_t i = 0; i < portDataSets.size(); ++i) {
         const tPortDataSet& dataSet = portDataSets[i];
-        tPortMetaData& port = ports_["Port" + std::to_string(dataSet.portIdentity.portNumber())];
-        port.portState = portStateName(dataSet.portState);
-        port.asCapable = portDataSetsNp[i].asCapable != 0 ? "true" : "false";
-        port.logAnnounceInterval = dataSet.logAnnounceInterval;
-        port.logSyncInterval = dataSet.logSyncInterval;
-        port.logPdelayInterval = dataSet.logMinPdelayReqInterval;
-        port.neighborPropDelayThreshold = portDataSetsNp[i].neighborPropDelayThresh;
-        port.interface = portProperties[i].interface.text();
+        ports_.insert_or_assign("Port" + std::to_string(dataSet.portIdentity.portNumber()),
+                                tPortMetaData{portStateName(dataSet.portState),
+                                              portDataSetsNp[i].asCapable != 0 ? "true" : "false",
+                                              dataSet.logAnnounceInterval, dataSet.logSyncInterval,
+                                              dataSet.logMinPdelayReqInterval,
+                                              portDataSetsNp[i].neighborPropDelayThresh,
+                                              portProperties[i].interface.text()});
     }
 }
 

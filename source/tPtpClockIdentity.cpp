@@ -1,25 +1,27 @@
 #include "tPtpClockIdentity.h"
 
+#include <cstring>
+
+#include <endian.h>
+
 namespace zekelVantel {
 
 tPtpClockIdentity::tPtpClockIdentity(std::uint64_t value) {
-    for (auto octet = identity_.rbegin(); octet != identity_.rend(); ++octet) {
-        *octet = static_cast<std::uint8_t>(value & 0xff);
-        value >>= 8;
-    }
+    const std::uint64_t octets = htobe64(value);
+    std::memcpy(identity_.data(), &octets, sizeof(octets));
 }
 
 void tPtpClockIdentity::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
-    const tPtpClockIdentity whole(buffer.readU64(status));
+    const std::uint64_t octets = htobe64(buffer.readU64(status));
     if (!zeerr::isError(status)) {
-        *this = whole;
+        std::memcpy(identity_.data(), &octets, sizeof(octets));
     }
 }
 
 void tPtpClockIdentity::serialize(tMsgBuffer& buffer, zeerr::Status& status) const {
-    for (const std::uint8_t octet : identity_) {
-        buffer.writeU8(octet, status);
-    }
+    std::uint64_t octets = 0;
+    std::memcpy(&octets, identity_.data(), sizeof(octets));
+    buffer.writeU64(be64toh(octets), status);
 }
 
 std::uint32_t tPtpClockIdentity::size() const {

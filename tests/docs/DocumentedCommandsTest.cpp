@@ -155,9 +155,9 @@ TEST(DocumentedCommandsTest, EachStandsInTheTableOfHowItIsVerified) {
 
 bool exists(const std::string& test) {
     static const auto tests = definedTests();
-    static const std::string others = projectFile("tests/packaging/CMakeLists.txt") +
-                                      projectFile("tests/soak/CMakeLists.txt") +
-                                      projectFile("fuzz/CMakeLists.txt");
+    static const std::string others =
+        projectFile("tests/packaging/CMakeLists.txt") + projectFile("tests/soak/CMakeLists.txt") +
+        projectFile("bench/CMakeLists.txt") + projectFile("fuzz/CMakeLists.txt");
     return tests.count(test) == 1 || fs::exists(fs::path(VANTEL_PROJECT_FOLDER) / test) ||
            others.find(test.substr(test.rfind('.') + 1)) != std::string::npos;
 }

@@ -175,6 +175,32 @@ TEST_F(MsgBufferTest, SettingTheLengthLeavesTheReadPosition) {
     EXPECT_EQ(status.code, -52012);
 }
 
+TEST_F(MsgBufferTest, ReadingBehindALengthThatShrankIsEndOfData) {
+    buffer.writeU64(0x0102030405060708, status);
+    EXPECT_EQ(buffer.readU16(status), 0x0102U);
+    buffer.setLength(1, status);
+    buffer.readU32(status);
+    EXPECT_EQ(status.code, -52012);
+}
+
+TEST_F(MsgBufferTest, SkippingReadsAndKeepsNothing) {
+    buffer.writeU32(0x01020304, status);
+    buffer.skip(3, status);
+    EXPECT_EQ(buffer.readU8(status), 0x04U);
+    EXPECT_EQ(status.code, 0);
+    buffer.skip(0, status);
+    EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(MsgBufferTest, SkippingPastTheEndConsumesWhatThereIs) {
+    buffer.writeU16(0x0A0B, status);
+    buffer.skip(3, status);
+    EXPECT_EQ(status.code, -52012);
+    zeerr::LocalStatus fresh;
+    EXPECT_EQ(buffer.readU8(fresh), 0U);
+    EXPECT_EQ(fresh.code, -52012);
+}
+
 TEST_F(MsgBufferTest, ReadingAndWritingKeepPositionsOfTheirOwn) {
     buffer.writeU16(0x0A0B, status);
     EXPECT_EQ(buffer.readU8(status), 0x0AU);

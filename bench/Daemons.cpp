@@ -1,0 +1,70 @@
+#include "Daemons.h"
+
+#include <chrono>
+#include <filesystem>
+#include <stdexcept>
+#include <thread>
+
+#include "Child.h"
+#include "support/StubDaemon.h"
+#include "support/TemporaryFolder.h"
+#include "system/BoundaryClock.h"
+
+namespace {
+
+class Stub : public Daemon {
+public:
+    explicit Stub(std::uint16_t ports) : stub_("stub", ports) {}
+    std::string socket() const override { return "stub"; }
+
+private:
+    StubDaemon stub_;
+};
+
+class Simulator : public Daemon {
+public:
+    explicit Simulator(std::uint16_t ports) : child_(start(ports)) {
+        const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+        while (!std::filesystem::exists("simulator.sock")) {
+            if (std::chrono::steady_clock::now() > deadline) {
+                throw std::runtime_error("the simulated daemon does not start");
+            }
+            std::this_thread::sleep_for(std::chrono::milliseconds(2));
+        }
+    }
+    std::string socket() const override { return "simulator.sock"; }
+
+private:
+    static std::vector<std::string> start(std::uint16_t ports) {
+        writeFile("simulator.conf", "[global]\nuds_address simulator.sock\n");
+        writeFile("simulator.conf.sim", "ports " + std::to_string(ports) + '\n');
+        return {VANTEL_SIMPTP4L, "-f", "simulator.conf"};
+    }
+
+    Child child_;
+};
+
+class RealDaemon : public Daemon {
+public:
+    explicit RealDaemon(std::uint16_t ports) {
+        if (clock_.ports() != ports) {
+            throw std::runtime_error("the scene has another number of ports");
+        }
+    }
+    std::string socket() const override { return clock_.socket(); }
+
+private:
+    BoundaryClock clock_;
+};
+
+} // namespace
+
+std::unique_ptr<Daemon> Daemon::make(const std::string& kind, std::uint16_t ports) {
+    if (kind == "stub") {
+        return std::make_unique<Stub>(ports);
+    }
+    if (kind == "simptp4l") {
+        return std::make_unique<Simulator>(ports);
+    }
+    return std::make_unique<RealDaemon>(ports);
+}

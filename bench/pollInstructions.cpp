@@ -1,0 +1,91 @@
+// How many instructions a poll takes outside the kernel, counted by callgrind, which runs this
+// program again with --run.
+
+#include <cstdlib>
+#include <exception>
+#include <iostream>
+
+#include <CLI/CLI.hpp>
+
+#include "Child.h"
+#include "Daemons.h"
+#include "FetchClient.h"
+#include "Row.h"
+#include "Statistics.h"
+#include "support/TemporaryFolder.h"
+
+namespace {
+
+constexpr int countedPolls = 10;
+
+/// Of which the first one is the fetcher's own, when it is made.
+void runPolls(std::uint16_t ports, int polls) {
+    const TemporaryFolder folder;
+    const auto daemon = Daemon::make("stub", ports);
+    FetchClient fetch(daemon->socket());
+    for (int poll = 1; poll < polls; ++poll) {
+        fetch.poll();
+    }
+}
+
+double countInstructions(const std::string& self, std::uint16_t ports, int polls) {
+    Child callgrind({"/usr/bin/valgrind", "--tool=callgrind", "--callgrind-out-file=/dev/null",
+                     "--log-fd=1", "--toggle-collect=zekelVantel::tGetDataFromPtp4l::fetch(*)",
+                     self, "--run", "--ports", std::to_string(ports), "--polls",
+                     std::to_string(polls)});
+    std::string output;
+    for (std::string piece = callgrind.read(); !piece.empty(); piece = callgrind.read()) {
+        output += piece;
+    }
+    callgrind.waitForEnd();
+    const std::string label = "Collected : ";
+    const auto position = output.find(label);
+    if (position == std::string::npos) {
+        throw std::runtime_error("valgrind counts nothing:\n" + output);
+    }
+    return std::strtod(output.c_str() + position + label.size(), nullptr);
+}
+
+/// The first poll, which also opens the socket, does not count.
+double instructionsPerPoll(const std::string& self, std::uint16_t ports) {
+    return (countInstructions(self, ports, countedPolls + 1) - countInstructions(self, ports, 1)) /
+           countedPolls;
+}
+
+void printAll(const std::string& self, const std::vector<std::uint16_t>& portCounts) {
+    std::vector<double> x;
+    std::vector<double> y;
+    for (const std::uint16_t ports : portCounts) {
+        x.push_back(ports);
+        y.push_back(instructionsPerPoll(self, ports));
+        print({"instructions per poll", std::to_string(ports), y.back(), ""});
+    }
+    if (x.size() > 2) {
+        print({"instructions per poll, farthest from a line", "", deviationFromLine(x, y) * 100,
+               "%", std::nullopt, 5});
+    }
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
+    int polls = 1;
+    bool isInside = false;
+    CLI::App app("Prints how many instructions a poll takes, counted by callgrind.");
+    app.add_option("--ports", ports, "numbers of ports")->delimiter(',');
+    app.add_option("--polls", polls, "with --run: how many");
+    app.add_flag("--run", isInside, "only poll, to be counted");
+    CLI11_PARSE(app, argc, argv);
+    try {
+        if (isInside) {
+            runPolls(ports.at(0), polls);
+        } else {
+            printAll(argv[0], ports);
+        }
+        return 0;
+    } catch (const std::exception& error) {
+        std::cerr << "poll_instructions: " << error.what() << '\n';
+        return 1;
+    }
+}

@@ -1,0 +1,144 @@
+#!/usr/bin/env bash
+# Measures what the plug-in costs, beside other ways to do the same, and prints one table.
+# usage: scripts/bench.sh [--quick | --smoke] [--json FILE] [--build FOLDER]
+#   --quick  shorter; --smoke: only to see that every measurement works
+#   --json   also writes the rows there
+#   --build  measures what is built there, and builds nothing
+set -euo pipefail
+root=$(cd "$(dirname "$0")/.." && pwd)
+
+usage() {
+  sed -n '2,/^set /s/^# \{0,1\}//p' "$0"
+}
+
+# How long each measurement is.
+ports=1,2,8,32,64 real_ports=(1 2 8 32)
+rounds=25 answers=8000 sessions=9 seconds=60 rates=1,8,16
+build=
+json=
+while [[ $# -gt 0 ]]; do
+  case $1 in
+    --quick) rounds=9 answers=3000 sessions=3 seconds=10 ;;
+    --smoke)
+      ports=1,2 real_ports=(1)
+      rounds=1 answers=60 sessions=1 seconds=3 rates=8
+      ;;
+    --json) json=$2 && shift ;;
+    --build) build=$(realpath "$2") && shift ;;
+    --help)
+      usage
+      exit 0
+      ;;
+    *)
+      usage >&2
+      exit 2
+      ;;
+  esac
+  shift
+done
+
+build_all() {
+  cd "$root"
+  scripts/setup.sh bench
+  cmake --preset release >/dev/null
+  cmake --build --preset release -j "$(nproc)" --target benches -- --quiet
+  build=$root/build/release
+  if type -P arm-linux-gnueabihf-g++ >/dev/null && cmake --preset armhf &>/dev/null; then
+    cmake --build --preset armhf -j "$(nproc)" --target vantel_bc -- --quiet
+  fi
+}
+
+rows=$(mktemp)
+skipped=()
+trap 'rm -rf "$rows" "$rows.so"' EXIT
+
+# Appends the rows of a program; a scene that is not possible here says why on its standard error.
+measure() {
+  local status=0
+  echo "bench: ${*##*/}" >&2
+  "$@" >>"$rows" || status=$?
+  if [[ $status -eq 77 ]]; then
+    skipped+=("ptp4l: see above")
+  elif [[ $status -ne 0 ]]; then
+    echo "bench: FAILED: $*" >&2
+    exit 1
+  fi
+}
+
+measure_scene() { # ports, command...
+  local scene_ports=$1
+  shift
+  measure "$root/scripts/testbed.sh" --plugin-paths --ports "$scene_ports" -- "$@"
+}
+
+measure_size() { # name, library, strip, limit
+  if [[ ! -e $2 ]] || ! type -P "$3" >/dev/null; then
+    skipped+=("size on $1: the library is not built, or there is no $3")
+    return
+  fi
+  "$3" -o "$rows.so" "$2"
+  printf 'stripped library, %s\t\t%d\toctets\t\t%d\n' "$1" "$(stat -c %s "$rows.so")" "$4" >>"$rows"
+}
+
+measure_all() {
+  local bench=$build/bench count
+  measure "$bench/poll_cost" --daemon stub --ports "$ports" --rounds "$rounds" --answers "$answers"
+  measure "$bench/poll_line" --rounds "$rounds" --answers "$answers"
+  measure "$bench/poll_cost" --daemon simptp4l --ports "$ports" --rounds "$rounds" \
+    --answers $((answers / 4))
+  for count in "${real_ports[@]}"; do
+    measure_scene "$count" "$bench/poll_cost" --daemon ptp4l --ports "$count" \
+      --rounds "$rounds" --answers $((answers / 4))
+  done
+  if type -P valgrind >/dev/null; then
+    measure "$bench/poll_instructions" --ports "$ports"
+  else
+    skipped+=("instructions: there is no valgrind")
+  fi
+  measure "$bench/allocation_count" --ports "$ports"
+  measure "$bench/initialize_cost" --rounds "$rounds"
+  measure "$bench/session_times" --rounds "$sessions"
+  measure "$bench/host_footprint" --rounds "$sessions"
+  measure_size amd64 "$build/source/libvantel_bc.so.19" strip 204800
+  measure_size armhf "$root/build/armhf/source/libvantel_bc.so.19" arm-linux-gnueabihf-strip 163840
+  measure "$bench/delay" --daemon simptp4l --rates "$rates" --seconds "$seconds"
+  measure_scene 1 "$bench/delay" --daemon ptp4l --rates 8 --seconds "$seconds"
+}
+
+# A row's limit is that of its ratio, if it has one.
+print_table() {
+  awk -F '\t' '
+    function rounded(text) { return text == "" ? "" : text >= 1000 ? sprintf("%.0f", text) : sprintf("%.3g", text) }
+    BEGIN { printf "%-66s %5s %14s %7s %8s\n", "figure", "ports", "value", "ratio", "at most" }
+    {
+      judged = $5 == "" ? $3 : $5
+      verdict = $6 == "" ? "" : judged + 0 <= $6 + 0 ? "met" : "MISSED"
+      ratio = $5 == "" ? "" : sprintf("%.3f", $5)
+      line = sprintf("%-66s %5s %7s %-6s %7s %8s  %s", $1, $2, rounded($3), $4, ratio, $6, verdict)
+      sub(/ +$/, "", line)
+      print line
+    }' "$rows"
+}
+
+print_json() {
+  awk -F '\t' '
+    function number(text) { return text == "" ? "null" : text }
+    BEGIN { printf "[" }
+    {
+      printf "%s\n{\"figure\":\"%s\",\"ports\":\"%s\",\"value\":%s,\"unit\":\"%s\",\"ratio\":%s,\"limit\":%s}",
+        NR == 1 ? "" : ",", $1, $2, $3, $4, number($5), number($6)
+    }
+    END { print "\n]" }' "$rows"
+}
+
+if [[ -z $build ]]; then
+  build_all
+fi
+measure_all
+print_table
+if [[ ${#skipped[@]} -gt 0 ]]; then
+  printf 'SKIPPED: %s\n' "${skipped[@]}"
+fi
+if [[ -n $json ]]; then
+  print_json >"$json"
+fi
