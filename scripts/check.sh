@@ -14,9 +14,9 @@ case $preset in
   *) groups=(tests) ;;
 esac
 jobs=$(nproc)
-test_jobs=$jobs
+# Most tests wait most of the time. Without scenes, none needs much of the machine.
+test_jobs=$((jobs * 2))
 if [[ $preset == armhf ]]; then
-  # Most of these tests wait most of the time, and there are no scenes that need the machine.
   test_jobs=$((jobs * 4))
 fi
 log=build/$preset/ctest.log
