@@ -99,6 +99,7 @@ protected:
         plugin.finalize(&slot);
         slot = nullptr;
         EXPECT_FALSE(hasChildren());
+        waitUntil([&] { return threadCount() == threadsBefore; });
         EXPECT_EQ(threadCount(), threadsBefore);
         EXPECT_EQ(openDescriptors(), descriptorsBefore);
         EXPECT_FALSE(std::filesystem::exists("/run/ptp4lTimeRef." + std::to_string(getpid())));
@@ -108,7 +109,7 @@ protected:
 
     const std::string socket = sceneSocket();
     const pid_t grandmaster = std::atoi(sceneVariable("TESTBED_GRANDMASTER_PID").c_str());
-    const int threadsBefore = threadCount();
+    const int threadsBefore = settledThreadCount();
     RecordingHost host;
     SyslogCapture log;
     const Plugin plugin;

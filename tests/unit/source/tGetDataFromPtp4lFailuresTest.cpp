@@ -8,6 +8,7 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
 #include "support/Descriptors.h"
@@ -210,9 +211,10 @@ TEST_F(PtpFetchFailuresTest, FailureOfTheSystemsReceiveIsACommunicationsFault) {
             if (request.managementId() == managementId) {
                 const int descriptor = descriptorBoundTo(localPath);
                 const tFileDescriptor noSocket(open("/dev/null", O_RDONLY));
-                // Its copy takes the answer, which ends a wait that has begun.
-                socket = tFileDescriptor(dup(descriptor));
-                EXPECT_EQ(dup2(noSocket.get(), descriptor), descriptor);
+                // Its copy takes the answer, which ends a wait that has begun. By system calls:
+                // ThreadSanitizer would take the functions for a race with the fetch.
+                socket = tFileDescriptor(static_cast<int>(syscall(SYS_dup, descriptor)));
+                EXPECT_EQ(syscall(SYS_dup3, noSocket.get(), descriptor, 0), descriptor);
             }
         });
         EXPECT_EQ(fetch(), -52024) << managementId;
