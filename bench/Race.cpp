@@ -7,12 +7,12 @@
 namespace {
 
 void runRound(const Contestant& contestant, Costs& costs) {
-    const double cpu = contestant.client->cpuSeconds();
+    const double cpu = contestant.client.cpuSeconds();
     const double wall = secondsOf(CLOCK_MONOTONIC);
     for (int poll = 0; poll < contestant.polls; ++poll) {
-        contestant.client->poll();
+        contestant.client.poll();
     }
-    costs.cpu.push_back((contestant.client->cpuSeconds() - cpu) / contestant.polls);
+    costs.cpu.push_back((contestant.client.cpuSeconds() - cpu) / contestant.polls);
     costs.wall.push_back((secondsOf(CLOCK_MONOTONIC) - wall) / contestant.polls);
 }
 

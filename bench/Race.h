@@ -1,14 +1,13 @@
 /// @file
 #pragma once
 
-#include <memory>
 #include <vector>
 
 #include "Client.h"
 
 /// A client, and how many polls a round of it has.
 struct Contestant {
-    std::unique_ptr<Client> client;
+    Client& client;
     int polls;
 };
 

@@ -20,46 +20,47 @@ namespace {
 struct Options {
     std::string daemon = "stub";
     std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
-    int rounds = 9;
-    int answers = 8000; ///< in one round
+    int rounds = 101;
+    int answers = 1000; ///< in one round
 
     int polls(std::uint16_t portCount) const { return std::max(1, answers / (3 + 3 * portCount)); }
 };
 
-/// The limits of the fetch's CPU time beside that of the others, in their order. Beside the bare
-/// client it needs a daemon on the same processor.
-std::vector<std::optional<double>> limitsOf(const Options& options, std::uint16_t ports) {
-    return {std::nullopt, options.daemon == "stub" ? std::optional(1.10) : std::nullopt, 0.75,
-            ports == 1 ? std::optional(0.05) : std::nullopt};
-}
+/// What the fetch is compared with.
+struct Rival {
+    Client& client;
+    int polls;
+    std::optional<double> limit; ///< of the ratio of CPU times
+};
 
-std::vector<Contestant> makeContestants(const Options& options, const std::string& socket,
-                                        std::uint16_t ports) {
-    const int polls = options.polls(ports);
-    std::vector<Contestant> contestants;
-    contestants.push_back({std::make_unique<FetchClient>(socket), polls});
-    contestants.push_back({std::make_unique<BareClient>(socket, ports), polls});
-    contestants.push_back({std::make_unique<OpenPmc>(socket, ports), std::max(1, polls / 8)});
-    contestants.push_back({std::make_unique<PmcPerPoll>(socket, ports), std::min(3, polls)});
-    return contestants;
-}
-
+/// Each rival races the fetch alone: what a sleeping pmc does to the processor's caches and clock
+/// would otherwise be in the ratio of the other two.
 void compare(const Options& options, std::uint16_t ports) {
     const TemporaryFolder folder;
     const auto daemon = Daemon::make(options.daemon, ports);
-    const auto contestants = makeContestants(options, daemon->socket(), ports);
-    const auto costs = race(contestants, options.rounds);
-    const auto limits = limitsOf(options, ports);
+    const int polls = options.polls(ports);
+    FetchClient fetch(daemon->socket());
+    BareClient bareClient(daemon->socket(), ports);
+    OpenPmc openPmc(daemon->socket(), ports);
+    PmcPerPoll pmcPerPoll(daemon->socket(), ports);
+    // Beside the bare client, the limit needs a daemon on the same processor.
+    const Rival rivals[] = {
+        {bareClient, polls, options.daemon == "stub" ? std::optional(1.10) : std::nullopt},
+        {openPmc, std::max(1, polls / 8), 0.75},
+        {pmcPerPoll, 1, ports == 1 ? std::optional(0.05) : std::nullopt},
+    };
+    std::vector<std::vector<Costs>> races;
+    for (const Rival& rival : rivals) {
+        races.push_back(race({{fetch, polls}, {rival.client, rival.polls}}, options.rounds));
+    }
     for (const auto& [kind, values] : {std::pair("CPU", &Costs::cpu), {"wall", &Costs::wall}}) {
-        for (std::size_t i = 0; i < contestants.size(); ++i) {
-            Row row{std::string(kind) + " per poll, " + options.daemon + ": " +
-                        contestants[i].client->name(),
-                    std::to_string(ports), median(costs[i].*values) * 1e6, "us"};
-            if (i > 0) {
-                row.ratio = medianRatio(costs[0].*values, costs[i].*values);
-                row.limit = values == &Costs::cpu ? limits[i] : std::nullopt;
-            }
-            print(row);
+        const std::string figure = std::string(kind) + " per poll, " + options.daemon + ": ";
+        const std::string portText = std::to_string(ports);
+        print({figure + fetch.name(), portText, median(races[0][0].*values) * 1e6, "us"});
+        for (std::size_t i = 0; i < races.size(); ++i) {
+            print({figure + rivals[i].client.name(), portText, median(races[i][1].*values) * 1e6,
+                   "us", medianRatio(races[i][0].*values, races[i][1].*values),
+                   values == &Costs::cpu ? rivals[i].limit : std::nullopt});
         }
     }
 }
