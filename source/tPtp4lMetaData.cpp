@@ -13,14 +13,14 @@ namespace {
 
 /// clockAccuracy from 0x20 on, IEEE 1588-2008 table 6.
 constexpr std::uint8_t firstAccuracy = 0x20;
-constexpr std::array<const char*, 18> accuracyNames = {
+constexpr std::array<std::string_view, 18> accuracyNames = {
     "WITHIN_25NS", "WITHIN_100NS", "WITHIN_250NS", "WITHIN_1US", "WITHIN_2.5US", "WITHIN_10US",
     "WITHIN_25US", "WITHIN_100US", "WITHIN_250US", "WITHIN_1MS", "WITHIN_2.5MS", "WITHIN_10MS",
     "WITHIN_25MS", "WITHIN_100MS", "WITHIN_250MS", "WITHIN_1S",  "WITHIN_10S",   "GREATER_THAN_10S",
 };
 
 /// portState, linuxptp `enum port_state`.
-constexpr std::array<const char*, 11> portStateNames = {
+constexpr std::array<std::string_view, 11> portStateNames = {
     "",
     "PTP_INITIALIZING",
     "PTP_FAULTY",
@@ -34,27 +34,25 @@ constexpr std::array<const char*, 11> portStateNames = {
     "PTP_GRAND_MASTER",
 };
 
-const char* accuracyName(std::uint8_t clockAccuracy) {
+std::string_view accuracyName(std::uint8_t clockAccuracy) {
     const unsigned index = unsigned{clockAccuracy} - firstAccuracy;
     return index < accuracyNames.size() ? accuracyNames[index] : "ACCURACY_UNKNOWN";
 }
 
-const char* portStateName(std::uint8_t portState) {
+std::string_view portStateName(std::uint8_t portState) {
     return portState < portStateNames.size() ? portStateNames[portState] : "";
 }
 
 std::string octetText(const tPtpClockIdentity& identity,
                       std::initializer_list<std::size_t> chosen) {
     constexpr char digits[] = "0123456789ABCDEF";
-    std::string text;
-    text.reserve(chosen.size() * 3);
+    std::string text(chosen.size() * 3 - 1, ':');
+    auto place = text.begin();
     for (const std::size_t index : chosen) {
         const std::uint8_t octet = identity.octets()[index];
-        if (!text.empty()) {
-            text += ':';
-        }
-        text += digits[octet >> 4];
-        text += digits[octet & 0x0f];
+        place[0] = digits[octet >> 4];
+        place[1] = digits[octet & 0x0f];
+        place += 3;
     }
     return text;
 }
@@ -72,15 +70,17 @@ std::string macText(const tPtpClockIdentity& identity) {
 /// A JSON object under construction.
 class tJsonObject {
 public:
-    void add(const char* key, const std::string& value) {
+    void add(std::string_view key, std::string_view value) {
         addRaw(key, '"' + zeerr::escaped(value) + '"');
     }
 
-    void add(const char* key, std::int64_t value) { addRaw(key, std::to_string(value)); }
+    void add(std::string_view key, std::int64_t value) { addRaw(key, std::to_string(value)); }
 
-    void addRaw(const std::string& key, const std::string& value) {
-        text_ += text_.empty() ? '{' : ',';
-        text_ += '"' + key + "\":" + value;
+    void addRaw(std::string_view key, std::string_view value) {
+        text_ += text_.empty() ? "{\"" : ",\"";
+        text_ += key;
+        text_ += "\":";
+        text_ += value;
     }
 
     std::string finish() && {

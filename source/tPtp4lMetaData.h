@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <map>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "errors/Status.h"
@@ -15,10 +16,10 @@
 
 namespace zekelVantel {
 
-/// What the host is told about one port.
+/// What the host is told about one port. The views are of names that the program holds for good.
 struct tPortMetaData {
-    std::string portState = "PTP_DISABLED"; ///< linuxptp's name of IEEE 1588-2008 table 8
-    std::string asCapable = "false";        ///< "true" or "false"
+    std::string_view portState = "PTP_DISABLED"; ///< linuxptp's name of IEEE 1588-2008 table 8
+    std::string_view asCapable = "false";        ///< "true" or "false"
     std::int8_t logAnnounceInterval = 0;
     std::int8_t logSyncInterval = 0;
     std::int8_t logPdelayInterval = 0;
@@ -59,13 +60,13 @@ private:
     std::string gmClockId_ = "00:00:00:00:00:00:00:00";
     std::string gmMacAddress_ = "00:00:00:00:00:00";
     std::uint8_t gmClockClass_ = 0;
-    std::string gmClockAccuracy_ = "ACCURACY_UNKNOWN";
+    std::string_view gmClockAccuracy_ = "ACCURACY_UNKNOWN";
     std::uint16_t gmOffsetLogVariance_ = 0;
     std::uint8_t gmPriority1_ = 0;
     std::uint8_t gmPriority2_ = 0;
     std::string localClockId_ = "00:00:00:00:00:00:00:00";
     std::uint8_t clockClass_ = 0;
-    std::string clockAccuracy_ = "ACCURACY_UNKNOWN";
+    std::string_view clockAccuracy_ = "ACCURACY_UNKNOWN";
     std::uint16_t offsetLogVariance_ = 0;
     std::uint8_t priority1_ = 0;
     std::uint8_t priority2_ = 0;
