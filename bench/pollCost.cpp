@@ -43,9 +43,8 @@ void compare(const Options& options, std::uint16_t ports) {
     BareClient bareClient(daemon->socket(), ports);
     OpenPmc openPmc(daemon->socket(), ports);
     PmcPerPoll pmcPerPoll(daemon->socket(), ports);
-    // Beside the bare client, the limit needs a daemon on the same processor.
     const Rival rivals[] = {
-        {bareClient, polls, options.daemon == "stub" ? std::optional(1.10) : std::nullopt},
+        {bareClient, polls, 1.10},
         {openPmc, std::max(1, polls / 8), 0.75},
         {pmcPerPoll, 1, ports == 1 ? std::optional(0.05) : std::nullopt},
     };
@@ -57,10 +56,12 @@ void compare(const Options& options, std::uint16_t ports) {
         const std::string figure = std::string(kind) + " per poll, " + options.daemon + ": ";
         const std::string portText = std::to_string(ports);
         print({figure + fetch.name(), portText, median(races[0][0].*values) * 1e6, "us"});
+        // The limits are for one processor: on several, being woken costs more than the work.
+        const bool isJudged = options.daemon == "stub" && values == &Costs::cpu;
         for (std::size_t i = 0; i < races.size(); ++i) {
             print({figure + rivals[i].client.name(), portText, median(races[i][1].*values) * 1e6,
                    "us", medianRatio(races[i][0].*values, races[i][1].*values),
-                   values == &Costs::cpu ? rivals[i].limit : std::nullopt});
+                   isJudged ? rivals[i].limit : std::nullopt});
         }
     }
 }
