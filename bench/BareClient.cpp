@@ -6,7 +6,6 @@
 #include <sys/socket.h>
 #include <sys/un.h>
 
-#include "Clocks.h"
 #include "tPtp4lDefaultDataSetMgmtTlv.h"
 #include "tPtp4lParentDataSetMgmtTlv.h"
 #include "tPtp4lPortDataSetMgmtTlv.h"
@@ -73,8 +72,4 @@ void BareClient::receive() const {
     socklen_t length = sizeof(source);
     check(recvfrom(socket_.descriptor(), octets, sizeof(octets), 0,
                    reinterpret_cast<sockaddr*>(&source), &length) > 0);
-}
-
-double BareClient::cpuSeconds() const {
-    return secondsOf(CLOCK_THREAD_CPUTIME_ID);
 }

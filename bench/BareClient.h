@@ -8,14 +8,13 @@
 #include "support/DatagramSocket.h"
 #include "tUdsMsgAddress.h"
 
-/// Makes the system calls of a fetch and nothing else: sends the octets that the fetch sends, and
-/// throws away what comes.
+/// Makes the system calls of a fetch and nothing else: sends as many octets as the fetch sends,
+/// and throws away what comes.
 class BareClient : public Client {
 public:
     BareClient(const std::string& daemon, std::uint16_t ports);
 
     void poll() override;
-    double cpuSeconds() const override;
 
 private:
     struct Request {

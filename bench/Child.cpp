@@ -67,7 +67,7 @@ void Child::write(const std::string& input) const {
 
 std::string Child::read() const {
     pollfd descriptor{output_, POLLIN, 0};
-    if (::poll(&descriptor, 1, 10000) != 1) {
+    if (::poll(&descriptor, 1, 60000) != 1) {
         throw std::runtime_error("the child is silent");
     }
     std::array<char, 65536> buffer;

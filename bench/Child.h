@@ -17,7 +17,7 @@ public:
 
     void write(const std::string& input) const;
 
-    /// Waits for some standard output, at most 10 s. @return "" at its end. Throws when none came.
+    /// Waits for some standard output, at most 60 s. @return "" at its end. Throws when none came.
     std::string read() const;
 
     /// CPU time of the program while it runs, in seconds.

@@ -2,8 +2,6 @@
 
 #include <stdexcept>
 
-#include "Clocks.h"
-
 // Some daemons let the first poll run into a time-out, on purpose: see pad-octet in
 // docs/oddities.md.
 FetchClient::FetchClient(const std::string& daemon) : Client("fetch"), fetcher_(daemon, 0) {
@@ -22,8 +20,4 @@ void FetchClient::poll() {
     if (!succeeds()) {
         throw std::runtime_error("the fetch failed");
     }
-}
-
-double FetchClient::cpuSeconds() const {
-    return secondsOf(CLOCK_THREAD_CPUTIME_ID);
 }

@@ -11,7 +11,6 @@ public:
     explicit FetchClient(const std::string& daemon);
 
     void poll() override;
-    double cpuSeconds() const override;
 
 private:
     bool succeeds();

@@ -1,11 +1,14 @@
 #include "PmcClients.h"
 
+#include <algorithm>
 #include <array>
 #include <stdexcept>
 
-const char pmcProgram[] = "/usr/sbin/pmc";
+#include <unistd.h>
 
 namespace {
+
+constexpr char pmcProgram[] = "/usr/sbin/pmc";
 
 struct Command {
     const char* text;
@@ -19,34 +22,37 @@ constexpr std::array<Command, 6> commands{{{"GET TIME_STATUS_NP", false},
                                            {"GET PORT_DATA_SET_NP", true},
                                            {"GET PORT_PROPERTIES_NP", true}}};
 
-std::vector<std::string> commandLine(const std::string& daemon) {
-    return {pmcProgram, "-u", "-b", "0", "-s", daemon};
-}
-
-int count(const std::string& text, const std::string& part) {
-    int found = 0;
-    for (auto at = text.find(part); at != std::string::npos; at = text.find(part, at + 1)) {
-        ++found;
+/// @param own pmc's own socket: where it makes one by default, only root may.
+std::vector<std::string> commandLine(const std::string& daemon, const std::string& own) {
+    if (access(pmcProgram, X_OK) != 0) {
+        throw std::runtime_error("there is no " + std::string(pmcProgram) + " (package linuxptp)");
     }
-    return found;
+    return {pmcProgram, "-u", "-b", "0", "-i", own, "-s", daemon};
 }
 
-/// Reads until that many answers are printed, or until the end.
+/// Reads until that many answers are printed.
 void readAnswers(const Child& child, int expected) {
-    std::string output;
-    while (count(output, " RESPONSE MANAGEMENT ") < expected) {
-        const std::string piece = child.read();
-        if (piece.empty()) {
-            throw std::runtime_error("an answer is missing in what pmc prints");
+    const std::string mark = " RESPONSE MANAGEMENT ";
+    std::string unread;
+    for (int answer = 0; answer < expected; ++answer) {
+        auto place = unread.find(mark);
+        while (place == std::string::npos) {
+            const std::string piece = child.read();
+            if (piece.empty()) {
+                throw std::runtime_error("an answer is missing in what pmc prints");
+            }
+            unread.erase(0, unread.size() - std::min(unread.size(), mark.size()));
+            unread += piece;
+            place = unread.find(mark);
         }
-        output += piece;
+        unread.erase(0, place + mark.size());
     }
 }
 
 } // namespace
 
 OpenPmc::OpenPmc(const std::string& daemon, std::uint16_t ports)
-    : Client("pmc kept open"), child_(commandLine(daemon)), ports_(ports) {}
+    : Client("pmc kept open"), child_(commandLine(daemon, "pmc-open.sock")), ports_(ports) {}
 
 void OpenPmc::poll() {
     for (const Command& command : commands) {
@@ -59,7 +65,7 @@ PmcPerPoll::PmcPerPoll(const std::string& daemon, std::uint16_t ports)
     : Client("pmc per poll"), daemon_(daemon), ports_(ports) {}
 
 void PmcPerPoll::poll() {
-    auto arguments = commandLine(daemon_);
+    auto arguments = commandLine(daemon_, "pmc-per-poll.sock");
     for (const Command& command : commands) {
         arguments.emplace_back(command.text);
     }

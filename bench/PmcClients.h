@@ -7,8 +7,6 @@
 #include "Child.h"
 #include "Client.h"
 
-extern const char pmcProgram[];
-
 /// One process of pmc for all polls. It gets the next command when all answers to the one before
 /// are printed.
 class OpenPmc : public Client {

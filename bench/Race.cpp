@@ -1,5 +1,7 @@
 #include "Race.h"
 
+#include <stdexcept>
+
 #include <sched.h>
 
 #include "Clocks.h"
@@ -36,6 +38,8 @@ std::vector<Costs> race(const std::vector<Contestant>& contestants, int rounds) 
 void useOneProcessor() {
     cpu_set_t one;
     CPU_ZERO(&one);
-    CPU_SET(0, &one);
-    sched_setaffinity(0, sizeof(one), &one);
+    CPU_SET(static_cast<unsigned>(sched_getcpu()), &one);
+    if (sched_setaffinity(0, sizeof(one), &one) != 0) {
+        throw std::runtime_error("the process cannot be kept on one processor");
+    }
 }

@@ -22,6 +22,6 @@ struct Costs {
 /// @return the costs in the order of the contestants.
 std::vector<Costs> race(const std::vector<Contestant>& contestants, int rounds);
 
-/// Keeps this process on one processor: then nobody waits to be woken on another one, and the
-/// figures are the work alone.
+/// Keeps this process, and those that it starts from now on, on one processor: then nobody waits to
+/// be woken on another one, and the figures are the work alone. Throws when that is not possible.
 void useOneProcessor();

@@ -1,5 +1,7 @@
 #include "WakeUpBound.h"
 
+#include <cmath>
+
 #include "sleepLength.h"
 
 namespace {
@@ -10,8 +12,10 @@ constexpr int passesUntilSettled = 1000;
 
 } // namespace
 
-Delays bestDelays(std::uint64_t interval) {
+Delays bestDelays(double intervalSeconds) {
+    const auto interval = static_cast<std::uint64_t>(std::llround(intervalSeconds * 1e9));
     Delays delays;
+    delays.interval = intervalSeconds;
     std::uint64_t now = interval + interval / 3;
     std::uint64_t seen = 0;
     std::uint64_t first = 0;

@@ -8,9 +8,10 @@
 struct Delays {
     std::vector<double> seconds; ///< from a measurement to its pair
     double pairsPerSync = 0;
+    double interval = 0; ///< between two Syncs, in seconds
 };
 
-/// What the plug-in's choice of its sleeps allows at best: with polls that take a microsecond, a
-/// system that wakes it on time, and Syncs that come exactly on time.
-/// @param interval between two Syncs, in nanoseconds.
-Delays bestDelays(std::uint64_t interval);
+/// What the plug-in's choice of its sleeps settles at when nothing disturbs it: with polls that
+/// take a microsecond, a system that wakes it on time, and Syncs that come exactly on time.
+/// @param interval between two Syncs, in seconds.
+Delays bestDelays(double interval);

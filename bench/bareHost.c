@@ -125,6 +125,10 @@ static struct memory memory_with_session(void* library, const char* configuratio
     end(&slot);
     *(void**)&end = find(library, "zekeltr_finalize");
     end(&slot);
+    if (pairs < PAIRS) {
+        fprintf(stderr, "bare_host: the pairs do not come\n");
+        exit(1);
+    }
     return memory;
 }
 

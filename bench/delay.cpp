@@ -6,15 +6,14 @@
 #include <chrono>
 #include <cmath>
 #include <condition_variable>
-#include <exception>
-#include <iostream>
 #include <mutex>
+#include <stdexcept>
 #include <thread>
 
-#include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
 #include "Host.h"
+#include "Program.h"
 #include "Row.h"
 #include "Session.h"
 #include "Statistics.h"
@@ -43,21 +42,22 @@ public:
         }
     }
 
-    /// Of all but the first pairs.
-    Delays delays(double interval) const {
+    /// Of all but the first pairs. Syncs are counted by the gaps between those that became pairs: a
+    /// daemon's interval is not exactly the nominal one.
+    Delays delays(double nominalInterval) const {
         const std::lock_guard<std::mutex> lock(mutex_);
         if (pairs_.size() < firstPairs + 2) {
             throw std::runtime_error("there are too few pairs");
         }
         Delays result;
+        double syncs = 0;
         for (auto pair = pairs_.begin() + firstPairs + 1; pair != pairs_.end(); ++pair) {
-            result.seconds.push_back(
-                static_cast<double>(static_cast<std::int64_t>(pair->time - pair->ingress)) * 1e-9);
+            result.seconds.push_back(secondsBetween(pair->ingress, pair->time));
+            syncs += std::round(secondsBetween(std::prev(pair)->ingress, pair->ingress) /
+                                nominalInterval);
         }
-        const double length =
-            static_cast<double>(pairs_.back().ingress - pairs_[firstPairs].ingress) * 1e-9;
-        result.pairsPerSync =
-            static_cast<double>(result.seconds.size()) / std::round(length / interval);
+        result.pairsPerSync = static_cast<double>(result.seconds.size()) / syncs;
+        result.interval = secondsBetween(pairs_[firstPairs].ingress, pairs_.back().ingress) / syncs;
         return result;
     }
 
@@ -66,6 +66,10 @@ private:
         std::uint64_t ingress;
         std::uint64_t time;
     };
+
+    static double secondsBetween(std::uint64_t from, std::uint64_t to) {
+        return static_cast<double>(static_cast<std::int64_t>(to - from)) * 1e-9;
+    }
 
     static constexpr std::size_t firstPairs = 5;
 
@@ -84,46 +88,44 @@ Delays measure(const std::string& configuration, double interval, int seconds) {
     return host.delays(interval);
 }
 
-void printRows(const std::string& what, const Delays& measured, const Delays& best) {
+void printRows(const std::string& what, const Delays& measured) {
+    const Delays best = bestDelays(measured.interval);
     for (const auto& [name, share] :
          {std::pair("5 %", 0.05), {"50 %", 0.5}, {"95 %", 0.95}, {"99 %", 0.99}, {"all", 1.0}}) {
-        const double bound = quantile(best.seconds, share) * 1e3;
-        const double value = quantile(measured.seconds, share) * 1e3;
-        print({fmt::format("delay of {} of the pairs, {}", name, what), "", value, "ms"});
-        print({fmt::format("delay of {} of the pairs, {}: at best", name, what), "", bound, "ms",
-               value / bound});
+        // Of fewer, the one share is the next one.
+        if (share == 1 || (1 - share) * static_cast<double>(measured.seconds.size()) >= 1) {
+            print({fmt::format("delay of {} of the pairs, {}", name, what), "",
+                   quantile(measured.seconds, share) * 1e3, "ms"});
+        }
     }
+    print({"delay at best, " + what, "", median(best.seconds) * 1e3, "ms",
+           median(measured.seconds) / median(best.seconds)});
     print({"Syncs that become pairs, " + what, "", measured.pairsPerSync * 100, "%"});
-    print({"Syncs that become pairs, " + what + ": at best", "", best.pairsPerSync * 100, "%",
+    print({"Syncs that become pairs at best, " + what, "", best.pairsPerSync * 100, "%",
            measured.pairsPerSync / best.pairsPerSync});
+}
+
+void measureAll(const std::string& daemon, const std::vector<std::uint16_t>& rates, int seconds) {
+    const TemporaryFolder folder;
+    for (const std::uint16_t rate : rates) {
+        const double interval = 1.0 / rate;
+        const std::string configuration =
+            daemon == "ptp4l" ? useRealDaemon()
+                              : useSimulator(fmt::format("sync-interval {}\n", interval));
+        printRows(fmt::format("{} Syncs/s, {}", rate, daemon),
+                  measure(configuration, interval, seconds));
+    }
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
     std::string daemon = "simptp4l";
-    std::vector<int> rates = {1, 8, 16};
+    std::vector<std::uint16_t> rates = {1, 8, 16};
     int seconds = 60;
-    CLI::App app("Prints how late time pairs are, and how many Syncs become one.");
-    app.add_option("--daemon", daemon, "who measures; ptp4l: at the rate of the scene")
-        ->check(CLI::IsMember({"simptp4l", "ptp4l"}));
-    app.add_option("--rates", rates, "Syncs a second")->delimiter(',');
-    app.add_option("--seconds", seconds, "for each rate");
-    CLI11_PARSE(app, argc, argv);
-    try {
-        const TemporaryFolder folder;
-        for (const int rate : rates) {
-            const double interval = 1.0 / rate;
-            const std::string configuration =
-                daemon == "ptp4l" ? useRealDaemon()
-                                  : useSimulator(fmt::format("sync-interval {}\n", interval));
-            printRows(fmt::format("{} Syncs/s, {}", rate, daemon),
-                      measure(configuration, interval, seconds),
-                      bestDelays(static_cast<std::uint64_t>(1e9 * interval)));
-        }
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "delay: " << error.what() << '\n';
-        return 1;
-    }
+    Program program("Prints how late time pairs are, and how many Syncs become one.");
+    program.option("--daemon", daemon, {"simptp4l", "ptp4l"}, "who measures");
+    program.option("--rates", rates, "Syncs a second; with ptp4l, that of the scene");
+    program.option("--seconds", seconds, "for each rate");
+    return program.run(argc, argv, [&] { measureAll(daemon, rates, seconds); });
 }

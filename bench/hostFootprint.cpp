@@ -1,14 +1,11 @@
 // What a host that has nothing but the plug-in pays for it: time to load, and memory. A fresh
 // process each time; once a host in C++, which has its libraries already, once one in C.
 
-#include <exception>
-#include <iostream>
 #include <sstream>
 #include <stdexcept>
 
-#include <CLI/CLI.hpp>
-
 #include "Child.h"
+#include "Program.h"
 #include "Row.h"
 #include "Session.h"
 #include "Statistics.h"
@@ -35,37 +32,34 @@ struct Footprints {
         writtenKib.push_back(written);
     }
 
-    void print(const std::string& host, std::optional<double> limit) const {
+    void print(const std::string& host) const {
         ::print({"library load, " + host, "", median(loadNanoseconds) * 1e-3, "us"});
         ::print({"memory added besides thread stacks, " + host + ": resident", "",
-                 median(residentKib), "KiB", std::nullopt, limit});
+                 median(residentKib), "KiB", std::nullopt, 512});
         ::print({"memory added besides thread stacks, " + host + ": private, written to", "",
-                 median(writtenKib), "KiB", std::nullopt, 512});
+                 median(writtenKib), "KiB"});
     }
 };
+
+void measure(int rounds) {
+    const TemporaryFolder folder;
+    const EpochFifo fifo;
+    const std::string configuration = useSimulator("sync-interval 0.125\n");
+    Footprints bare;
+    Footprints withCxx;
+    for (int round = 0; round < rounds; ++round) {
+        bare.add(VANTEL_BARE_HOST, configuration);
+        withCxx.add(VANTEL_BARE_CXX_HOST, configuration);
+    }
+    withCxx.print("host in C++");
+    bare.print("host in C");
+}
 
 } // namespace
 
 int main(int argc, char** argv) {
     int rounds = 9;
-    CLI::App app("Prints what a host pays for the plug-in in load time and memory.");
-    app.add_option("--rounds", rounds, "fresh processes");
-    CLI11_PARSE(app, argc, argv);
-    try {
-        const TemporaryFolder folder;
-        const EpochFifo fifo;
-        const std::string configuration = useSimulator("sync-interval 0.125\n");
-        Footprints bare;
-        Footprints withCxx;
-        for (int round = 0; round < rounds; ++round) {
-            bare.add(VANTEL_BARE_HOST, configuration);
-            withCxx.add(VANTEL_BARE_CXX_HOST, configuration);
-        }
-        withCxx.print("host in C++", 512);
-        bare.print("host in C", std::nullopt);
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "host_footprint: " << error.what() << '\n';
-        return 1;
-    }
+    Program program("Prints what a host pays for the plug-in in load time and memory.");
+    program.option("--rounds", rounds, "fresh processes");
+    return program.run(argc, argv, [&] { measure(rounds); });
 }

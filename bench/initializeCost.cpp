@@ -1,14 +1,14 @@
 // What zekeltr_initialize costs beside one parse of the same text, in turns.
 
 #include <array>
-#include <exception>
-#include <iostream>
+#include <cstdlib>
+#include <stdexcept>
 
-#include <CLI/CLI.hpp>
 #include <cjson/cJSON.h>
 #include <vantel_bc/zekeltr.h>
 
 #include "Clocks.h"
+#include "Program.h"
 #include "Row.h"
 #include "Session.h"
 #include "Statistics.h"
@@ -56,34 +56,32 @@ std::string withFile(std::string text, const std::string& file) {
     return text.replace(text.find(usual), usual.size(), file);
 }
 
+void compare(int rounds) {
+    setenv("TMPDIR", "/dev/shm", 1); // a tmpfs, as /var/run is
+    const TemporaryFolder folder;
+    const std::string text = withFile(useSimulator(""), folder.path("ptp4l.conf"));
+    const std::string noFile = withFile(useSimulator(""), folder.path("missing/ptp4l.conf"));
+    std::vector<double> initialize;
+    std::vector<double> withoutFile;
+    std::vector<double> parse;
+    secondsOfInitialize(text); // the first calls do not count
+    for (int round = 0; round < rounds; ++round) {
+        initialize.push_back(secondsOfInitialize(text));
+        withoutFile.push_back(secondsOfInitialize(noFile));
+        parse.push_back(secondsOfParse(text));
+    }
+    print({"CPU: cJSON_Parse of a configuration", "", median(parse) * 1e6, "us"});
+    print({"CPU: zekeltr_initialize, with its file on a tmpfs", "", median(initialize) * 1e6, "us",
+           medianRatio(initialize, parse), 20});
+    print({"CPU: zekeltr_initialize, with a file that cannot be written", "",
+           median(withoutFile) * 1e6, "us", medianRatio(withoutFile, parse), 20});
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
     int rounds = 25;
-    CLI::App app("Prints what zekeltr_initialize costs beside one parse of its text.");
-    app.add_option("--rounds", rounds, "turns of each");
-    CLI11_PARSE(app, argc, argv);
-    try {
-        setenv("TMPDIR", "/dev/shm", 1); // a tmpfs, as /var/run is
-        const TemporaryFolder folder;
-        const std::string text = withFile(useSimulator(""), folder.path("ptp4l.conf"));
-        const std::string noFile = withFile(useSimulator(""), folder.path("missing/ptp4l.conf"));
-        std::vector<double> initialize;
-        std::vector<double> withoutFile;
-        std::vector<double> parse;
-        for (int round = 0; round < rounds; ++round) {
-            initialize.push_back(secondsOfInitialize(text));
-            withoutFile.push_back(secondsOfInitialize(noFile));
-            parse.push_back(secondsOfParse(text));
-        }
-        print({"CPU: cJSON_Parse of a configuration", "", median(parse) * 1e6, "us"});
-        print({"CPU: zekeltr_initialize, with its file on a tmpfs", "", median(initialize) * 1e6,
-               "us", medianRatio(initialize, parse), 20});
-        print({"CPU: zekeltr_initialize, with a file that cannot be written", "",
-               median(withoutFile) * 1e6, "us", medianRatio(withoutFile, parse), 20});
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "initialize_cost: " << error.what() << '\n';
-        return 1;
-    }
+    Program program("Prints what zekeltr_initialize costs beside one parse of its text.");
+    program.option("--rounds", rounds, "turns of each");
+    return program.run(argc, argv, [&] { compare(rounds); });
 }

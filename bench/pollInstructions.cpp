@@ -2,14 +2,12 @@
 // program again with --run.
 
 #include <cstdlib>
-#include <exception>
-#include <iostream>
-
-#include <CLI/CLI.hpp>
+#include <stdexcept>
 
 #include "Child.h"
 #include "Daemons.h"
 #include "FetchClient.h"
+#include "Program.h"
 #include "Row.h"
 #include "Statistics.h"
 #include "support/TemporaryFolder.h"
@@ -40,10 +38,13 @@ double countInstructions(const std::string& self, std::uint16_t ports, int polls
     callgrind.waitForEnd();
     const std::string label = "Collected : ";
     const auto position = output.find(label);
-    if (position == std::string::npos) {
+    const double count = position == std::string::npos
+                             ? 0
+                             : std::strtod(output.c_str() + position + label.size(), nullptr);
+    if (count <= 0) {
         throw std::runtime_error("valgrind counts nothing:\n" + output);
     }
-    return std::strtod(output.c_str() + position + label.size(), nullptr);
+    return count;
 }
 
 /// The first poll, which also opens the socket, does not count.
@@ -72,20 +73,15 @@ int main(int argc, char** argv) {
     std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
     int polls = 1;
     bool isInside = false;
-    CLI::App app("Prints how many instructions a poll takes, counted by callgrind.");
-    app.add_option("--ports", ports, "numbers of ports")->delimiter(',');
-    app.add_option("--polls", polls, "with --run: how many");
-    app.add_flag("--run", isInside, "only poll, to be counted");
-    CLI11_PARSE(app, argc, argv);
-    try {
+    Program program("Prints how many instructions a poll takes, counted by callgrind.");
+    program.option("--ports", ports, "numbers of ports");
+    program.option("--polls", polls, "with --run: how many");
+    program.flag("--run", isInside, "only poll, to be counted");
+    return program.run(argc, argv, [&] {
         if (isInside) {
             runPolls(ports.at(0), polls);
         } else {
             printAll(argv[0], ports);
         }
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "poll_instructions: " << error.what() << '\n';
-        return 1;
-    }
+    });
 }

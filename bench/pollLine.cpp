@@ -1,13 +1,11 @@
 // Whether the cost of a poll grows in a straight line with the ports.
 
-#include <exception>
-#include <iostream>
-
-#include <CLI/CLI.hpp>
+#include <algorithm>
 
 #include "BareClient.h"
 #include "Daemons.h"
 #include "FetchClient.h"
+#include "Program.h"
 #include "Race.h"
 #include "Row.h"
 #include "Statistics.h"
@@ -66,16 +64,11 @@ void compare(int rounds, int answers) {
 int main(int argc, char** argv) {
     int rounds = 101;
     int answers = 1000;
-    CLI::App app("Prints how far the cost of a poll is from a straight line over the ports.");
-    app.add_option("--rounds", rounds, "turns of each client");
-    app.add_option("--answers", answers, "in one round, about");
-    CLI11_PARSE(app, argc, argv);
-    try {
+    Program program("Prints how far the cost of a poll is from a straight line over the ports.");
+    program.option("--rounds", rounds, "turns of each client");
+    program.option("--answers", answers, "in one round, about");
+    return program.run(argc, argv, [&] {
         useOneProcessor();
         compare(rounds, answers);
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "poll_line: " << error.what() << '\n';
-        return 1;
-    }
+    });
 }

@@ -2,15 +2,12 @@
 // daemon, so that no clock has to be selected first.
 
 #include <chrono>
-#include <exception>
 #include <future>
-#include <iostream>
 #include <stdexcept>
-
-#include <CLI/CLI.hpp>
 
 #include "Clocks.h"
 #include "Host.h"
+#include "Program.h"
 #include "Row.h"
 #include "Session.h"
 #include "Statistics.h"
@@ -40,32 +37,29 @@ private:
     bool isPaired_ = false; ///< of the worker
 };
 
+void measure(int rounds) {
+    const TemporaryFolder folder;
+    std::vector<double> firstPair;
+    std::vector<double> stop;
+    for (int round = 0; round < rounds; ++round) {
+        WaitingHost host;
+        Session session(useSimulator("sync-interval 0.125\n"));
+        const double start = secondsOf(CLOCK_MONOTONIC);
+        session.start();
+        firstPair.push_back(host.momentOfFirstPair() - start);
+        const double beforeStop = secondsOf(CLOCK_MONOTONIC);
+        session.stop();
+        stop.push_back(secondsOf(CLOCK_MONOTONIC) - beforeStop);
+    }
+    print({"zekeltr_start to the first pair, simptp4l", "", median(firstPair) * 1e3, "ms"});
+    print({"zekeltr_stop after the first pair, simptp4l", "", median(stop) * 1e3, "ms"});
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
     int rounds = 9;
-    CLI::App app("Prints how long a host waits for a session.");
-    app.add_option("--rounds", rounds, "sessions");
-    CLI11_PARSE(app, argc, argv);
-    try {
-        const TemporaryFolder folder;
-        std::vector<double> firstPair;
-        std::vector<double> stop;
-        for (int round = 0; round < rounds; ++round) {
-            WaitingHost host;
-            Session session(useSimulator("sync-interval 0.125\n"));
-            const double start = secondsOf(CLOCK_MONOTONIC);
-            session.start();
-            firstPair.push_back(host.momentOfFirstPair() - start);
-            const double beforeStop = secondsOf(CLOCK_MONOTONIC);
-            session.stop();
-            stop.push_back(secondsOf(CLOCK_MONOTONIC) - beforeStop);
-        }
-        print({"zekeltr_start to the first pair, simptp4l", "", median(firstPair) * 1e3, "ms"});
-        print({"zekeltr_stop after the first pair, simptp4l", "", median(stop) * 1e3, "ms"});
-        return 0;
-    } catch (const std::exception& error) {
-        std::cerr << "session_times: " << error.what() << '\n';
-        return 1;
-    }
+    Program program("Prints how long a host waits for a session.");
+    program.option("--rounds", rounds, "sessions");
+    return program.run(argc, argv, [&] { measure(rounds); });
 }

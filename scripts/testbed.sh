@@ -11,6 +11,7 @@ usage: scripts/testbed.sh [OPTION]... -- COMMAND [ARGUMENT]...
 
   --ports P          interfaces bc0 to bc(P-1) for the command (default 1)
   --no-grandmaster   nobody at the other end of bc0
+  --log-sync L       logSyncInterval of the grandmaster (default -3: 8 Syncs a second)
   --plugin-paths     /usr/bin/ptp4l is linuxptp's ptp4l with software time stamping, and new
                      files in /tmp itself, such as the epoch FIFO, are private
   --help             this text
@@ -188,7 +189,7 @@ run_inside() {
     export TESTBED_GRANDMASTER_UDS=$grandmaster_uds
     export TESTBED_GRANDMASTER_PID=
     if ((grandmaster)); then
-        start_daemon grandmaster gm0 "priority1 10"
+        start_daemon grandmaster gm0 "priority1 10" "logSyncInterval $log_sync"
         TESTBED_GRANDMASTER_PID=$!
         wait_until_ready grandmaster "$TESTBED_GRANDMASTER_PID"
     fi
@@ -215,6 +216,7 @@ fi
 arguments=("$@")
 ports=1
 grandmaster=1
+log_sync=-3
 plugin_paths=0
 while (($# > 0)) && [[ $1 != -- ]]; do
     case $1 in
@@ -224,6 +226,11 @@ while (($# > 0)) && [[ $1 != -- ]]; do
         shift
         ;;
     --no-grandmaster) grandmaster=0 ;;
+    --log-sync)
+        [[ ${2-} =~ ^-?[0-7]$ ]] || fail "--log-sync takes a number from -7 to 7"
+        log_sync=$2
+        shift
+        ;;
     --plugin-paths) plugin_paths=1 ;;
     --help)
         usage

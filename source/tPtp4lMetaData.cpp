@@ -47,11 +47,11 @@ std::string octetText(const tPtpClockIdentity& identity,
                       std::initializer_list<std::size_t> chosen) {
     constexpr char digits[] = "0123456789ABCDEF";
     std::string text(chosen.size() * 3 - 1, ':');
-    auto place = text.begin();
+    std::size_t place = 0;
     for (const std::size_t index : chosen) {
         const std::uint8_t octet = identity.octets()[index];
-        place[0] = digits[octet >> 4];
-        place[1] = digits[octet & 0x0f];
+        text[place] = digits[octet >> 4];
+        text[place + 1] = digits[octet & 0x0f];
         place += 3;
     }
     return text;

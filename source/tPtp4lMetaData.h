@@ -16,7 +16,7 @@
 
 namespace zekelVantel {
 
-/// What the host is told about one port. The views are of names that the program holds for good.
+/// What the host is told about one port. The views are of string literals.
 struct tPortMetaData {
     std::string_view portState = "PTP_DISABLED"; ///< linuxptp's name of IEEE 1588-2008 table 8
     std::string_view asCapable = "false";        ///< "true" or "false"

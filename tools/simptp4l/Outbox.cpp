@@ -8,7 +8,7 @@
 namespace simptp4l {
 namespace {
 
-constexpr std::int64_t retryInterval = 1000000;
+constexpr std::int64_t retryInterval = 50000;
 constexpr std::int64_t patience = 500000000;
 
 } // namespace
