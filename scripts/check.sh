@@ -14,11 +14,7 @@ case $preset in
   *) groups=(tests) ;;
 esac
 jobs=$(nproc)
-# Most tests wait most of the time. Without scenes, none needs much of the machine.
-test_jobs=$((jobs * 2))
-if [[ $preset == armhf ]]; then
-  test_jobs=$((jobs * 4))
-fi
+test_jobs=$((jobs * 4)) # most tests wait most of the time
 log=build/$preset/ctest.log
 
 # Lists the tests that did not run, each with its reason: the text behind GoogleTest's
