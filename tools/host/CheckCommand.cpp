@@ -19,7 +19,7 @@ namespace vantelhost {
 
 namespace {
 
-struct Options : SettingsOptions {
+struct CheckOptions : SettingsOptions {
     Subject subject; ///< with the paths that the user named
     bool json = false;
 };
@@ -28,7 +28,7 @@ void addPath(CLI::App& command, const char* name, std::string& path, const char*
     command.add_option(name, path, description)->type_name("PATH")->capture_default_str();
 }
 
-int check(const Options& options) {
+int check(const CheckOptions& options) {
     PlugInTrial trial(options.pluginPath, userSettings(options, readConfig(options)));
     CheckResults results = trial.run();
     Subject subject = options.subject;
@@ -49,7 +49,7 @@ int check(const Options& options) {
 } // namespace
 
 std::function<int()> prepareCheck(CLI::App& command) {
-    const auto options = std::make_shared<Options>();
+    const auto options = std::make_shared<CheckOptions>();
     addSettingsOptions(command, *options);
     Subject& subject = options->subject;
     addPath(command, "--ptp4l", subject.daemon,

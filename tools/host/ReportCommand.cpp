@@ -21,7 +21,7 @@ namespace vantelhost {
 
 namespace {
 
-struct Options {
+struct ReportOptions {
     std::string recording;
     std::string page;
 };
@@ -35,7 +35,7 @@ Recording readRecording(const std::string& path) {
 }
 
 /// The page is complete before the file is touched.
-int makeReport(const Options& options) {
+int makeReport(const ReportOptions& options) {
     std::error_code ignored;
     if (std::filesystem::equivalent(options.recording, options.page, ignored)) {
         throw UsageError("the page would replace the recording " + options.recording);
@@ -53,7 +53,7 @@ int makeReport(const Options& options) {
 } // namespace
 
 std::function<int()> prepareReport(CLI::App& command) {
-    const auto options = std::make_shared<Options>();
+    const auto options = std::make_shared<ReportOptions>();
     command.add_option("recording", options->recording, "What 'run --record' has written")
         ->type_name("FILE")
         ->required();

@@ -18,7 +18,7 @@ namespace vantelhost {
 
 namespace {
 
-struct Options {
+struct SchemaOptions {
     std::string pluginPath = "libvantel_bc.so.19";
     bool raw = false;
 };
@@ -27,7 +27,7 @@ std::string shownStatus(const HostStatus& status) {
     return statusEvent("schema", status.code(), status.text()).text;
 }
 
-int showSchema(const Options& options) {
+int showSchema(const SchemaOptions& options) {
     const PlugIn plugIn(options.pluginPath);
     HostStatus status;
     const std::string text = plugIn.schema(status);
@@ -48,7 +48,7 @@ int showSchema(const Options& options) {
 } // namespace
 
 std::function<int()> prepareSchema(CLI::App& command) {
-    const auto options = std::make_shared<Options>();
+    const auto options = std::make_shared<SchemaOptions>();
     command.add_option("--library", options->pluginPath, "The plug-in")
         ->type_name("PATH")
         ->capture_default_str();
