@@ -15,7 +15,6 @@ constexpr int passesUntilSettled = 1000;
 Delays bestDelays(double intervalSeconds) {
     const auto interval = static_cast<std::uint64_t>(std::llround(intervalSeconds * 1e9));
     Delays delays;
-    delays.interval = intervalSeconds;
     std::uint64_t now = interval + interval / 3;
     std::uint64_t seen = 0;
     std::uint64_t first = 0;

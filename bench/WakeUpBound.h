@@ -8,7 +8,6 @@
 struct Delays {
     std::vector<double> seconds; ///< from a measurement to its pair
     double pairsPerSync = 0;
-    double interval = 0; ///< between two Syncs, in seconds
 };
 
 /// What the plug-in's choice of its sleeps settles at when nothing disturbs it: with polls that

@@ -57,7 +57,6 @@ public:
                                 nominalInterval);
         }
         result.pairsPerSync = static_cast<double>(result.seconds.size()) / syncs;
-        result.interval = secondsBetween(pairs_[firstPairs].ingress, pairs_.back().ingress) / syncs;
         return result;
     }
 
@@ -88,8 +87,7 @@ Delays measure(const std::string& configuration, double interval, int seconds) {
     return host.delays(interval);
 }
 
-void printRows(const std::string& what, const Delays& measured) {
-    const Delays best = bestDelays(measured.interval);
+void printRows(const std::string& what, const Delays& measured, const Delays& best) {
     for (const auto& [name, share] :
          {std::pair("5 %", 0.05), {"50 %", 0.5}, {"95 %", 0.95}, {"99 %", 0.99}, {"all", 1.0}}) {
         // Of fewer, the one share is the next one.
@@ -113,7 +111,7 @@ void measureAll(const std::string& daemon, const std::vector<std::uint16_t>& rat
             daemon == "ptp4l" ? useRealDaemon()
                               : useSimulator(fmt::format("sync-interval {}\n", interval));
         printRows(fmt::format("{} Syncs/s, {}", rate, daemon),
-                  measure(configuration, interval, seconds));
+                  measure(configuration, interval, seconds), bestDelays(interval));
     }
 }
 
