@@ -55,7 +55,6 @@ void tPtp4lTimeRef::start() {
     updateMetaData(tPtp4lMetaData());
     host_.setQuality(tQuality::unusable, waitingForStatus);
     stopRequested_ = false;
-    history_ = tHistory();
     ptp4l_.spawn(ptp4lPath_, config_.configFile, config_.interfaces);
     try {
         worker_ = std::async(std::launch::async, &tPtp4lTimeRef::runWorker, this);
@@ -99,39 +98,40 @@ void tPtp4lTimeRef::runWatchdog() {
 }
 
 void tPtp4lTimeRef::runWorker() {
+    tHistory history;
     while (!stopRequested_) {
         try {
-            runPass();
+            runPass(history);
         } catch (...) {
             logHostFailure("Unable to call into KEL in vantel, got error: ");
-            history_.sleep = longestSleep;
+            history.sleep = longestSleep;
         }
     }
 }
 
-void tPtp4lTimeRef::runPass() {
-    probeSleep(history_.sleep);
-    std::this_thread::sleep_for(std::chrono::microseconds(history_.sleep));
+void tPtp4lTimeRef::runPass(tHistory& history) {
+    probeSleep(history.sleep);
+    std::this_thread::sleep_for(std::chrono::microseconds(history.sleep));
     tTimeStatus timeStatus;
     tPtp4lMetaData metaData;
     if (const std::int32_t code = poller_->fetch(timeStatus, metaData); code != 0) {
         reportUnreachable(code);
         return;
     }
-    history_.sleep =
+    history.sleep =
         sleepLength(host_.getTime(), static_cast<std::uint64_t>(timeStatus.ingressTime));
-    if (timeStatus.gmPresent != history_.timeStatus.gmPresent) {
+    if (timeStatus.gmPresent != history.timeStatus.gmPresent) {
         host_.setQuality(timeStatus.gmPresent == 0 ? tQuality::unusable : tQuality::usable,
                          roleHasChanged);
     }
-    if (timeStatus.ingressTime != history_.timeStatus.ingressTime) {
-        reportTimePair(timeStatus);
+    if (timeStatus.ingressTime != history.timeStatus.ingressTime) {
+        reportTimePair(timeStatus, history.epochOffset);
     }
-    if (metaData != history_.metaData) {
+    if (metaData != history.metaData) {
         updateMetaData(metaData);
-        history_.metaData = std::move(metaData);
+        history.metaData = std::move(metaData);
     }
-    history_.timeStatus = timeStatus;
+    history.timeStatus = timeStatus;
 }
 
 // [oddity silent-recovery] The history stays as it is: after a recovery the host is told only what
@@ -147,23 +147,22 @@ void tPtp4lTimeRef::reportUnreachable(std::int32_t code) const {
     updateMetaData(tPtp4lMetaData());
 }
 
-void tPtp4lTimeRef::reportTimePair(const tTimeStatus& timeStatus) {
-    drainEpochOffsets();
-    const std::uint64_t offset =
-        history_.epochOffset + static_cast<std::uint64_t>(timeStatus.masterOffset);
+void tPtp4lTimeRef::reportTimePair(const tTimeStatus& timeStatus, std::uint64_t& epochOffset) {
+    drainEpochOffsets(epochOffset);
+    const std::uint64_t offset = epochOffset + static_cast<std::uint64_t>(timeStatus.masterOffset);
     const std::uint64_t localTime =
-        static_cast<std::uint64_t>(timeStatus.ingressTime) + history_.epochOffset;
+        static_cast<std::uint64_t>(timeStatus.ingressTime) + epochOffset;
     host_.adjustTime(localTime - offset, localTime);
 }
 
 // At most one pipe full, so that a writer that never pauses cannot hold the worker.
-void tPtp4lTimeRef::drainEpochOffsets() {
+void tPtp4lTimeRef::drainEpochOffsets(std::uint64_t& epochOffset) {
     zeerr::LocalStatus status;
     std::uint64_t value = 0;
     std::size_t capacity = 0;
     std::size_t octets = 0;
     while (epochFifo_->read(&value, sizeof(value), status) == sizeof(value)) {
-        history_.epochOffset = value;
+        epochOffset = value;
         octets += sizeof(value);
         if (capacity == 0) {
             capacity = epochFifo_->capacity();
@@ -172,7 +171,7 @@ void tPtp4lTimeRef::drainEpochOffsets() {
             break;
         }
     }
-    probeOffsets(octets, static_cast<std::int64_t>(history_.epochOffset));
+    probeOffsets(octets, static_cast<std::int64_t>(epochOffset));
     // [oddity no-fifo-no-pairs] A missing FIFO is an error: without the epoch, a pair would be
     // wrong.
     if (status.code != zeerr::code::endOfData) {

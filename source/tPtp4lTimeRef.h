@@ -37,15 +37,14 @@ public:
 
     /// Sends default metadata and the quality "unusable", runs ptp4l and launches the threads.
     /// @throws zeerr::Exception when the host refuses or there can be no child; std::system_error
-    /// when
-    ///         there can be no thread. No thread and no ptp4l is left then.
+    ///         when there can be no thread. No thread and no ptp4l is left then.
     void start();
 
     /// Waits for the threads and ends ptp4l. May be repeated.
     void stop();
 
 private:
-    /// What the worker keeps from one pass to the next; the worker alone uses it.
+    /// What a worker keeps from one pass to the next.
     struct tHistory {
         std::uint32_t sleep = longestSleep; ///< microseconds
         tTimeStatus timeStatus;
@@ -57,10 +56,10 @@ private:
     void runWatchdog();
     void waitForThreads() const;
 
-    void runPass();
+    void runPass(tHistory& history);
     void reportUnreachable(std::int32_t code) const;
-    void reportTimePair(const tTimeStatus& timeStatus);
-    void drainEpochOffsets();
+    void reportTimePair(const tTimeStatus& timeStatus, std::uint64_t& epochOffset);
+    void drainEpochOffsets(std::uint64_t& epochOffset);
     void updateMetaData(const tPtp4lMetaData& metaData) const;
 
     // The members go in the reverse of this order.
@@ -68,7 +67,6 @@ private:
     tProtocolConfig config_;
     std::atomic<bool> stopRequested_{false};
     tPtp4lProcess ptp4l_;
-    tHistory history_;
     std::future<void> watchdog_;
     std::future<void> worker_;
     std::shared_ptr<tSharedFifo> epochFifo_;

@@ -1,8 +1,14 @@
+#include <algorithm>
 #include <array>
+#include <atomic>
+#include <csignal>
+#include <memory>
 #include <thread>
 
 #include <gmock/gmock.h>
+#include <sys/wait.h>
 #include <syslog.h>
+#include <unistd.h>
 
 #include "SessionFixture.h"
 
@@ -93,6 +99,68 @@ TEST_F(StartTest, GoesOnAfterAWarningOfTheHost) {
     begin("gm present\n");
     EXPECT_TRUE(waitForCalls(Function::getTime, 1));
     EXPECT_THAT(qualities().at(0), (QualityReport{"Waiting for ptp4l status", false}));
+}
+
+class SecondStartTest : public StartTest {
+protected:
+    Calls pairsOf(std::thread::id worker) const {
+        Calls pairs = host.calls(Function::adjustTime);
+        pairs.erase(std::remove_if(pairs.begin(), pairs.end(),
+                                   [worker](const auto& pair) { return pair.thread != worker; }),
+                    pairs.end());
+        return pairs;
+    }
+
+    /// Starts the session again, in a thread that never ends. The second worker is held in its
+    /// first poll: both use one socket, and would take each other's answers.
+    /// @return whether there is a second worker.
+    bool startAgain(std::thread::id first) {
+        auto held = std::make_shared<std::atomic<bool>>(false);
+        host.onCall([first, held](const RecordingHost::Call& call, zeerr_Status&) {
+            if (call.function == Function::getTime && call.thread != first) {
+                *held = true;
+                pause();
+            }
+        });
+        std::thread([this] { session.start(); }).detach();
+        return waitUntil([&] { return held->load(); });
+    }
+
+    /// In a process of its own, which it ends.
+    /// @return 0 when the first worker's pairs keep the epoch offset that it has read.
+    [[noreturn]] void startTwice() {
+        constexpr std::uint64_t epochOffset = 1000000;
+        fifo->write({epochOffset});
+        begin("sync-interval 0.02\n");
+        bool good = waitForCalls(Function::adjustTime, 1);
+        const auto first = host.calls(Function::adjustTime).at(0).thread;
+        good = good && startAgain(first);
+        const std::size_t before = pairsOf(first).size();
+        good = good && waitUntil([&] { return pairsOf(first).size() > before + 1; });
+        for (const auto& pair : pairsOf(first)) {
+            good = good && pair.localTime - pair.referenceTime == epochOffset;
+        }
+        _exit(good ? 0 : 1);
+    }
+};
+
+// The host must not do this. Were the history shared, the first worker's pairs would be wrong.
+TEST_F(SecondStartTest, LeavesTheFirstWorkerItsHistory) {
+#ifdef __SANITIZE_THREAD__
+    GTEST_SKIP() << "both workers use the one socket, unguarded";
+#endif
+    const pid_t child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+        startTwice();
+    }
+    int status = -1;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    for (const auto& start : SimulatedDaemon::events("start")) {
+        kill(start.pid, SIGKILL);
+    }
+    EXPECT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 0);
 }
 
 } // namespace
