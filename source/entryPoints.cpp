@@ -53,7 +53,8 @@ VANTEL_EXPORT void zekeltr_initialize(void** sessionSlot, const char* protocolCo
                                       zeerr::Status* status) {
     guarded(*status, [&] {
         if (protocolConfig == nullptr) {
-            zeerr::throwError(zeerr::site::configurationIsNull);
+            zeerr::setError(*status, zeerr::site::configurationIsNull);
+            return;
         }
         *sessionSlot =
             std::make_unique<zekelVantel::tPtp4lTimeRef>(sessionSlot, std::string(protocolConfig))
@@ -63,7 +64,8 @@ VANTEL_EXPORT void zekeltr_initialize(void** sessionSlot, const char* protocolCo
 
 // [oddity slot-stays] The slot keeps its value: it is the host's, which also compares it.
 VANTEL_EXPORT void zekeltr_finalize(void** sessionSlot) {
-    delete sessionIn(sessionSlot);
+    zeerr::LocalStatus status;
+    guarded(status, [&] { delete sessionIn(sessionSlot); });
 }
 
 VANTEL_EXPORT void zekeltr_start(void** sessionSlot, zeerr::Status* status) {
@@ -88,7 +90,8 @@ VANTEL_EXPORT void zekeltr_getParameterValidationData(zekeltr_Reallocate realloc
     guarded(*status, [&] {
         *buffer = reallocate(*buffer, zekelVantel::parameterSchemaSize);
         if (*buffer == nullptr) {
-            zeerr::throwError(zeerr::site::schemaNotAllocated);
+            zeerr::setError(*status, zeerr::site::schemaNotAllocated);
+            return;
         }
         std::memcpy(*buffer, zekelVantel::parameterSchema, zekelVantel::parameterSchemaSize);
     });

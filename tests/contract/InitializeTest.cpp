@@ -118,6 +118,17 @@ TEST_F(InitializeTest, CodeArrivesWithoutMemoryForTheText) {
     }
 }
 
+// Room for the host's own text, and no more.
+TEST_F(InitializeTest, NullConfigurationLeavesAShortTextWhereThereIsNoRoomForMore) {
+    char text[] = "{}";
+    zeerr_Status status{0, sizeof(text), &refusingResize, text};
+    initialize(nullptr, status);
+    EXPECT_EQ(status.code, -52005);
+    EXPECT_EQ(status.json, text);
+    EXPECT_STREQ(text, "{}");
+    EXPECT_EQ(slot, &untouched);
+}
+
 struct Failure {
     const char* name;
     const char* part;

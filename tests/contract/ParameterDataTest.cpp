@@ -82,6 +82,25 @@ TEST_F(ParameterDataTest, RefusalLeavesANullBufferAndMemoryFull) {
                              R"("line":92,"component":"vantel_bc"})");
 }
 
+bool resizeToSixtyOctets(zeerr_Status* status, std::uint32_t size) {
+    static char text[60];
+    if (size > sizeof(text)) {
+        return false;
+    }
+    status->json = text;
+    status->capacity = sizeof(text);
+    return true;
+}
+
+TEST_F(ParameterDataTest, RefusalLeavesTheMembersThatFit) {
+    zeerr_Status status{0, 0, &resizeToSixtyOctets, nullptr};
+    fetch(status, &refusingReallocate);
+    EXPECT_EQ(buffer, nullptr);
+    EXPECT_EQ(status.code, -52000);
+    ASSERT_NE(status.json, nullptr);
+    EXPECT_STREQ(status.json, R"({"error_constant":"zeoskerr_memoryFull"})");
+}
+
 TEST_F(ParameterDataTest, NegativeStatusOnEntryMeansNothingHappens) {
     HostStatus status(-1, R"({"mine":1})");
     fetch(status);
