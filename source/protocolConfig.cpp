@@ -10,8 +10,8 @@
 #include "errors/Exception.h"
 #include "ptp4lConfigTemplate.h"
 #include "tFileDescriptor.h"
-#include "json/ClassicLocale.h"
 #include "json/cJSONUtils.h"
+#include "json/tClassicLocale.h"
 
 namespace zekelVantel {
 namespace {
@@ -160,7 +160,7 @@ template void readParameter<bool>(tProtocolConfig&, const tConfigText&, const st
                                   std::string&);
 
 void readProtocolConfig(tProtocolConfig& session, const std::string& configText) {
-    const ClassicLocale locale;
+    const tClassicLocale locale;
     const tConfigText config(configText);
     std::string text = ptp4lConfigTemplate;
     readParameter<std::uint32_t>(session, config, "neighborPropDelayThreshold", text);

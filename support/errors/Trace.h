@@ -5,7 +5,8 @@
 #include <cstdarg>
 #include <cstddef>
 #include <cstdint>
-#include <string_view>
+
+#include "errors/zesdbg_VarLine.h"
 
 namespace zesdbg {
 
@@ -19,27 +20,8 @@ struct Source {
     const char* suffix; ///< ends the line: a line feed
 };
 
-/// A line under construction: 512 octets, cut at the end, always zero-terminated.
-class VarLineToBuffer {
-public:
-    static constexpr std::size_t capacity = 512;
-
-    void append(std::string_view text);
-
-    /// Appends the text right-aligned in a field. [oddity field-tail] A longer text keeps its end:
-    /// of a path, the file name is worth more than the folders.
-    void appendField(std::string_view text, std::size_t width);
-
-    [[gnu::format(printf, 2, 0)]] void appendFormatted(const char* format, va_list arguments);
-
-    const char* text() const { return text_; }
-
-private:
-    char text_[capacity] = {};
-    std::size_t length_ = 0;
-};
-
-using PrefixWriter = void (*)(VarLineToBuffer& line, const Source& source);
+using PrefixWriter = void (*)(zesdbg_VarLine& line, const Source& source);
+using Formatter = void (*)(zesdbg_VarLine& line, const char* format, std::va_list arguments);
 using OutputHook = void (*)(const char* line);
 
 /// Process-wide settings; the plug-in leaves them at their defaults.
@@ -49,6 +31,7 @@ struct Settings {
     std::size_t fileWidth;             ///< columns
     std::size_t lineWidth;             ///< columns
     const PrefixWriter* prefixWriters; ///< ends with a null pointer
+    Formatter formatter;               ///< adds the message, printf-style
     OutputHook output;                 ///< takes the finished line
 };
 extern Settings settings;

@@ -79,14 +79,23 @@ TEST_F(TraceTest, ThresholdCanBeRaised) {
 
 TEST_F(TraceTest, WidthsAndPrefixesAreSettings) {
     static constexpr zesdbg::PrefixWriter prefix[] = {
-        [](zesdbg::VarLineToBuffer& line, const zesdbg::Source& from) {
+        [](zesdbg_VarLine& line, const zesdbg::Source& from) {
             line.appendField(from.file, zesdbg::settings.fileWidth);
         },
-        [](zesdbg::VarLineToBuffer& line, const zesdbg::Source&) { line.append(": "); }, nullptr};
+        [](zesdbg_VarLine& line, const zesdbg::Source&) { line.append(": "); }, nullptr};
     zesdbg::settings.prefixWriters = prefix;
     zesdbg::settings.fileWidth = 4;
     zesdbg::trace(0x2000, source, "x");
     EXPECT_EQ(written, "Fifo: x\n");
+}
+
+TEST_F(TraceTest, FormatterIsASetting) {
+    zesdbg::settings.formatter = [](zesdbg_VarLine& line, const char* format, std::va_list) {
+        line.append("formatted: ");
+        line.append(format);
+    };
+    zesdbg::trace(0x2000, source, "errno: %d", 9);
+    EXPECT_EQ(written, "[ vantel_bc|                     tSharedFifo|  42] formatted: errno: %d\n");
 }
 
 TEST_F(TraceTest, FailuresAreTracedAtLevel8192) {

@@ -7,12 +7,12 @@ namespace zekelVantel {
 
 /// The "C" locale for the calling thread while this object lives. Parsing numbers and comparing
 /// keys must not depend on the locale that the host has set.
-class ClassicLocale {
+class tClassicLocale {
 public:
-    ClassicLocale();
-    ~ClassicLocale();
-    ClassicLocale(const ClassicLocale&) = delete;
-    ClassicLocale& operator=(const ClassicLocale&) = delete;
+    tClassicLocale();
+    ~tClassicLocale();
+    tClassicLocale(const tClassicLocale&) = delete;
+    tClassicLocale& operator=(const tClassicLocale&) = delete;
 
 private:
     locale_t classic_;

@@ -1,12 +1,12 @@
-#include "json/ClassicLocale.h"
+#include "json/tClassicLocale.h"
 
 namespace zekelVantel {
 
 // Without memory for the locale, the host's stays.
-ClassicLocale::ClassicLocale()
+tClassicLocale::tClassicLocale()
     : classic_(newlocale(LC_ALL_MASK, "C", nullptr)), previous_(uselocale(classic_)) {}
 
-ClassicLocale::~ClassicLocale() {
+tClassicLocale::~tClassicLocale() {
     uselocale(previous_);
     if (classic_ != nullptr) {
         freelocale(classic_);
