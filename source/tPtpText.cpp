@@ -1,13 +1,13 @@
 #include "tPtpText.h"
 
+#include <algorithm>
+
 namespace zekelVantel {
 
 void tPtpText::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
     char text[256] = {};
     const std::uint8_t length = buffer.readU8(status);
-    for (unsigned octet = 0; octet < length; ++octet) {
-        text[octet] = static_cast<char>(buffer.readU8(status));
-    }
+    std::generate_n(text, length, [&] { return static_cast<char>(buffer.readU8(status)); });
     if (!zeerr::isError(status)) {
         lengthField_ = length;
         text_ = text;
