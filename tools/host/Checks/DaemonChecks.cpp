@@ -3,7 +3,6 @@
 #include <cctype>
 #include <cerrno>
 #include <cstring>
-#include <filesystem>
 #include <fstream>
 #include <iterator>
 
@@ -13,13 +12,12 @@
 #include <unistd.h>
 
 #include "Checks/Access.h"
+#include "Checks/Processes.h"
 #include "Checks/TimedProgram.h"
 
 namespace vantelhost {
 
 namespace {
-
-namespace fs = std::filesystem;
 
 /// Where Debian has it.
 constexpr char usualDaemon[] = "/usr/sbin/ptp4l";
@@ -157,21 +155,18 @@ Finding checkConfigurationWithin(const Subject& subject, std::chrono::millisecon
 }
 
 Finding checkOtherDaemons(const Subject& subject) {
-    std::string processes;
+    std::string daemons;
     std::error_code error;
-    for (fs::directory_iterator each(subject.proc, error), end; !error && each != end;
-         each.increment(error)) {
-        const std::string name = each->path().filename();
-        const bool isProcess = name.find_first_not_of("0123456789") == std::string::npos;
-        if (isProcess && contentOf(each->path() / "comm") == "ptp4l\n") {
-            processes += " " + name;
+    for (const auto& [id, name] : processesIn(subject.proc, error)) {
+        if (name == "ptp4l") {
+            daemons += " " + id;
         }
     }
     if (error) {
         return skipped(fmt::format("{}: {}", subject.proc, error.message()));
     }
-    if (!processes.empty()) {
-        return doubtful("ptp4l runs already: process" + processes,
+    if (!daemons.empty()) {
+        return doubtful("ptp4l runs already: process" + daemons,
                         "end it, unless it uses other interfaces and sockets");
     }
     return good("none");

@@ -5,19 +5,15 @@
 #include <cstring>
 
 #include <fmt/format.h>
-#include <sys/socket.h>
 #include <sys/stat.h>
-#include <sys/un.h>
 #include <unistd.h>
 
 #include "Checks/Access.h"
+#include "Checks/SocketUse.h"
 
 namespace vantelhost {
 
 namespace {
-
-/// Without the zero behind it.
-constexpr std::size_t longestSocketPath = sizeof(sockaddr_un::sun_path) - 1;
 
 constexpr char noSettings[] = "there are no settings";
 
@@ -31,22 +27,6 @@ bool hasControlCharacters(const std::string& text) {
 /// As plug-in and ptp4l cut it.
 std::string socketPath(const std::string& path) {
     return path.substr(0, longestSocketPath);
-}
-
-/// Why nobody can be reached at a socket's path: errno; 0 when somebody can.
-int reach(const std::string& path) {
-    const int descriptor = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_CLOEXEC, 0);
-    if (descriptor < 0) {
-        return errno;
-    }
-    sockaddr_un address{};
-    address.sun_family = AF_UNIX;
-    path.copy(static_cast<char*>(address.sun_path), longestSocketPath);
-    const int result =
-        ::connect(descriptor, reinterpret_cast<const sockaddr*>(&address), sizeof(address));
-    const int error = result == 0 ? 0 : errno;
-    ::close(descriptor);
-    return error;
 }
 
 /// What a socket that nobody listens at is.
@@ -116,11 +96,10 @@ Finding checkUdsInUse(const Subject& subject) {
         return skipped(noSettings);
     }
     const std::string path = socketPath(*given);
-    const int error = reach(path);
+    const auto [error, listener] = useOfSocket(path, subject.proc);
     switch (error) {
     case 0:
-    case EPROTOTYPE: // a socket of another type
-        return bad(path + ": somebody listens there",
+        return bad(fmt::format("{}: {} listens there", path, listener),
                    "end it, or choose another path: --set udsAddress=...");
     case ECONNREFUSED:
     case ENOENT:

@@ -1,32 +1,14 @@
 #include "Checks/PathChecks.h"
 
-#include <sys/socket.h>
-#include <sys/un.h>
 #include <unistd.h>
 
 #include "Checks/CheckTest.h"
+#include "Checks/Listener.h"
 #include "Checks/OrdinaryUser.h"
 
 using namespace vantelhost;
 
 namespace {
-
-class Listener {
-public:
-    Listener(const std::string& path, int type) : descriptor_(::socket(AF_UNIX, type, 0)) {
-        sockaddr_un address{};
-        address.sun_family = AF_UNIX;
-        path.copy(static_cast<char*>(address.sun_path), sizeof(address.sun_path) - 1);
-        EXPECT_EQ(::bind(descriptor_, reinterpret_cast<const sockaddr*>(&address), sizeof(address)),
-                  0);
-    }
-    ~Listener() { ::close(descriptor_); }
-    Listener(const Listener&) = delete;
-    Listener& operator=(const Listener&) = delete;
-
-private:
-    int descriptor_;
-};
 
 /// Lets others see what is in the folder.
 void open(const Folder& folder) {
