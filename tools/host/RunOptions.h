@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "BuiltPaths.h"
 #include "SettingsOptions.h"
 
 namespace CLI {
@@ -29,7 +30,7 @@ struct RunOptions : SettingsOptions {
     std::string chronySocket; ///< empty when chronyd gets nothing
     bool useFifo = false;
     bool createFifo = false;
-    std::string fifo = "/tmp/quillEpochOffset";
+    std::string fifo = builtEpochFifo;
     std::optional<std::int64_t> epochOffset;
     std::vector<TimedOffset> timedOffsets; ///< in the order of their times
     bool refuseWhileStopping = false;

@@ -58,7 +58,7 @@ TEST(CommandLine, DefaultsOfRun) {
     EXPECT_EQ(options.pluginPath, "libvantel_bc.so.19");
     EXPECT_EQ(options.configFile, "");
     EXPECT_EQ(options.seconds, std::nullopt);
-    EXPECT_EQ(options.fifo, "/tmp/quillEpochOffset");
+    EXPECT_EQ(options.fifo, VANTEL_EPOCH_FIFO_PATH);
     EXPECT_FALSE(options.useFifo || options.createFifo || options.jsonLines || options.plain ||
                  options.noInterfaces || options.refuseWhileStopping);
 }

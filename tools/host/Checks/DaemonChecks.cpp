@@ -1,6 +1,5 @@
 #include "Checks/DaemonChecks.h"
 
-#include <cctype>
 #include <cerrno>
 #include <cstring>
 #include <fstream>
@@ -12,15 +11,13 @@
 #include <unistd.h>
 
 #include "Checks/Access.h"
+#include "Checks/DaemonMessages.h"
 #include "Checks/Processes.h"
 #include "Checks/TimedProgram.h"
 
 namespace vantelhost {
 
 namespace {
-
-/// Where Debian has it.
-constexpr char usualDaemon[] = "/usr/sbin/ptp4l";
 
 bool isExecutable(const std::string& path) {
     struct stat state {};
@@ -56,21 +53,13 @@ std::string shownEnd(const ProgramEnd& end) {
                : fmt::format("it ended with status {}, without a word", WEXITSTATUS(end.status));
 }
 
-bool isWordAt(const std::string& text, std::size_t begin, std::size_t length) {
-    const auto isPart = [&](std::size_t place) {
-        return place < text.size() &&
-               (std::isalnum(static_cast<unsigned char>(text[place])) != 0 || text[place] == '_');
-    };
-    return !(begin > 0 && isPart(begin - 1)) && !isPart(begin + length);
-}
-
-bool hasWord(const std::string& text, const std::string& word) {
-    for (auto at = text.find(word); at != std::string::npos; at = text.find(word, at + 1)) {
-        if (isWordAt(text, at, word.size())) {
-            return true;
-        }
+/// How to get a missing ptp4l to its path.
+std::string mendOfMissing(const Subject& subject) {
+    if (subject.daemon == subject.usualDaemon) {
+        return "install linuxptp";
     }
-    return false;
+    const std::string link = fmt::format("ln -sf {} {}", subject.usualDaemon, subject.daemon);
+    return isExecutable(subject.usualDaemon) ? link : "install linuxptp, then " + link;
 }
 
 } // namespace
@@ -83,17 +72,20 @@ Finding checkDaemon(const Subject& subject) {
     struct stat state {};
     if (::stat(path.c_str(), &state) != 0) {
         const std::string problem = fmt::format("{}: {}", path, std::strerror(errno));
-        return bad(problem,
-                   isExecutable(usualDaemon)
-                       ? fmt::format("ln -sf {} {}", usualDaemon, path)
-                       : fmt::format("install linuxptp, then ln -sf {} {}", usualDaemon, path));
+        return bad(problem, mendOfMissing(subject));
     }
     return S_ISREG(state.st_mode)
                ? bad(path + ": is not executable", fmt::format("chmod +x {}", path))
                : bad(path + ": is not a program", "put ptp4l, or a link to it, there");
 }
 
-std::string mendFor(const std::string& complaint) {
+bool isScript(const std::string& program) {
+    char first[2] = {};
+    return isExecutable(program) && std::ifstream(program, std::ios::binary).read(first, 2) &&
+           first[0] == '#' && first[1] == '!';
+}
+
+std::string mendFor(const std::string& option) {
     static constexpr struct {
         const char* option; ///< of ptp4l
         const char* key;    ///< the plug-in's parameter
@@ -109,15 +101,16 @@ std::string mendFor(const std::string& complaint) {
         {"path_trace_enabled", "pathTraceEnabled"},
         {"follow_up_info", "followUpInfo"},
         {"transportSpecific", "transportSpecific"},
+        {"uds_address", "udsAddress"},
         {"ptp_dst_mac", "ptpDstMac"},
         {"delay_mechanism", "delayMechanism"},
     };
-    if (hasWord(complaint, "network_transport")) {
+    if (option == "network_transport") {
         return "--set networkTransport=UDPv4 --set ptpDstMac=01:1B:19:00:00:00; UDPv4RAW needs "
                "another ptp4l than that of linuxptp";
     }
     for (const auto& row : rows) {
-        if (hasWord(complaint, row.option)) {
+        if (option == row.option) {
             return fmt::format("another value: --set {}=...", row.key);
         }
     }
@@ -135,7 +128,8 @@ Finding checkConfigurationWithin(const Subject& subject, std::chrono::millisecon
     if (!isExecutable(subject.daemon)) {
         return skipped("there is no daemon");
     }
-    if (hasOtherSections(contentOf(*subject.rendered))) {
+    const std::string file = contentOf(*subject.rendered);
+    if (hasOtherSections(file)) {
         return skipped("a setting adds a section, with which ptp4l could start a clock");
     }
     const auto end = runTimed({subject.daemon, "-f", *subject.rendered, "-m", "-q"}, longest);
@@ -147,19 +141,16 @@ Finding checkConfigurationWithin(const Subject& subject, std::chrono::millisecon
         return bad(fmt::format("{} did not end without an interface", subject.daemon),
                    "put ptp4l, or a link to it, there");
     }
-    // ptp4l's last complaint, when its file is read.
-    if (end.output.find("no interface specified") != std::string::npos) {
-        return good("ptp4l takes it");
-    }
-    return bad(shownEnd(end), mendFor(end.output));
+    const Answer answer = understand(end.output, file);
+    return answer.isTaken ? good("ptp4l takes it") : bad(shownEnd(end), mendFor(answer.option));
 }
 
 Finding checkOtherDaemons(const Subject& subject) {
     std::string daemons;
     std::error_code error;
-    for (const auto& [id, name] : processesIn(subject.proc, error)) {
-        if (name == "ptp4l") {
-            daemons += " " + id;
+    for (const auto& [id, process] : processesIn(subject.proc, error)) {
+        if (process.name == "ptp4l") {
+            daemons += " " + std::to_string(id);
         }
     }
     if (error) {

@@ -23,7 +23,10 @@ Finding checkConfigurationWithin(const Subject& subject, std::chrono::millisecon
 /// No other one runs.
 Finding checkOtherDaemons(const Subject& subject);
 
-/// The setting to change after a complaint of ptp4l; empty when no setting is concerned.
-std::string mendFor(const std::string& complaint);
+/// Whether it is a script, such as one that calls the real ptp4l with -S.
+bool isScript(const std::string& program);
+
+/// What to do when ptp4l refuses one of its options; empty when no setting is concerned.
+std::string mendFor(const std::string& option);
 
 } // namespace vantelhost

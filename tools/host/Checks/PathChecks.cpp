@@ -99,7 +99,7 @@ Finding checkUdsInUse(const Subject& subject) {
     const auto [error, listener] = useOfSocket(path, subject.proc);
     switch (error) {
     case 0:
-        return bad(fmt::format("{}: {} listens there", path, listener),
+        return bad(fmt::format("{}: in use by {}", path, listener),
                    "end it, or choose another path: --set udsAddress=...");
     case ECONNREFUSED:
     case ENOENT:

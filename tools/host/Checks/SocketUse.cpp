@@ -44,7 +44,9 @@ std::set<std::string> linksOf(const std::string& path, const std::string& proc) 
     std::ifstream sockets(proc + "/net/unix");
     for (std::string line; std::getline(sockets, line);) {
         std::istringstream columns(line);
-        std::string ignored, inode, bound;
+        std::string ignored;
+        std::string inode;
+        std::string bound;
         for (int i = 0; i < 6; ++i) {
             columns >> ignored;
         }
@@ -70,11 +72,18 @@ bool hasOpen(const fs::path& process, const std::set<std::string>& links) {
 
 std::string ownersOf(const std::string& path, const std::string& proc) {
     const auto links = linksOf(path, proc);
-    std::string owners;
     std::error_code ignored;
-    for (const auto& [id, name] : processesIn(proc, ignored)) {
-        if (hasOpen(fs::path(proc) / id, links)) {
-            owners += fmt::format("{}{} (process {})", owners.empty() ? "" : ", ", name, id);
+    const auto processes = processesIn(proc, ignored);
+    std::string owners;
+    for (const auto& [id, process] : processes) {
+        if (hasOpen(fs::path(proc) / std::to_string(id), links)) {
+            owners +=
+                fmt::format("{}{} (process {})", owners.empty() ? "" : "; ", process.name, id);
+            const auto parent = processes.find(process.parent);
+            if (parent != processes.end()) {
+                owners +=
+                    fmt::format(", started by {} (process {})", parent->second.name, parent->first);
+            }
         }
     }
     return owners.empty() ? "somebody" : owners;

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "BuiltPaths.h"
 #include "Checks/TimeStamping.h"
 #include "Json.h"
 
@@ -13,10 +14,12 @@ namespace vantelhost {
 /// What is checked, and where the machine shows itself.
 struct Subject {
     /// The paths that are compiled into the plug-in.
-    std::string daemon = "/usr/bin/ptp4l";
-    std::string socketPrefix = "/var/run/ptp4lTimeRef."; ///< the process id follows
-    std::string fifo = "/tmp/quillEpochOffset";
-    bool createFifo = false; ///< by whoever will run the plug-in
+    std::string daemon = builtPtp4l;
+    std::string socketPrefix = builtSocketPrefix; ///< the process id follows
+    std::string fifo = builtEpochFifo;
+    std::string usualDaemon = "/usr/sbin/ptp4l"; ///< where Debian has it
+    bool createFifo = false;                     ///< by whoever will run the plug-in
+    bool software = false;                       ///< the daemon will take time stamps in software
 
     std::vector<std::string> interfaces;
     std::optional<Json> settings;        ///< complete and accepted, if there are such

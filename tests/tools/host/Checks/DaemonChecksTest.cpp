@@ -25,7 +25,8 @@ protected:
 
     void addProcess(const std::string& name, const std::string& command) const {
         ::mkdir((subject.proc + "/" + name).c_str(), 0755);
-        writeFile(subject.proc + "/" + name + "/comm", command + "\n");
+        writeFile(subject.proc + "/" + name + "/status",
+                  "Name:\t" + command + "\nUmask:\t0022\nPPid:\t1\n");
     }
 };
 
@@ -37,8 +38,17 @@ TEST_F(DaemonChecksTest, AnExecutableDaemonIsGood) {
 }
 
 TEST_F(DaemonChecksTest, AMissingDaemonIsLinked) {
-    EXPECT_THAT(checkDaemon(subject), says(Verdict::fail, "ptp4l: No such file or directory",
-                                           "ln -sf /usr/sbin/ptp4l " + subject.daemon));
+    subject.usualDaemon = HOST_TOOL;
+    EXPECT_THAT(checkDaemon(subject), says(Verdict::fail, "ptp4l: No such file or directory"));
+    EXPECT_EQ(checkDaemon(subject).mend, std::string("ln -sf ") + HOST_TOOL + " " + subject.daemon);
+}
+
+TEST_F(DaemonChecksTest, ADaemonThatIsMissingEverywhereIsInstalled) {
+    subject.usualDaemon = folder.path("sbin/ptp4l");
+    EXPECT_EQ(checkDaemon(subject).mend,
+              "install linuxptp, then ln -sf " + subject.usualDaemon + " " + subject.daemon);
+    subject.daemon = subject.usualDaemon;
+    EXPECT_EQ(checkDaemon(subject).mend, "install linuxptp");
 }
 
 TEST_F(DaemonChecksTest, ADaemonThatIsNotExecutableIsMadeSo) {
@@ -71,6 +81,13 @@ TEST_F(DaemonChecksTest, ARefusalIsShownInTheDaemonsWords) {
                 says(Verdict::fail,
                      "it says: 300 is an out of range value for option priority1 at line 2",
                      "--set priority1="));
+}
+
+TEST_F(DaemonChecksTest, ARefusedLineIsLookedUpInTheFile) {
+    writeFile(*subject.rendered, "[global]\npriority1 128\nuds_address \n");
+    installDaemon("echo could not parse line 3 in global section; exit 254");
+    EXPECT_THAT(checkConfiguration(subject),
+                says(Verdict::fail, "it says: could not parse line 3", "--set udsAddress="));
 }
 
 TEST_F(DaemonChecksTest, AWordlessEndIsAFailure) {
@@ -123,17 +140,30 @@ TEST_F(DaemonChecksTest, WithoutFileOrDaemonThereIsNothingToTry) {
 }
 
 TEST(MendForTest, NamesTheSettingBehindTheOption) {
-    EXPECT_THAT(mendFor("x is a bad value for option network_transport at line 2"),
+    EXPECT_THAT(mendFor("network_transport"),
                 testing::StartsWith("--set networkTransport=UDPv4 --set ptpDstMac="));
-    EXPECT_EQ(mendFor("x is a bad value for option ptp_dst_mac at line 2"),
-              "another value: --set ptpDstMac=...");
-    EXPECT_EQ(mendFor("unknown option neighborPropDelayThresh at line 38"),
+    EXPECT_EQ(mendFor("ptp_dst_mac"), "another value: --set ptpDstMac=...");
+    EXPECT_EQ(mendFor("neighborPropDelayThresh"),
               "another value: --set neighborPropDelayThreshold=...");
 }
 
 TEST(MendForTest, IsSilentAboutWhatNoSettingChanges) {
-    EXPECT_EQ(mendFor("unknown option p2p_dst_mac at line 90"), "");
-    EXPECT_EQ(mendFor("unknown option xpriority1 and priority12"), "");
+    for (const char* option : {"", "p2p_dst_mac", "priority12", "xpriority1"}) {
+        EXPECT_EQ(mendFor(option), "") << option;
+    }
+}
+
+TEST_F(DaemonChecksTest, AScriptIsToldFromAProgram) {
+    installDaemon("exec ptp4l -S \"$@\"");
+    EXPECT_TRUE(isScript(subject.daemon));
+    EXPECT_FALSE(isScript(HOST_TOOL));
+    EXPECT_FALSE(isScript(folder.path("none")));
+    EXPECT_FALSE(isScript(folder.path("proc")));
+}
+
+TEST_F(DaemonChecksTest, AScriptThatMayNotBeExecutedIsNone) {
+    installDaemon("exit 0", 0644);
+    EXPECT_FALSE(isScript(subject.daemon));
 }
 
 TEST_F(DaemonChecksTest, OtherDaemonsAreListed) {

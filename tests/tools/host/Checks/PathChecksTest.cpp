@@ -115,10 +115,10 @@ TEST_F(CheckTest, ASocketThatWasLeftBehindIsGoodAndStays) {
 
 TEST_F(CheckTest, ASocketWhereSomebodyListensFails) {
     const Listener datagrams(folder.path("uds"), SOCK_DGRAM);
-    EXPECT_THAT(checkUdsInUse(subject), says(Verdict::fail, "somebody listens there"));
+    EXPECT_THAT(checkUdsInUse(subject), says(Verdict::fail, "uds: in use by somebody"));
     const Listener stream(folder.path("stream"), SOCK_STREAM);
     set("udsAddress", folder.path("stream"));
-    EXPECT_THAT(checkUdsInUse(subject), says(Verdict::fail, "somebody listens there"));
+    EXPECT_THAT(checkUdsInUse(subject), says(Verdict::fail, "stream: in use by somebody"));
 }
 
 TEST_F(CheckTest, SomethingElseAtTheSocketsPathIsToldOf) {

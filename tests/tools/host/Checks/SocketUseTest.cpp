@@ -11,9 +11,13 @@ using namespace vantelhost;
 
 namespace {
 
+std::string nameOf(pid_t process) {
+    const std::string name = contentOf(fmt::format("/proc/{}/comm", process));
+    return fmt::format("{} (process {})", name.substr(0, name.find('\n')), process);
+}
+
 std::string thisProcess() {
-    const std::string name = contentOf("/proc/self/comm");
-    return fmt::format("{} (process {})", name.substr(0, name.find('\n')), ::getpid());
+    return nameOf(::getpid()) + ", started by " + nameOf(::getppid());
 }
 
 } // namespace
