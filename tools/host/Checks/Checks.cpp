@@ -5,6 +5,7 @@
 #include "Checks/InterfaceChecks.h"
 #include "Checks/MachineChecks.h"
 #include "Checks/PathChecks.h"
+#include "Checks/SettingsChecks.h"
 
 namespace vantelhost {
 
@@ -21,10 +22,13 @@ struct InterfaceCheck {
     Finding (*check)(const Subject& subject, const std::string& interface);
 };
 
-constexpr Check daemonChecks[] = {
+constexpr Check firstChecks[] = {
     {"daemon", checkDaemon},
     {"configuration", checkConfiguration},
+    {"followUpInfo", checkFollowUpInfo},
+    {"delayMechanism", checkDelayMechanism},
     {"other daemons", checkOtherDaemons},
+    {"interfaces", checkInterfaces},
 };
 
 constexpr InterfaceCheck interfaceChecks[] = {
@@ -49,7 +53,7 @@ constexpr Check otherChecks[] = {
 
 CheckResults checkMachine(const Subject& subject) {
     CheckResults results;
-    for (const auto& [name, check] : daemonChecks) {
+    for (const auto& [name, check] : firstChecks) {
         results.push_back({name, check(subject)});
     }
     for (const auto& interface : subject.interfaces) {
