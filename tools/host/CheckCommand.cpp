@@ -60,6 +60,9 @@ std::function<int()> prepareCheck(CLI::App& command) {
     addPath(command, "--fifo", subject.fifo, "The FIFO of epoch offsets");
     command.add_flag("--create-fifo", subject.createFifo,
                      "The run will create the FIFO if it is absent");
+    command.add_flag("--software", subject.software,
+                     "The daemon will be a script that calls ptp4l with -S: time stamps in "
+                     "software");
     command.add_flag("--json", options->json, "Print a JSON object");
     command.footer(
         "A line for each check: \"ok\", \"FAIL\", \"warn\" or \"skip\", what was found, and how to "

@@ -180,6 +180,28 @@ TEST_F(ToolCheckTest, TheHelpNamesWhatCannotBeSeen) {
     EXPECT_THAT(result.output, AllOf(HasSubstr("VANTEL_PTP4L_PATH"), HasSubstr("Exit status: 0")));
 }
 
+TEST_F(ToolCheckTest, ThePathsOfTheBuildAreTheDefaults) {
+    const auto result = check({"--help"});
+    for (const char* path :
+         {VANTEL_PTP4L_PATH, VANTEL_EPOCH_FIFO_PATH, VANTEL_LOCAL_SOCKET_PREFIX}) {
+        EXPECT_THAT(result.output, HasSubstr(path));
+    }
+}
+
+TEST_F(ToolCheckTest, AnInterfaceThatIsNamedTwiceIsRefused) {
+    installDaemon("echo no interface specified");
+    const auto result = check({"--json", "--library", FAKE_PLUGIN, "--create-fifo", "--interface",
+                               "lo", "--interface", "lo"});
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(of(result, "interfaces")["result"], "fail");
+}
+
+TEST_F(ToolCheckTest, SoftwareTimeStampsAreNoFailureWhenAskedFor) {
+    const Words words{"--json", "--library", FAKE_PLUGIN, "--create-fifo", "--interface", "lo"};
+    EXPECT_EQ(of(check(words), "time stamping lo")["result"], "fail");
+    EXPECT_NE(of(check(with(words, {"--software"})), "time stamping lo")["result"], "fail");
+}
+
 TEST_F(ToolCheckTest, TheRealDaemonRefusesTheDefaultTransportAndTakesTheMendedOne) {
     if (::access(realDaemon, X_OK) != 0) {
         GTEST_SKIP() << "SKIPPED: there is no " << realDaemon << " (package linuxptp)";
@@ -196,8 +218,9 @@ TEST_F(ToolCheckTest, TheRealDaemonRefusesTheDefaultTransportAndTakesTheMendedOn
     const auto mended = check(
         with(words, {"--set", "networkTransport=UDPv4", "--set", "ptpDstMac=01:1B:19:00:00:00"}));
     EXPECT_EQ(of(mended, "configuration")["result"], "ok") << mended.output;
-    const auto badMechanism = check(with(words, {"--set", "networkTransport=UDPv4", "--set",
-                                                 "priority1=200", "--set", "delayMechanism=NONE"}));
+    const auto badMechanism =
+        check(with(words, {"--set", "networkTransport=UDPv4", "--set", "priority1=200", "--set",
+                           "delayMechanism=NONSENSE"}));
     EXPECT_THAT(std::string(of(badMechanism, "configuration")["mend"]),
                 "another value: --set delayMechanism=...");
 }

@@ -12,10 +12,11 @@ namespace vantelhost {
 /// It is there, and up.
 Finding checkInterface(const Subject& subject, const std::string& interface);
 
-/// It has time stamps in hardware, as the plug-in's configuration asks of ptp4l.
+/// It has time stamps in hardware, as the plug-in's configuration asks of ptp4l; a warning when
+/// those in software may do.
 Finding checkTimeStamping(const Subject& subject, const std::string& interface);
 
-/// Its clock's device may be opened.
+/// Its clock's device may be opened, as by a host that steers the clock; else a warning.
 Finding checkClockDevice(const Subject& subject, const std::string& interface);
 
 /// All interfaces have one clock.

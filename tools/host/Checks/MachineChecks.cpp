@@ -59,7 +59,8 @@ std::uint64_t inherited(std::map<std::string, std::string>& fields, const std::s
 }
 
 // Not CAP_SYS_TIME: the plug-in's file says free_running, ptp4l sets no clock.
-std::string missingFrom(std::uint64_t capabilities, const std::string& transport) {
+std::string missingFrom(std::uint64_t capabilities, const Subject& subject) {
+    const auto transport = setting(subject, "networkTransport").value_or("UDPv4RAW");
     const bool isUdp = transport.compare(0, 3, "UDP") == 0;
     const bool isRaw = transport != "UDPv4" && transport != "UDPv6";
     const struct {
@@ -67,7 +68,7 @@ std::string missingFrom(std::uint64_t capabilities, const std::string& transport
         unsigned number;
         const char* name;
     } rows[] = {
-        {true, CAP_NET_ADMIN, "CAP_NET_ADMIN (time stamps in hardware)"},
+        {!subject.software, CAP_NET_ADMIN, "CAP_NET_ADMIN (time stamps in hardware)"},
         {isUdp, CAP_NET_BIND_SERVICE, "CAP_NET_BIND_SERVICE (ports 319 and 320)"},
         {isRaw, CAP_NET_RAW, "CAP_NET_RAW (raw sockets)"},
     };
@@ -104,8 +105,7 @@ Finding checkCapabilities(const Subject& subject) {
     if (fields.count("CapEff") == 0) {
         return skipped(subject.proc + "/self/status does not tell");
     }
-    const auto transport = setting(subject, "networkTransport").value_or("UDPv4RAW");
-    const std::string missing = missingFrom(inherited(fields, subject.daemon), transport);
+    const std::string missing = missingFrom(inherited(fields, subject.daemon), subject);
     if (missing.empty()) {
         return good("ptp4l has those that it needs");
     }

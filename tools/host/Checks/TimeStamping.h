@@ -18,6 +18,10 @@ struct TimeStamping {
 TimeStamping readTimeStamping(const std::string& interface);
 
 /// What ptp4l lacks there for hardware time stamps, in words; empty when nothing is missing.
-std::string missingForHardware(const TimeStamping& timeStamping);
+/// @param transport ptp4l's network_transport, of which the receive filter has to be
+std::string missingForHardware(const TimeStamping& timeStamping, const std::string& transport);
+
+/// The same for software time stamps.
+std::string missingForSoftware(const TimeStamping& timeStamping);
 
 } // namespace vantelhost

@@ -65,6 +65,13 @@ TEST_F(MachineChecksTest, TheTransportSaysWhichAreNeeded) {
     EXPECT_THAT(checkCapabilities(subject), isGood());
 }
 
+TEST_F(MachineChecksTest, TimeStampsInSoftwareNeedNoAdministrator) {
+    setProcess("0", "0000000000000400", none); // NET_BIND_SERVICE
+    EXPECT_THAT(checkCapabilities(subject), says(Verdict::fail, "lack CAP_NET_ADMIN"));
+    subject.software = true;
+    EXPECT_THAT(checkCapabilities(subject), isGood());
+}
+
 TEST_F(MachineChecksTest, WithoutProcNothingIsKnown) {
     EXPECT_EQ(checkCapabilities(subject).verdict, Verdict::skip);
     EXPECT_EQ(checkDatagramQueue(subject).verdict, Verdict::skip);
