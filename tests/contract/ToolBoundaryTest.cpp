@@ -17,8 +17,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
-const fs::path root = VANTEL_PROJECT_FOLDER;
-const fs::path headers = root / "include/vantel_bc";
+const fs::path projectFolder = VANTEL_PROJECT_FOLDER;
+const fs::path headers = projectFolder / "include/vantel_bc";
 
 bool isBelow(const fs::path& folder, const fs::path& path) {
     const fs::path relative = path.lexically_normal().lexically_relative(folder);
@@ -43,8 +43,9 @@ void forEachInclude(const fs::path& folder, Visitor visit) {
 }
 
 bool isOfTheProject(const std::string& name) {
-    return fs::exists(root / "source" / name) || fs::exists(root / "support" / name) ||
-           fs::exists(root / "include" / name);
+    return fs::exists(projectFolder / "source" / name) ||
+           fs::exists(projectFolder / "support" / name) ||
+           fs::exists(projectFolder / "include" / name);
 }
 
 /// What a tool includes that is neither its own nor a library's.
@@ -90,7 +91,7 @@ const Tool simulator = {"simptp4l", VANTEL_SIMPTP4L_PROGRAM, VANTEL_SIMPTP4L_ING
 class ToolBoundaryTest : public testing::TestWithParam<Tool> {
 protected:
     const Tool& tool = GetParam();
-    const fs::path folder = root / "tools" / tool.name;
+    const fs::path folder = projectFolder / "tools" / tool.name;
 };
 
 TEST_P(ToolBoundaryTest, OnlyTheInterfacesHeadersAreIncluded) {
@@ -101,7 +102,8 @@ TEST_P(ToolBoundaryTest, NothingOfThePlugInIsCompiledIn) {
     const auto paths = linesOf(readFile(tool.ingredients));
     EXPECT_GE(paths.size(), 15U);
     for (const std::string& path : paths) {
-        const bool project = isBelow(root, path) && !isBelow(root / "build", path);
+        const bool project =
+            isBelow(projectFolder, path) && !isBelow(projectFolder / "build", path);
         EXPECT_TRUE(!project || isBelow(folder, path) || isBelow(headers.parent_path(), path))
             << path;
     }

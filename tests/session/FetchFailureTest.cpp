@@ -14,9 +14,6 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::SizeIs;
 
-const QualityReport waiting{"Waiting for ptp4l status", false};
-const QualityReport usable{"PTP role has changed.", true};
-const QualityReport noRole{"PTP role has changed.", false};
 const QualityReport unreachable{
     "Unable to communicate with PTP sub process while attempting to retrieve time data", false};
 

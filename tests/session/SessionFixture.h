@@ -66,6 +66,11 @@ struct QualityReport {
 /// For readable failures.
 void PrintTo(const QualityReport& report, std::ostream* out);
 
+/// Of start, and of a grandmaster that appears and goes.
+inline const QualityReport waiting{"Waiting for ptp4l status", false};
+inline const QualityReport usable{"PTP role has changed.", true};
+inline const QualityReport noRole{"PTP role has changed.", false};
+
 class SessionTest : public testing::Test {
 protected:
     using Function = RecordingHost::Function;

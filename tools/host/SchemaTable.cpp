@@ -11,9 +11,9 @@ namespace vantelhost {
 
 namespace {
 
-using Row = std::array<std::string, 5>;
+using TableRow = std::array<std::string, 5>;
 
-Row row(const Parameter& parameter) {
+TableRow row(const Parameter& parameter) {
     const auto& range = parameter.range;
     return {parameter.key, nameOf(parameter.type),
             range ? fmt::format("{} to {}", range->low, range->high) : "",
@@ -23,7 +23,7 @@ Row row(const Parameter& parameter) {
 } // namespace
 
 std::string schemaTable(const Schema& schema) {
-    std::vector<Row> rows{{"key", "type", "range", "default", "hidden"}};
+    std::vector<TableRow> rows{{"key", "type", "range", "default", "hidden"}};
     for (const auto& parameter : schema) {
         rows.push_back(row(parameter));
     }

@@ -24,18 +24,18 @@ Number numberAt(const std::string& octets, std::size_t position) {
 }
 
 /// Where chronyd listens.
-class Listener {
+class ListeningChronyd {
 public:
-    explicit Listener(const std::string& path) {
+    explicit ListeningChronyd(const std::string& path) {
         sockaddr_un address{};
         address.sun_family = AF_UNIX;
         std::strcpy(address.sun_path, path.c_str());
         EXPECT_EQ(::bind(descriptor_, reinterpret_cast<const sockaddr*>(&address), sizeof(address)),
                   0);
     }
-    ~Listener() { ::close(descriptor_); }
-    Listener(const Listener&) = delete;
-    Listener& operator=(const Listener&) = delete;
+    ~ListeningChronyd() { ::close(descriptor_); }
+    ListeningChronyd(const ListeningChronyd&) = delete;
+    ListeningChronyd& operator=(const ListeningChronyd&) = delete;
 
     std::string receive() const {
         std::array<char, 100> buffer;
@@ -93,7 +93,7 @@ TEST(SockSample, OffsetIsWhatTheLocalTimeLacks) {
 }
 
 TEST_F(ChronyClockTest, PairsArriveAndTheFirstIsTold) {
-    const Listener chronyd(path);
+    const ListeningChronyd chronyd(path);
     const auto news = clock.take(reference, local);
     ASSERT_TRUE(news.has_value());
     EXPECT_EQ(news->text, "takes the pairs; 1 sent, 0 failed");
@@ -115,20 +115,20 @@ TEST_F(ChronyClockTest, AMissingChronydIsToldOnceAndCounted) {
 
 TEST_F(ChronyClockTest, ARestartedChronydGetsPairsAgain) {
     {
-        const Listener chronyd(path);
+        const ListeningChronyd chronyd(path);
         clock.take(reference, local);
     }
     EXPECT_EQ(clock.take(reference, local).value().members["problem"],
               path + ": Connection refused");
     ::unlink(path.c_str());
     EXPECT_FALSE(clock.take(reference, local).has_value());
-    const Listener chronyd(path);
+    const ListeningChronyd chronyd(path);
     EXPECT_EQ(clock.take(reference, local).value().text, "takes the pairs; 2 sent, 2 failed");
     EXPECT_EQ(chronyd.receive(), sockSample(reference, local));
 }
 
 TEST_F(ChronyClockTest, AChronydThatDoesNotReadIsNotWaitedFor) {
-    const Listener chronyd(path);
+    const ListeningChronyd chronyd(path);
     clock.take(reference, local);
     for (int i = 0; i < 100000 && clock.state().members["failed"] == 0; ++i) {
         clock.take(reference, local);

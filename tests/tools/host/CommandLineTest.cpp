@@ -13,7 +13,7 @@ using testing::ElementsAre;
 
 namespace {
 
-using Words = std::vector<const char*>;
+using Arguments = std::vector<const char*>;
 
 /// The options of the last "run" that was accepted.
 std::optional<RunOptions> accepted;
@@ -32,9 +32,9 @@ std::function<int()> prepareOther(CLI::App&) {
 }
 
 /// The exit status.
-int read(const Words& words) {
+int read(const Arguments& words) {
     accepted.reset();
-    Words argv{"vantel-host"};
+    Arguments argv{"vantel-host"};
     argv.insert(argv.end(), words.begin(), words.end());
     testing::internal::CaptureStdout();
     testing::internal::CaptureStderr();
@@ -45,7 +45,7 @@ int read(const Words& words) {
     return status;
 }
 
-RunOptions run(Words words) {
+RunOptions run(Arguments words) {
     words.insert(words.begin(), "run");
     EXPECT_EQ(read(words), 42);
     return accepted.value();
@@ -125,13 +125,13 @@ TEST(CommandLine, TheNamedSubcommandGivesTheStatus) {
 
 TEST(CommandLine, HelpIsNoMistake) {
     for (const auto& words :
-         std::vector<Words>{{"--help"}, {"run", "--help"}, {"other", "--help"}}) {
+         std::vector<Arguments>{{"--help"}, {"run", "--help"}, {"other", "--help"}}) {
         EXPECT_EQ(read(words), 0);
     }
 }
 
 TEST(CommandLine, MistakesGiveTheStatusOfUsageErrors) {
-    for (const auto& words : std::vector<Words>{
+    for (const auto& words : std::vector<Arguments>{
              {},
              {"walk"},
              {"run", "--nonsense"},

@@ -11,7 +11,7 @@ using testing::StartsWith;
 
 namespace {
 
-constexpr char startedEvent[] = "\"event\":\"started\"";
+constexpr char sessionStarted[] = "\"event\":\"started\"";
 
 } // namespace
 
@@ -23,7 +23,7 @@ TEST_F(ToolTest, EachStopSignalStopsTheRunCleanly) {
     for (const auto& row : {Row{SIGTERM, "SIGTERM"}, Row{SIGINT, "SIGINT"}, Row{SIGHUP, "SIGHUP"},
                             Row{SIGQUIT, "SIGQUIT"}}) {
         Child child(command({"--json", "--interface", "eth0"}));
-        ASSERT_TRUE(child.waitForOutput(startedEvent));
+        ASSERT_TRUE(child.waitForOutput(sessionStarted));
         child.signal(row.number);
         const int status = child.wait();
         EXPECT_EQ(status, 0);
@@ -36,7 +36,7 @@ TEST_F(ToolTest, EachStopSignalStopsTheRunCleanly) {
 
 TEST_F(ToolTest, ASignalEndsARunWithADurationEarly) {
     Child child(command({"--json", "--interface", "eth0", "--seconds", "1000"}));
-    ASSERT_TRUE(child.waitForOutput(startedEvent));
+    ASSERT_TRUE(child.waitForOutput(sessionStarted));
     child.signal(SIGTERM);
     EXPECT_EQ(child.wait(), 0);
 }
@@ -48,7 +48,7 @@ TEST_F(ToolTest, SignalsAreBlockedWhenThePlugInIsLoaded) {
 
 TEST_F(ToolTest, AStoppedAndContinuedHostGoesOn) {
     Child child(command({"--json", "--interface", "eth0"}));
-    ASSERT_TRUE(child.waitForOutput(startedEvent));
+    ASSERT_TRUE(child.waitForOutput(sessionStarted));
     child.signal(SIGSTOP);
     child.signal(SIGCONT);
     child.signal(SIGTERM);
@@ -59,7 +59,7 @@ TEST_F(ToolTest, AStoppedAndContinuedHostGoesOn) {
 TEST_F(ToolTest, AReaderThatGoesAwayStopsTheRunInGoodOrder) {
     Child child(command({"--json", "--interface", "eth0", "--create-fifo", "--fifo",
                          folder.path("epoch"), "--epoch-offset-at", "0.5:1"}));
-    ASSERT_TRUE(child.waitForOutput(startedEvent));
+    ASSERT_TRUE(child.waitForOutput(sessionStarted));
     child.closeOutput();
     EXPECT_EQ(child.wait(), 1);
     EXPECT_EQ(record().back(), "finalise");

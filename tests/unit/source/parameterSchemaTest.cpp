@@ -4,7 +4,7 @@
 
 namespace {
 
-constexpr char expected[] = R"schema({
+constexpr char expectedSchema[] = R"schema({
    "neighborPropDelayThreshold": {
       "dataType": "int",
       "range": [0, 4294967295],
@@ -96,7 +96,7 @@ constexpr char expected[] = R"schema({
 )schema";
 
 TEST(ParameterSchemaTest, HasItsExactText) {
-    EXPECT_STREQ(zekelVantel::parameterSchema, expected);
+    EXPECT_STREQ(zekelVantel::parameterSchema, expectedSchema);
 }
 
 TEST(ParameterSchemaTest, SizeIncludesTheTerminatingZero) {

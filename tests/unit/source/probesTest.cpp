@@ -27,17 +27,17 @@ using namespace zekelVantel;
 
 namespace {
 
-using Lines = std::vector<std::string>;
+using Messages = std::vector<std::string>;
 
 constexpr char prefix[] = "[ vantel_bc|                          probes|] ";
 
 std::mutex mutex;
 std::condition_variable changed;
-Lines written;
+Messages traced;
 
 void take(const char* line) {
     const std::lock_guard<std::mutex> lock(mutex);
-    written.emplace_back(line);
+    traced.emplace_back(line);
     changed.notify_all();
 }
 
@@ -45,7 +45,7 @@ void take(const char* line) {
 class Traces {
 public:
     Traces() {
-        written.clear();
+        traced.clear();
         zesdbg::settings.lineWidth = 0;
         zesdbg::settings.output = &take;
     }
@@ -53,11 +53,11 @@ public:
     Traces(const Traces&) = delete;
     Traces& operator=(const Traces&) = delete;
 
-    /// What was written, without the prefix and the line feed.
-    static Lines messages() {
+    /// What was traced, without the prefix and the line feed.
+    static Messages messages() {
         const std::lock_guard<std::mutex> lock(mutex);
-        Lines messages;
-        for (const std::string& line : written) {
+        Messages messages;
+        for (const std::string& line : traced) {
             EXPECT_EQ(line.rfind(prefix, 0), 0U) << line;
             EXPECT_EQ(line.back(), '\n');
             messages.push_back(line.substr(sizeof(prefix) - 1, line.size() - sizeof(prefix)));
@@ -68,7 +68,7 @@ public:
     static bool waitFor(const std::string& message) {
         std::unique_lock<std::mutex> lock(mutex);
         return changed.wait_for(lock, std::chrono::seconds(20), [&] {
-            return std::count(written.begin(), written.end(), prefix + message + "\n") > 0;
+            return std::count(traced.begin(), traced.end(), prefix + message + "\n") > 0;
         });
     }
 
@@ -93,7 +93,7 @@ TEST_F(ProbesTest, NothingIsWrittenAtTheDefaultThreshold) {
         probeOffsets(8, 1);
         probeHostCall("f", -1);
     }
-    EXPECT_EQ(Traces::messages(), Lines());
+    EXPECT_EQ(Traces::messages(), Messages());
 }
 
 TEST_F(ProbesTest, WidestValuesAreWrittenWhole) {
@@ -106,11 +106,11 @@ TEST_F(ProbesTest, WidestValuesAreWrittenWhole) {
     probeOffsets(1048576, -9223372036854775807 - 1);
     probeHostCall("zekel_getTime", 2147483647);
     EXPECT_EQ(Traces::messages(),
-              (Lines{"exchange start: managementId 0xffff, sequenceId 65535",
-                     "exchange end: managementId 0xffff, sequenceId 65535, code -2147483648",
-                     "sleep chosen: 4294967295 us",
-                     "offsets drained: 1048576 octets, kept -9223372036854775808 ns",
-                     "host call: zekel_getTime, code 2147483647"}));
+              (Messages{"exchange start: managementId 0xffff, sequenceId 65535",
+                        "exchange end: managementId 0xffff, sequenceId 65535, code -2147483648",
+                        "sleep chosen: 4294967295 us",
+                        "offsets drained: 1048576 octets, kept -9223372036854775808 ns",
+                        "host call: zekel_getTime, code 2147483647"}));
 }
 
 class ExchangeProbeTest : public ProbesTest {
@@ -134,19 +134,20 @@ TEST_F(ExchangeProbeTest, SingleAndPortsTellOfOneStartAndOneEnd) {
     std::vector<tPortDataSetNp> answers;
     node.getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(interface, remote, 3, answers, status);
     EXPECT_EQ(answers.size(), 3U);
-    EXPECT_EQ(Traces::messages(), (Lines{"exchange start: managementId 0xc000, sequenceId 0",
-                                         "exchange end: managementId 0xc000, sequenceId 0, code 0",
-                                         "exchange start: managementId 0xc002, sequenceId 1",
-                                         "exchange end: managementId 0xc002, sequenceId 1, "
-                                         "code 0"}));
+    EXPECT_EQ(Traces::messages(),
+              (Messages{"exchange start: managementId 0xc000, sequenceId 0",
+                        "exchange end: managementId 0xc000, sequenceId 0, code 0",
+                        "exchange start: managementId 0xc002, sequenceId 1",
+                        "exchange end: managementId 0xc002, sequenceId 1, "
+                        "code 0"}));
 }
 
 TEST_F(ExchangeProbeTest, FailureEndsWithItsCode) {
     std::vector<tPortDataSetNp> answers;
     node.getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(interface, remote, 3, answers, status);
-    EXPECT_EQ(Traces::messages(), (Lines{"exchange start: managementId 0xc002, sequenceId 0",
-                                         "exchange end: managementId 0xc002, sequenceId 0, "
-                                         "code -52024"}));
+    EXPECT_EQ(Traces::messages(), (Messages{"exchange start: managementId 0xc002, sequenceId 0",
+                                            "exchange end: managementId 0xc002, sequenceId 0, "
+                                            "code -52024"}));
 }
 
 TEST_F(ProbesTest, HostCallsTellTheirFunctionAndCode) {
@@ -160,9 +161,9 @@ TEST_F(ProbesTest, HostCallsTellTheirFunctionAndCode) {
     EXPECT_THROW(host.setQuality(tQuality::usable, "why"), zeerr::Exception);
     EXPECT_THROW(host.updateMetaData("{}"), zeerr::Exception);
     EXPECT_EQ(Traces::messages(),
-              (Lines{"host call: zekel_getTime, code 0", "host call: zekel_adjustTime, code 7",
-                     "host call: zekel_setTRQuality, code -52009",
-                     "host call: zekel_updateMetaData, code -52009"}));
+              (Messages{"host call: zekel_getTime, code 0", "host call: zekel_adjustTime, code 7",
+                        "host call: zekel_setTRQuality, code -52009",
+                        "host call: zekel_updateMetaData, code -52009"}));
 }
 
 /// A session with a daemon of the test's; the one that it would run is not there.
@@ -174,14 +175,14 @@ protected:
         recorder.setTime(0x1122334455667788 + 50000000);
     }
 
-    /// Runs it for one pass. @return what is written from the first sleep to the second. The
+    /// Runs it for one pass. @return what is traced from the first sleep to the second. The
     /// quality is left out: the watchdog reports one at any time.
-    Lines firstPass() {
+    Messages firstPass() {
         tPtp4lTimeRef timeRef(&slot, text());
         timeRef.start();
         EXPECT_TRUE(Traces::waitFor("sleep chosen: 78000 us"));
         timeRef.stop();
-        Lines lines = Traces::messages();
+        Messages lines = Traces::messages();
         lines.erase(
             std::remove(lines.begin(), lines.end(), "host call: zekel_setTRQuality, code 0"),
             lines.end());
@@ -199,22 +200,23 @@ TEST_F(SessionProbesTest, PassTellsAllThatItDoes) {
     tSharedFifo fifo(epochFifoPath, true, status);
     const std::int64_t offsets[] = {5, -7};
     ASSERT_EQ(fifo.write(offsets, sizeof(offsets), status), 16);
-    EXPECT_EQ(firstPass(),
-              (Lines{"sleep chosen: 125000 us", "exchange start: managementId 0xc000, sequenceId 0",
-                     "exchange end: managementId 0xc000, sequenceId 0, code 0",
-                     "exchange start: managementId 0x2002, sequenceId 1",
-                     "exchange end: managementId 0x2002, sequenceId 1, code 0",
-                     "exchange start: managementId 0x2000, sequenceId 2",
-                     "exchange end: managementId 0x2000, sequenceId 2, code 0",
-                     "exchange start: managementId 0x2004, sequenceId 3",
-                     "exchange end: managementId 0x2004, sequenceId 3, code 0",
-                     "exchange start: managementId 0xc002, sequenceId 4",
-                     "exchange end: managementId 0xc002, sequenceId 4, code 0",
-                     "exchange start: managementId 0xc004, sequenceId 5",
-                     "exchange end: managementId 0xc004, sequenceId 5, code 0",
-                     "host call: zekel_getTime, code 0", "offsets drained: 16 octets, kept -7 ns",
-                     "host call: zekel_adjustTime, code 0",
-                     "host call: zekel_updateMetaData, code 0", "sleep chosen: 78000 us"}));
+    EXPECT_EQ(
+        firstPass(),
+        (Messages{"sleep chosen: 125000 us", "exchange start: managementId 0xc000, sequenceId 0",
+                  "exchange end: managementId 0xc000, sequenceId 0, code 0",
+                  "exchange start: managementId 0x2002, sequenceId 1",
+                  "exchange end: managementId 0x2002, sequenceId 1, code 0",
+                  "exchange start: managementId 0x2000, sequenceId 2",
+                  "exchange end: managementId 0x2000, sequenceId 2, code 0",
+                  "exchange start: managementId 0x2004, sequenceId 3",
+                  "exchange end: managementId 0x2004, sequenceId 3, code 0",
+                  "exchange start: managementId 0xc002, sequenceId 4",
+                  "exchange end: managementId 0xc002, sequenceId 4, code 0",
+                  "exchange start: managementId 0xc004, sequenceId 5",
+                  "exchange end: managementId 0xc004, sequenceId 5, code 0",
+                  "host call: zekel_getTime, code 0", "offsets drained: 16 octets, kept -7 ns",
+                  "host call: zekel_adjustTime, code 0", "host call: zekel_updateMetaData, code 0",
+                  "sleep chosen: 78000 us"}));
 }
 
 } // namespace

@@ -4,7 +4,7 @@
 
 namespace {
 
-constexpr char expected[] = R"([global]
+constexpr char expectedFile[] = R"([global]
 #
 # Default Data Set
 #
@@ -100,7 +100,7 @@ using ProtocolConfigWholeFileTest = ProtocolConfigFixture;
 
 TEST_F(ProtocolConfigWholeFileTest, SchemaDefaultsFillTheFifteenPlaceholders) {
     read();
-    EXPECT_EQ(written(), expected);
+    EXPECT_EQ(written(), expectedFile);
     EXPECT_TRUE(log.lines().empty());
 }
 

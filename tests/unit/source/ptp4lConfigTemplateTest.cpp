@@ -8,7 +8,7 @@
 
 namespace {
 
-constexpr char expected[] = R"([global]
+constexpr char expectedTemplate[] = R"([global]
 #
 # Default Data Set
 #
@@ -101,7 +101,7 @@ boundary_clock_jbod  0
 )";
 
 TEST(Ptp4lConfigTemplateTest, HasItsExactText) {
-    EXPECT_STREQ(zekelVantel::ptp4lConfigTemplate, expected);
+    EXPECT_STREQ(zekelVantel::ptp4lConfigTemplate, expectedTemplate);
 }
 
 TEST(Ptp4lConfigTemplateTest, Has2322OctetsIn90Lines) {

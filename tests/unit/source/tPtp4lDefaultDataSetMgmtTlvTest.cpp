@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtp4lDefaultDataSetMgmtTlv;
 
-namespace {
+namespace tPtp4lDefaultDataSetMgmtTlvTest {
 
 const Octets before = octets("0102 0304 0506 07 08 090A 0B 0C 0D 0E0F 10 1112131415161718 19 1A");
 const Octets next = octets("A1B2 C3D4 E5F6 81 92 A3A4 B5 C6 D7 E8E9 FA 8B8D8F9193959799 AC BD");
@@ -68,4 +68,4 @@ TEST(Ptp4lDefaultDataSetMgmtTlvTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtp4lDefaultDataSetMgmtTlv>(next);
 }
 
-} // namespace
+} // namespace tPtp4lDefaultDataSetMgmtTlvTest

@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtp4lParentDataSetMgmtTlv;
 
-namespace {
+namespace tPtp4lParentDataSetMgmtTlvTest {
 
 const Octets before = octets("0102 0304 0506 0708090A0B0C0D0E 0F10 11 12 1314 15161718 19"
                              "1A 1B 1C1D 1E 1F20212223242526");
@@ -79,4 +79,4 @@ TEST(Ptp4lParentDataSetMgmtTlvTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtp4lParentDataSetMgmtTlv>(next);
 }
 
-} // namespace
+} // namespace tPtp4lParentDataSetMgmtTlvTest

@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtp4lPortDataSetMgmtTlv;
 
-namespace {
+namespace tPtp4lPortDataSetMgmtTlvTest {
 
 const Octets before =
     octets("0102 0304 0506 0708090A0B0C0D0E 0F10 11 12 131415161718191A 1B 1C 1D 1E 1F 20");
@@ -72,4 +72,4 @@ TEST(Ptp4lPortDataSetMgmtTlvTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtp4lPortDataSetMgmtTlv>(next);
 }
 
-} // namespace
+} // namespace tPtp4lPortDataSetMgmtTlvTest

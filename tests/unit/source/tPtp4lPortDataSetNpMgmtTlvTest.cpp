@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtp4lPortDataSetNpMgmtTlv;
 
-namespace {
+namespace tPtp4lPortDataSetNpMgmtTlvTest {
 
 const Octets before = octets("0102 0304 0506 0708090A 0B0C0D0E");
 const Octets next = octets("A1B2 C3D4 E5F6 81828384 95969798");
@@ -55,4 +55,4 @@ TEST(Ptp4lPortDataSetNpMgmtTlvTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtp4lPortDataSetNpMgmtTlv>(next);
 }
 
-} // namespace
+} // namespace tPtp4lPortDataSetNpMgmtTlvTest

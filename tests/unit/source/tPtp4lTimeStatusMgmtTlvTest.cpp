@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtp4lTimeStatusMgmtTlv;
 
-namespace {
+namespace tPtp4lTimeStatusMgmtTlvTest {
 
 const Octets before =
     octets("0102 0304 0506 0708090A0B0C0D0E 1112131415161718 191A1B1C 1D1E1F20 2122"
@@ -93,4 +93,4 @@ TEST(Ptp4lTimeStatusMgmtTlvTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtp4lTimeStatusMgmtTlv>(next);
 }
 
-} // namespace
+} // namespace tPtp4lTimeStatusMgmtTlvTest

@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtpClockQuality;
 
-namespace {
+namespace tPtpClockQualityTest {
 
 const Octets before = octets("01 02 03 04");
 const Octets next = octets("F1 F2 F3 F4");
@@ -44,4 +44,4 @@ TEST(PtpClockQualityTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtpClockQuality>(next);
 }
 
-} // namespace
+} // namespace tPtpClockQualityTest

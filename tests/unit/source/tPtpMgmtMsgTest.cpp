@@ -9,7 +9,7 @@ using zekelVantel::tPtpMgmtMsg;
 using zekelVantel::tPtpMsgHeader;
 using zekelVantel::tPtpPortIdentity;
 
-namespace {
+namespace tPtpMgmtMsgTest {
 
 const Octets fresh = octets("0D 02 0022 00 00 0000 0000000000000000 00000000"
                             "0000000000000000 0000 0000 04 7F"
@@ -124,4 +124,4 @@ TEST(PtpMgmtMsgTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtpMgmtMsg>(next);
 }
 
-} // namespace
+} // namespace tPtpMgmtMsgTest

@@ -8,7 +8,7 @@ using zekelVantel::tPtpClockIdentity;
 using zekelVantel::tPtpMsgHeader;
 using zekelVantel::tPtpPortIdentity;
 
-namespace {
+namespace tPtpMsgHeaderTest {
 
 const Octets fresh = octets("0D 02 0022 00 00 0000 0000000000000000 00000000"
                             "0000000000000000 0000 0000 04 00");
@@ -128,4 +128,4 @@ TEST(PtpMsgHeaderTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtpMsgHeader>(next);
 }
 
-} // namespace
+} // namespace tPtpMsgHeaderTest

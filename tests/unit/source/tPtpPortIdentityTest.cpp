@@ -7,7 +7,7 @@
 using zekelVantel::tPtpClockIdentity;
 using zekelVantel::tPtpPortIdentity;
 
-namespace {
+namespace tPtpPortIdentityTest {
 
 const Octets before = octets("01 02 03 04 05 06 07 08 09 0A");
 const Octets next = octets("F1 F2 F3 F4 F5 F6 F7 F8 F9 FA");
@@ -48,4 +48,4 @@ TEST(PtpPortIdentityTest, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtpPortIdentity>(next);
 }
 
-} // namespace
+} // namespace tPtpPortIdentityTest

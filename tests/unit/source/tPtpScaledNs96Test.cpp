@@ -6,7 +6,7 @@
 
 using zekelVantel::tPtpScaledNs96;
 
-namespace {
+namespace tPtpScaledNs96Test {
 
 const Octets before = octets("01 02 03 04 05 06 07 08 09 0A 0B 0C");
 const Octets next = octets("F1 F2 F3 F4 F5 F6 F7 F8 F9 FA FB FC");
@@ -54,4 +54,4 @@ TEST(PtpScaledNs96Test, NoRoomIsEndOfData) {
     expectNoRoomIsEndOfData<tPtpScaledNs96>(next);
 }
 
-} // namespace
+} // namespace tPtpScaledNs96Test

@@ -24,14 +24,14 @@ namespace {
 using Clock = std::chrono::steady_clock;
 using std::chrono::milliseconds;
 
-constexpr char local[] = "local";
+constexpr char ownPath[] = "local";
 constexpr char remote[] = "remote";
 
 /// Sending and receiving.
 class UdsMsgTransferTest : public testing::Test {
 protected:
     void SetUp() override {
-        interface.open(local, status);
+        interface.open(ownPath, status);
         ASSERT_EQ(status.code, 0);
     }
 
@@ -85,7 +85,7 @@ TEST_F(UdsMsgTransferTest, SendsTheOctetsUpToTheLengthFromItsOwnPath) {
     const auto datagram = peer.receiveQueued();
     ASSERT_TRUE(datagram);
     EXPECT_EQ(datagram->octets, octets("01 02 03"));
-    EXPECT_EQ(datagram->source, local);
+    EXPECT_EQ(datagram->source, ownPath);
     EXPECT_FALSE(peer.receiveQueued());
 }
 
@@ -137,8 +137,8 @@ TEST_F(UdsMsgTransferTest, SendingWithAWarningSendsAndKeepsIt) {
 }
 
 TEST_F(UdsMsgTransferTest, ReceivesOneDatagramAndSetsTheLength) {
-    ASSERT_TRUE(peer.sendTo(local, octets("0A 0B 0C 0D")));
-    ASSERT_TRUE(peer.sendTo(local, octets("0E")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("0A 0B 0C 0D")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("0E")));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(contentOf(buffer), octets("0A 0B 0C 0D"));
@@ -151,7 +151,7 @@ TEST_F(UdsMsgTransferTest, ReceivesOneDatagramAndSetsTheLength) {
 TEST_F(UdsMsgTransferTest, ReceivingLeavesTheReadPositionAndMovesTheWritePosition) {
     buffer = received(octets("01 02 03"));
     buffer.readU16(status);
-    ASSERT_TRUE(peer.sendTo(local, octets("0A 0B 0C 0D")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("0A 0B 0C 0D")));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(buffer.readU16(status), 0x0C0DU);
     buffer.writeU8(0xEE, status);
@@ -160,7 +160,7 @@ TEST_F(UdsMsgTransferTest, ReceivingLeavesTheReadPositionAndMovesTheWritePositio
 }
 
 TEST_F(UdsMsgTransferTest, ReceivingTellsWhereTheDatagramCameFrom) {
-    ASSERT_TRUE(peer.sendTo(local, octets("01")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01")));
     tUdsMsgAddress source("a path that is longer than the sender's");
     interface.receive(buffer, source, 1000, status);
     EXPECT_EQ(status.code, 0);
@@ -169,7 +169,7 @@ TEST_F(UdsMsgTransferTest, ReceivingTellsWhereTheDatagramCameFrom) {
 
 TEST_F(UdsMsgTransferTest, SourcePathThatFillsItsFieldIsWhole) {
     const DatagramSocket far(std::string(108, 'f'));
-    ASSERT_TRUE(far.sendTo(local, octets("01")));
+    ASSERT_TRUE(far.sendTo(ownPath, octets("01")));
     tUdsMsgAddress source("");
     interface.receive(buffer, source, 1000, status);
     EXPECT_EQ(source.path(), std::string(108, 'f'));
@@ -177,22 +177,22 @@ TEST_F(UdsMsgTransferTest, SourcePathThatFillsItsFieldIsWhole) {
 
 TEST_F(UdsMsgTransferTest, EmptyDatagramIsReceivedAsLengthZero) {
     buffer = received(octets("01 02"));
-    ASSERT_TRUE(peer.sendTo(local, {}));
+    ASSERT_TRUE(peer.sendTo(ownPath, {}));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(buffer.getLength(), 0U);
 }
 
 TEST_F(UdsMsgTransferTest, DatagramOf1500OctetsIsReceivedWhole) {
-    ASSERT_TRUE(peer.sendTo(local, Octets(1500, 0x55)));
+    ASSERT_TRUE(peer.sendTo(ownPath, Octets(1500, 0x55)));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(contentOf(buffer), Octets(1500, 0x55));
 }
 
 TEST_F(UdsMsgTransferTest, OversizeDatagramIsCutTo1500Octets) {
-    ASSERT_TRUE(peer.sendTo(local, Octets(1501, 0x55)));
-    ASSERT_TRUE(peer.sendTo(local, octets("01")));
+    ASSERT_TRUE(peer.sendTo(ownPath, Octets(1501, 0x55)));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01")));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(contentOf(buffer), Octets(1500, 0x55));
@@ -212,7 +212,7 @@ TEST_F(UdsMsgTransferTest, TimeLimitZeroPollsOnce) {
     expectTimedOut();
     EXPECT_LT(since(start), milliseconds(1000));
     zeerr::LocalStatus second;
-    ASSERT_TRUE(peer.sendTo(local, octets("01")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01")));
     interface.receive(buffer, 0, second);
     EXPECT_EQ(second.code, 0);
     EXPECT_EQ(buffer.getLength(), 1U);
@@ -250,7 +250,7 @@ TEST_F(UdsMsgTransferTest, LongTimeLimitDoesNotWrapAround) {
 }
 
 TEST_F(UdsMsgTransferTest, FailureOfTheSystemsReceiveIsACommunicationsFault) {
-    const int descriptor = descriptorBoundTo(local);
+    const int descriptor = descriptorBoundTo(ownPath);
     const int noSocket = open("/dev/null", O_RDONLY | O_CLOEXEC);
     ASSERT_EQ(dup2(noSocket, descriptor), descriptor);
     close(noSocket);
@@ -260,7 +260,7 @@ TEST_F(UdsMsgTransferTest, FailureOfTheSystemsReceiveIsACommunicationsFault) {
 }
 
 TEST_F(UdsMsgTransferTest, FailureOfTheSystemsWaitingIsATimeOut) {
-    ASSERT_EQ(close(descriptorBoundTo(local)), 0);
+    ASSERT_EQ(close(descriptorBoundTo(ownPath)), 0);
     interface.receive(buffer, 60000, status);
     expectTimedOut();
 }
@@ -271,10 +271,10 @@ TEST_F(UdsMsgTransferTest, DescriptorBeyondTheSetsRoomReportsATimeOutAtOnce) {
     if (!occupied.leaveRoom()) {
         GTEST_SKIP() << "this system allows no more than " << FD_SETSIZE << " descriptors";
     }
-    interface.open(local, status);
+    interface.open(ownPath, status);
     ASSERT_EQ(status.code, 0);
-    ASSERT_GE(descriptorBoundTo(local), FD_SETSIZE);
-    ASSERT_TRUE(peer.sendTo(local, octets("01")));
+    ASSERT_GE(descriptorBoundTo(ownPath), FD_SETSIZE);
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01")));
     interface.receive(buffer, 60000, status);
     expectTimedOut();
     EXPECT_EQ(buffer.getLength(), 0U);
@@ -283,17 +283,17 @@ TEST_F(UdsMsgTransferTest, DescriptorBeyondTheSetsRoomReportsATimeOutAtOnce) {
 TEST_F(UdsMsgTransferTest, LastDescriptorWithinTheSetsRoomReceives) {
     interface.close();
     const OccupiedDescriptors occupied(FD_SETSIZE - 1);
-    interface.open(local, status);
+    interface.open(ownPath, status);
     ASSERT_EQ(status.code, 0);
-    ASSERT_EQ(descriptorBoundTo(local), FD_SETSIZE - 1);
-    ASSERT_TRUE(peer.sendTo(local, octets("01")));
+    ASSERT_EQ(descriptorBoundTo(ownPath), FD_SETSIZE - 1);
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01")));
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(buffer.getLength(), 1U);
 }
 
 TEST_F(UdsMsgTransferTest, ReceivingWithAnErrorDoesNothing) {
-    ASSERT_TRUE(peer.sendTo(local, octets("01 02")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01 02")));
     status.code = -1;
     tUdsMsgAddress source("kept");
     interface.receive(buffer, source, 60000, status);
@@ -307,7 +307,7 @@ TEST_F(UdsMsgTransferTest, ReceivingWithAnErrorDoesNothing) {
 }
 
 TEST_F(UdsMsgTransferTest, ReceivingWithAWarningReceivesAndKeepsIt) {
-    ASSERT_TRUE(peer.sendTo(local, octets("01 02")));
+    ASSERT_TRUE(peer.sendTo(ownPath, octets("01 02")));
     status.code = 1;
     interface.receive(buffer, 1000, status);
     EXPECT_EQ(status.code, 1);
