@@ -12,6 +12,7 @@ usage: scripts/testbed.sh [OPTION]... -- COMMAND [ARGUMENT]...
   --ports P          interfaces bc0 to bc(P-1) for the command (default 1)
   --no-grandmaster   nobody at the other end of bc0
   --log-sync L       logSyncInterval of the grandmaster (default -3: 8 Syncs a second)
+  --ahead NS         the grandmaster's clock is so much ahead (default 0)
   --plugin-paths     /usr/bin/ptp4l is linuxptp's ptp4l with software time stamping, and new
                      files in /tmp itself, such as the epoch FIFO, are private
   --help             this text
@@ -189,7 +190,8 @@ run_inside() {
     export TESTBED_GRANDMASTER_UDS=$grandmaster_uds
     export TESTBED_GRANDMASTER_PID=
     if ((grandmaster)); then
-        start_daemon grandmaster gm0 "priority1 10" "logSyncInterval $log_sync"
+        start_daemon grandmaster gm0 "priority1 10" "logSyncInterval $log_sync" \
+            "egressLatency $ahead" "ingressLatency -$ahead"
         TESTBED_GRANDMASTER_PID=$!
         wait_until_ready grandmaster "$TESTBED_GRANDMASTER_PID"
     fi
@@ -217,6 +219,7 @@ arguments=("$@")
 ports=1
 grandmaster=1
 log_sync=-3
+ahead=0
 plugin_paths=0
 while (($# > 0)) && [[ $1 != -- ]]; do
     case $1 in
@@ -229,6 +232,11 @@ while (($# > 0)) && [[ $1 != -- ]]; do
     --log-sync)
         [[ ${2-} =~ ^-?[0-7]$ ]] || fail "--log-sync takes a number from -7 to 7"
         log_sync=$2
+        shift
+        ;;
+    --ahead)
+        [[ ${2-} =~ ^[0-9]{1,9}$ ]] || fail "--ahead takes nanoseconds, below a second"
+        ahead=$2
         shift
         ;;
     --plugin-paths) plugin_paths=1 ;;

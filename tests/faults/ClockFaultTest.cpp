@@ -40,7 +40,7 @@ TEST_F(ClockFaultTest, OfTheHostMayJump) {
         0xFFFFFFFFFFFFFFFF,          ingressTime + 4294967296000,
         ingressTime - 4294967296000, ingressTime + 100000000};
     onEachPoll([this](int poll) { host.setTime(times[static_cast<std::size_t>(poll) % 8]); });
-    begin("clock fixed 1700000000000000000\noffset 250\n");
+    begin("clock fixed 1700000000000000000\noffset 250\nsyncs-before-delay 0\n");
     ASSERT_TRUE(waitForCalls(Function::getTime, 25));
     expectSleepsWithinBounds();
     EXPECT_THAT(pairs(), ElementsAre(std::pair(ingressTime - 250, ingressTime)));
@@ -53,6 +53,7 @@ TEST_F(ClockFaultTest, OfTheDaemonMayJump) {
     host.setTime(ingressTime + 112000000);
     begin("clock fixed 1700000000000000000\n"
           "offset 250\n"
+          "syncs-before-delay 0\n"
           "on TIME_STATUS_NP after 2 times 1 do clock-step 3600\n"
           "on TIME_STATUS_NP after 4 times 1 do clock-step -7200\n"
           "on TIME_STATUS_NP after 6 times 1 do clock-step -1\n");

@@ -85,6 +85,23 @@ TEST_F(PacingTest, PollsComeSlowlyWhenTheHostIsBehindTheIngress) {
     EXPECT_GE(shortest(Function::getTime), milliseconds(125));
 }
 
+TEST_F(PacingTest, OfSixteenSyncsASecondEverySecondOneIsPassedOver) {
+    // The daemon's clock is the host's.
+    onEachPoll([this](int) {
+        host.setTime(static_cast<std::uint64_t>(
+            std::chrono::steady_clock::now().time_since_epoch() / std::chrono::nanoseconds(1)));
+    });
+    begin("clock monotonic\n"
+          "sync-interval 0.0625\n");
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, 20));
+    const auto calls = host.calls(Function::adjustTime);
+    std::uint64_t shortest = UINT64_MAX;
+    for (std::size_t i = 1; i < calls.size(); ++i) {
+        shortest = std::min(shortest, calls[i].localTime - calls[i - 1].localTime);
+    }
+    EXPECT_EQ(shortest, 125000000U);
+}
+
 TEST_F(PacingTest, FailedFetchKeepsTheShortSleep) {
     beginAt(112000, "on TIME_STATUS_NP after 1 do length +1\n");
     ASSERT_TRUE(waitForCalls(Function::updateMetaData, 40));

@@ -37,6 +37,12 @@ std::vector<unsigned long> each(const std::vector<Event>& events, Field field) {
 constexpr char timedOut[] = "Unable to communicate with PTP sub process while attempting to "
                             "retrieve data,got error: -52007";
 
+std::string withFollowUpInfo(const std::string& transportSpecific) {
+    static const std::string off = R"("followUpInfo":false)";
+    std::string configuration = sessionConfiguration("[]", transportSpecific);
+    return configuration.replace(configuration.find(off), off.size(), R"("followUpInfo":true)");
+}
+
 TEST_F(PollTest, AsksForSixDataSetsInTheirOrder) {
     begin("gm present\n", R"(["eth0"])");
     ASSERT_TRUE(waitForCalls(Function::getTime, 2));
@@ -115,6 +121,24 @@ TEST_F(PollTest, DaemonThatDoesNotCareNeverSeesThePadOctetCounted) {
     }
 }
 
+TEST_F(PollTest, DaemonThatTakesFollowUpInfoForIeee8021AsDropsTransportSpecific0) {
+    SimulatedDaemon::script("follow-up-info strict\n");
+    session.initialise(withFollowUpInfo("0x0"));
+    session.start();
+    ASSERT_TRUE(waitForLog(timedOut, 2));
+    EXPECT_THAT(host.calls(Function::getTime), testing::IsEmpty());
+    for (const auto& request : SimulatedDaemon::events("request")) {
+        EXPECT_EQ(request.ignored, "not of IEEE 802.1AS");
+    }
+}
+
+TEST_F(PollTest, DaemonThatTakesFollowUpInfoForIeee8021AsAnswersTransportSpecific1) {
+    SimulatedDaemon::script("follow-up-info strict\n");
+    session.initialise(withFollowUpInfo("0x1"));
+    session.start();
+    EXPECT_TRUE(waitForCalls(Function::getTime, 2));
+}
+
 TEST_F(PollTest, PortsAreReportedByNumberWhateverTheOrderOfTheirAnswers) {
     begin("on PORT_DATA_SET do reorder\n"
           "on PORT_PROPERTIES_NP do reorder\n"
@@ -124,7 +148,7 @@ TEST_F(PollTest, PortsAreReportedByNumberWhateverTheOrderOfTheirAnswers) {
           R"(["eth0","eth1","eth2"])");
     ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
     const std::string text = metaData().at(1);
-    const auto first = text.find(R"("Port1":{"portState":"PTP_SLAVE")");
+    const auto first = text.find(R"("Port1":{"portState":"PTP_UNCALIBRATED")");
     const auto second = text.find(R"("Port2":{"portState":"PTP_PASSIVE")");
     const auto third = text.find(R"("Port3":{"portState":"PTP_GRAND_MASTER")");
     EXPECT_LT(first, second);

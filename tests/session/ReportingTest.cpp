@@ -80,7 +80,7 @@ TEST_F(ReportingTest, MetadataDescribesTheDaemonByteForByte) {
               R"("priority2":126,"domainNumber":0,"gmClockClass":6,)"
               R"("gmClockAccuracy":"WITHIN_100NS","gmOffsetLogVariance":20061,)"
               R"("gmPriority1":128,"gmPriority2":128,)"
-              R"("Port1":{"portState":"PTP_SLAVE","asCapable":true,"logSyncInterval":-3,)"
+              R"("Port1":{"portState":"PTP_UNCALIBRATED","asCapable":true,"logSyncInterval":-3,)"
               R"("logAnnounceInterval":1,"logPdelayInterval":0,"interface":"eth0",)"
               R"("neighborPropDelayThreshold":20000000},)"
               R"("Port2":{"portState":"PTP_MASTER","asCapable":true,"logSyncInterval":-3,)"
@@ -130,7 +130,7 @@ TEST_F(ReportingTest, ChangedPortStateSendsMetadataAgain) {
     const auto texts = metaData();
     ASSERT_THAT(texts, SizeIs(4));
     EXPECT_THAT(texts[1], testing::HasSubstr(R"("portState":"PTP_LISTENING")"));
-    EXPECT_THAT(texts[2], testing::HasSubstr(R"("portState":"PTP_SLAVE")"));
+    EXPECT_THAT(texts[2], testing::HasSubstr(R"("portState":"PTP_UNCALIBRATED")"));
     EXPECT_THAT(texts[3], testing::HasSubstr(R"("portState":"PTP_MASTER")"));
     EXPECT_THAT(texts[3], testing::HasSubstr(R"("gmClockAccuracy":"GREATER_THAN_10S")"));
 }

@@ -40,7 +40,8 @@ constexpr std::uint64_t minus(std::uint64_t value) {
 TEST_F(TimePairTest, IsIngressMinusOffsetAtIngressPlusEpoch) {
     fifo->write({37000000000});
     begin("clock fixed 1700000000000000000\n"
-          "offset 250\n");
+          "offset 250\n"
+          "syncs-before-delay 0\n");
     ASSERT_TRUE(waitForCalls(Function::adjustTime, 1));
     EXPECT_THAT(pairs(), ElementsAre(Pair{1699999999999999750, 1700000037000000000}));
 }
@@ -48,9 +49,50 @@ TEST_F(TimePairTest, IsIngressMinusOffsetAtIngressPlusEpoch) {
 TEST_F(TimePairTest, NegativeOffsetAndEpoch) {
     fifo->write({-37000000000});
     begin("clock fixed 1700000000000000000\n"
-          "offset -250\n");
+          "offset -250\n"
+          "syncs-before-delay 0\n");
     ASSERT_TRUE(waitForCalls(Function::adjustTime, 1));
     EXPECT_THAT(pairs(), ElementsAre(Pair{1700000000000000250, 1699999963000000000}));
+}
+
+TEST_F(TimePairTest, FirstOneHasTheOffset0OfADaemonThatKnowsNoDelayYet) {
+    begin("clock fixed 1700000000000000000\n"
+          "offset 5000000\n"
+          "sync-interval 3600\n");
+    ASSERT_TRUE(waitForCalls(Function::getTime, 3));
+    EXPECT_THAT(pairs(), ElementsAre(Pair{1700000000000000000, 1700000000000000000}));
+    EXPECT_THAT(qualities(), ElementsAre(QualityReport{"Waiting for ptp4l status", false},
+                                         QualityReport{"PTP role has changed.", true}));
+}
+
+TEST_F(TimePairTest, AllHaveTheOffset0OfADaemonThatNeverKnowsADelay) {
+    begin("clock monotonic\n"
+          "offset 37000000000\n"
+          "syncs-before-delay all\n");
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, 5));
+    for (const Pair& pair : pairs()) {
+        EXPECT_EQ(pair.reference, pair.local);
+    }
+    EXPECT_TRUE(qualities().back().usable);
+}
+
+TEST_F(TimePairTest, GrandmasterThatReturnsBeginsWithTheOffsetOfBefore) {
+    beginMeasured({{250, 1000, 1}, {250, 0, 0}, {250, 9000, 1}, {minus(70), 9500, 1}});
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, 4));
+    EXPECT_THAT(pairs(), ElementsAre(Pair{750, 1000}, Pair{minus(250), 0}, Pair{8750, 9000},
+                                     Pair{9570, 9500}));
+}
+
+TEST_F(TimePairTest, GrandmasterThatGoesGivesOneOf1970) {
+    fifo->write({37000000000});
+    begin("clock fixed 1700000000000000000\n"
+          "offset 250\n"
+          "syncs-before-delay 0\n"
+          "on PARENT_DATA_SET after 2 times 1 do gm off\n");
+    ASSERT_TRUE(waitForCalls(Function::getTime, 6));
+    EXPECT_THAT(pairs(), ElementsAre(Pair{1699999999999999750, 1700000037000000000},
+                                     Pair{minus(250), 37000000000}));
+    EXPECT_EQ(qualities().back(), (QualityReport{"PTP role has changed.", false}));
 }
 
 TEST_F(TimePairTest, ArithmeticIsModuloTwoToTheSixtyFour) {

@@ -116,13 +116,14 @@ void RecordingHost::record(Call call, std::uint64_t* time, zeerr_Status* status)
     {
         const std::lock_guard<std::mutex> lock(mutex_);
         calls_.push_back(call);
-        if (time != nullptr) {
-            *time = time_;
-        }
         reaction = reaction_;
     }
     changed_.notify_all();
     if (reaction) {
         reaction(call, *status);
+    }
+    if (time != nullptr) {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        *time = time_;
     }
 }

@@ -43,7 +43,7 @@ public:
 
     void onCall(Reaction reaction);
 
-    /// The time that zekel_getTime gives.
+    /// The time that zekel_getTime gives. A reaction may set it.
     void setTime(std::uint64_t time);
 
     std::vector<Call> calls() const;

@@ -68,16 +68,24 @@ void Clock::step(std::int64_t difference) {
 
 void Clock::measure(std::int64_t arrival, std::uint64_t index) {
     last_ = arrival;
-    const double drift = script_.driftPpb * (static_cast<double>(arrival) / 1e9);
-    offset_ = script_.offset + std::llround(drift) + jitter(index) + stepped_;
-    if (script_.clock == ClockSource::fixed) {
-        ingress_ = script_.fixedTime + stepped_;
-        return;
+    ingress_ = ingressOf(arrival) + stepped_;
+    // Without a delay no offset can be told: the last one stays.
+    if (index >= script_.syncsBeforeDelay) {
+        const double drift = script_.driftPpb * (static_cast<double>(arrival) / 1e9);
+        offset_ = script_.offset + std::llround(drift) + jitter(index) + stepped_;
     }
-    ingress_ = start_ + arrival + stepped_;
-    if (script_.clock == ClockSource::realtime) {
-        ingress_ += readClock(CLOCK_REALTIME) - readClock(CLOCK_MONOTONIC);
+}
+
+std::int64_t Clock::ingressOf(std::int64_t arrival) const {
+    switch (script_.clock) {
+    case ClockSource::fixed:
+        return script_.fixedTime;
+    case ClockSource::monotonic:
+        return start_ + arrival;
+    case ClockSource::realtime:
+        break;
     }
+    return start_ + arrival + readClock(CLOCK_REALTIME) - readClock(CLOCK_MONOTONIC);
 }
 
 std::int64_t Clock::jitter(std::uint64_t index) const {

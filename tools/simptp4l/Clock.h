@@ -16,8 +16,9 @@ struct ClockReading {
     std::int64_t ingressTime = 0;
 };
 
-/// Sync messages arrive at fixed intervals from the moment the grandmaster appears. `now` is
-/// nanoseconds since the start of the process and must not go back.
+/// Sync messages arrive at fixed intervals from the moment the grandmaster appears. The first of
+/// them come before a path delay is known: as in ptp4l they set the ingress time, and the offset
+/// stays. `now` is nanoseconds since the start of the process and must not go back.
 class Clock {
 public:
     /// @param start CLOCK_MONOTONIC at the start of the process
@@ -35,6 +36,7 @@ public:
 
 private:
     void measure(std::int64_t arrival, std::uint64_t index);
+    std::int64_t ingressOf(std::int64_t arrival) const;
     std::int64_t jitter(std::uint64_t index) const;
 
     const Script& script_;

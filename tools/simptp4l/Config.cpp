@@ -38,6 +38,7 @@ constexpr IntegerKey integerKeys[] = {
     {"logMinPdelayReqInterval", &Config::logMinPdelayReqInterval, -128, 127},
     {"announceReceiptTimeout", &Config::announceReceiptTimeout, 2, 255},
     {"neighborPropDelayThresh", &Config::neighborPropDelayThresh, 0, 2147483647},
+    {"follow_up_info", &Config::followUpInfo, 0, 1},
 };
 
 struct WordKey {

@@ -25,6 +25,7 @@ struct Config {
     int logMinPdelayReqInterval = 0;
     int announceReceiptTimeout = 3;
     int neighborPropDelayThresh = 20000000;
+    int followUpInfo = 0;
     int delayMechanism = 1; ///< as on the wire: 1 end to end, 2 peer to peer
     int timestamping = 1;   ///< as on the wire: 0 software, 1 hardware, 2 legacy
 };

@@ -47,6 +47,9 @@ std::string checkHeader(const Octets& octets, const Acceptance& acceptance) {
     if (octets[0] >> 4 != acceptance.transportSpecific) {
         return "other transportSpecific";
     }
+    if (acceptance.onlyIeee8021As && octets[0] >> 4 != 1 && octets[0] >> 4 != 2) {
+        return "not of IEEE 802.1AS";
+    }
     if (octets[4] != acceptance.domainNumber) {
         return "other domainNumber";
     }

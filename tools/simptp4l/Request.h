@@ -36,6 +36,8 @@ struct Acceptance {
     /// The TLV must end within messageLength, and messageLength within the datagram, as ptp4l wants
     /// it. Else messageLength is not looked at.
     bool strictPadding = false;
+    /// transportSpecific must be one that IEEE 802.1AS knows.
+    bool onlyIeee8021As = false;
 };
 
 /// Reads a datagram.

@@ -64,6 +64,7 @@ struct Script {
     std::int64_t jitter = 0;
     std::uint64_t seed = 1;
     std::optional<std::int64_t> syncInterval;
+    std::uint64_t syncsBeforeDelay = 1; ///< of each grandmaster
     ClockSource clock = ClockSource::realtime;
     std::int64_t fixedTime = 0;
 
@@ -76,6 +77,7 @@ struct Script {
     std::map<unsigned, std::string> interfaceNames;
     std::map<unsigned, std::uint8_t> portStates;
     bool strictPadding = false;
+    bool strictFollowUpInfo = false;
 
     std::string log; ///< empty: none
     std::vector<int> ignoredSignals;

@@ -47,6 +47,12 @@ void takeSyncInterval(ScriptWords& words, Script& script) {
     script.syncInterval = interval;
 }
 
+void takeSyncsBeforeDelay(ScriptWords& words, Script& script) {
+    script.syncsBeforeDelay =
+        words.accept("all") ? UINT64_MAX
+                            : static_cast<std::uint64_t>(words.takeInteger("count", 0, maxCount));
+}
+
 void takeClock(ScriptWords& words, Script& script) {
     const std::string source = words.take("clock");
     if (source == "realtime") {
@@ -98,11 +104,20 @@ void takePortState(ScriptWords& words, Script& script) {
     script.portStates[port] = static_cast<std::uint8_t>(words.takeInteger("port state", 0, 255));
 }
 
-void takePadding(ScriptWords& words, Script& script) {
-    script.strictPadding = words.accept("strict");
-    if (!script.strictPadding && !words.accept("lenient")) {
+bool takeStrict(ScriptWords& words) {
+    const bool strict = words.accept("strict");
+    if (!strict && !words.accept("lenient")) {
         throw ScriptError("expected strict or lenient");
     }
+    return strict;
+}
+
+void takePadding(ScriptWords& words, Script& script) {
+    script.strictPadding = takeStrict(words);
+}
+
+void takeFollowUpInfo(ScriptWords& words, Script& script) {
+    script.strictFollowUpInfo = takeStrict(words);
 }
 
 void takeLog(ScriptWords& words, Script& script) {
@@ -204,6 +219,7 @@ constexpr LineWord lineWords[] = {
     {"jitter", takeJitter},
     {"seed", takeSeed},
     {"sync-interval", takeSyncInterval},
+    {"syncs-before-delay", takeSyncsBeforeDelay},
     {"clock", takeClock},
     {"gm", takeGm},
     {"gm-after", takeGmAfter},
@@ -213,6 +229,7 @@ constexpr LineWord lineWords[] = {
     {"interface-name", takeInterfaceName},
     {"port-state", takePortState},
     {"padding", takePadding},
+    {"follow-up-info", takeFollowUpInfo},
     {"log", takeLog},
     {"ignore", takeIgnore},
     {"exit-at-once", takeExitAtOnce},

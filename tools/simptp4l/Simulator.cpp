@@ -15,7 +15,7 @@ namespace {
 
 constexpr int listeningState = 4;
 constexpr int masterState = 6;
-constexpr int slaveState = 9;
+constexpr int uncalibratedState = 8;
 constexpr std::int64_t second = 1000000000;
 constexpr std::int64_t longestWait = 3600 * second;
 
@@ -142,7 +142,8 @@ void Simulator::handle(const Datagram& datagram) {
     const std::int64_t current = now();
     const Acceptance acceptance{static_cast<std::uint8_t>(config_.transportSpecific),
                                 static_cast<std::uint8_t>(config_.domainNumber),
-                                script_.clockIdentity, script_.strictPadding};
+                                script_.clockIdentity, script_.strictPadding,
+                                script_.strictFollowUpInfo && config_.followUpInfo == 1};
     std::string ignored;
     const std::optional<Request> request = readRequest(datagram.octets, acceptance, ignored);
     if (request && !datagram.from.canBeAnswered()) {
@@ -244,8 +245,9 @@ int Simulator::portState(unsigned port, const ClockReading& reading) const {
     if (port != 1) {
         return masterState;
     }
+    // A ptp4l that is free-running never gets beyond it.
     if (reading.gmPresent) {
-        return slaveState;
+        return uncalibratedState;
     }
     return reading.gmSeen ? masterState : listeningState;
 }

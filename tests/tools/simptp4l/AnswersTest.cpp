@@ -8,6 +8,7 @@ namespace {
 /// With two ports, and everything that varies pinned.
 const std::string pinned = "clock fixed 1700000000123456789\n"
                            "offset -1500\n"
+                           "syncs-before-delay 0\n"
                            "sync-interval 3600\n"
                            "gm-identity 001B21FFFE0A0B0C\n"
                            "clock-identity 0011223344556677\n";
@@ -80,7 +81,7 @@ TEST_F(Simptp4l, AnswersPortDataSetOncePerPortInPortOrder) {
     EXPECT_EQ(client->receive(), "0d020050000000000000000000000000000000000011223344556677"
                                  "00010000047f0000000000000000000100000200"
                                  "0001001c2004"
-                                 "0011223344556677000109000000000000000000"
+                                 "0011223344556677000108000000000000000000"
                                  "0003fd020002");
     EXPECT_EQ(client->receive(), "0d020050000000000000000000000000000000000011223344556677"
                                  "00020000047f0000000000000000000100000200"
@@ -108,7 +109,7 @@ TEST_F(Simptp4l, PadsPortPropertiesToAnEvenLength) {
     EXPECT_EQ(client->receive(), "0d020046000000000000000000000000000000000011223344556677"
                                  "00010000047f0000000000000000000100000200"
                                  "00010012c004"
-                                 "0011223344556677000109010276"
+                                 "0011223344556677000108010276"
                                  "3000");
     EXPECT_EQ(client->receive(), "0d020046000000000000000000000000000000000011223344556677"
                                  "00020000047f0000000000000000000100000200"
@@ -124,6 +125,31 @@ TEST_F(Simptp4l, StrictPaddingDropsAMessageLengthThatLeavesOutThePadding) {
     EXPECT_EQ(client->receive(2).size(), 2U);
     EXPECT_EQ(client->ask(requests::timeStatus()).substr(0, 8), "0d020068");
     EXPECT_NE(daemon->log().find("TLV beyond the message"), std::string::npos);
+}
+
+TEST_F(Simptp4l, StrictFollowUpInfoDropsWhatIsNotOfIeee8021As) {
+    start("follow-up-info strict\n", "follow_up_info 1\n");
+    ASSERT_TRUE(client->send(requests::timeStatus()));
+    EXPECT_TRUE(eventually(
+        [&] { return daemon->log().find("not of IEEE 802.1AS") != std::string::npos; }));
+    EXPECT_TRUE(client->isQuiet());
+    start("follow-up-info strict\n", "follow_up_info 1\ntransportSpecific 0x1\n");
+    EXPECT_EQ(client->ask("1d" + requests::timeStatus().substr(2)).substr(0, 8), "1d020068");
+}
+
+TEST_F(Simptp4l, StrictFollowUpInfoIsOfNoConcernWithoutFollowUpInfo) {
+    start("follow-up-info strict\n", "follow_up_info 0\n");
+    EXPECT_EQ(client->ask(requests::timeStatus()).substr(0, 8), "0d020068");
+}
+
+TEST_F(Simptp4l, LenientFollowUpInfoAnswersAsBefore44) {
+    start("follow-up-info lenient\n", "follow_up_info 1\n");
+    EXPECT_EQ(client->ask(requests::timeStatus()).substr(0, 8), "0d020068");
+}
+
+TEST_F(Simptp4l, PortThatIsToBeASlaveIsOne) {
+    start("port-state 1 9\n");
+    EXPECT_EQ(client->ask(requests::portDataSet()).substr(2 * 64, 2), "09");
 }
 
 TEST_F(Simptp4l, AnswersAnUnknownIdWithNoSuchId) {

@@ -60,7 +60,7 @@ TEST(Simptp4lClock, DriftsWithTime) {
 }
 
 TEST(Simptp4lClock, JitterIsTheSameForTheSameSeed) {
-    const std::string script = "sync-interval 3600\njitter 1000000\nseed 5\n";
+    const std::string script = "sync-interval 3600\nsyncs-before-delay 0\njitter 1000000\nseed 5\n";
     const Session first(script);
     const Session second(script);
     EXPECT_EQ(offsetOf(first.status()), offsetOf(second.status()));
@@ -68,10 +68,11 @@ TEST(Simptp4lClock, JitterIsTheSameForTheSameSeed) {
 }
 
 TEST(Simptp4lClock, LosesTheGrandmasterAsPtp4lDoes) {
-    const Session session("offset 7\nclock fixed 5000\n"
+    const Session session("offset 7\nsyncs-before-delay 0\nclock fixed 5000\n"
                           "on PARENT_DATA_SET times 1 do gm off\n"
                           "on PARENT_DATA_SET after 1 do gm on\n");
     EXPECT_TRUE(hasGrandmaster(session.status()));
+    EXPECT_EQ(session.client.ask(requests::portDataSet()).substr(2 * 64, 2), "08");
     session.client.ask(requests::parentDataSet());
     const std::string lost = session.status();
     EXPECT_FALSE(hasGrandmaster(lost));
@@ -92,7 +93,7 @@ TEST(Simptp4lClock, ListensUntilAGrandmasterAppears) {
 }
 
 TEST(Simptp4lClock, StepsOffsetAndIngressTimeTogether) {
-    const Session session("offset 7\nclock fixed 5000\nsync-interval 3600\n"
+    const Session session("offset 7\nsyncs-before-delay 0\nclock fixed 5000\nsync-interval 3600\n"
                           "on TIME_STATUS_NP after 1 times 1 do clock-step -0.5\n");
     EXPECT_EQ(ingressOf(session.status()), 5000);
     const std::string stepped = session.status();

@@ -32,7 +32,7 @@ protected:
             .output;
     }
 
-    Daemon daemon{"clock fixed 1700000000123456789\noffset -1500\nsync-interval 3600\n"
+    Daemon daemon{"clock fixed 1700000000123456789\noffset -1500\nsyncs-before-delay 0\nsync-interval 3600\n"
                   "gm-identity 001B21FFFE0A0B0C\nclock-identity 0011223344556677\n",
                   {"v0", "v1x"},
                   "priority1 77\npriority2 88\nlogSyncInterval -3\n"};
@@ -101,7 +101,8 @@ std::string portDataSet(const std::string& port, const std::string& state) {
 }
 
 TEST_F(Simptp4lPmc, PrintsPortDataSetOfBothPorts) {
-    EXPECT_EQ(get("PORT_DATA_SET"), "sending: GET PORT_DATA_SET\n" + portDataSet("1", "SLAVE") +
+    EXPECT_EQ(get("PORT_DATA_SET"), "sending: GET PORT_DATA_SET\n" +
+                                        portDataSet("1", "UNCALIBRATED") +
                                         portDataSet("2", "MASTER"));
 }
 
@@ -121,7 +122,7 @@ TEST_F(Simptp4lPmc, PrintsPortPropertiesOfBothPorts) {
               "sending: GET PORT_PROPERTIES_NP\n"
               "\t001122.3344.556677-1 seq 0 RESPONSE MANAGEMENT PORT_PROPERTIES_NP \n"
               "\t\tportIdentity            001122.3344.556677-1\n"
-              "\t\tportState               SLAVE\n"
+              "\t\tportState               UNCALIBRATED\n"
               "\t\ttimestamping            HARDWARE\n"
               "\t\tinterface               v0\n"
               "\t001122.3344.556677-2 seq 0 RESPONSE MANAGEMENT PORT_PROPERTIES_NP \n"
