@@ -94,7 +94,8 @@ mount_private() {
     mkdir -p "$folder" /run/netns
 }
 
-# A private /tmp in which what was there still is: the command may be one of it.
+# A private /tmp in which what was there still is: the command may be one of it. Others of the
+# machine may remove theirs meanwhile.
 mount_private_tmp() {
     local entry
     mkdir -p /run/tmp
@@ -103,13 +104,13 @@ mount_private_tmp() {
     for entry in /run/tmp/* /run/tmp/.[!.]*; do
         [[ $entry == */quillEpochOffset ]] && continue
         if [[ -L $entry ]]; then
-            cp --no-dereference "$entry" /tmp/
+            cp --no-dereference "$entry" /tmp/ || [[ ! -L $entry ]]
         elif [[ -d $entry ]]; then
             mkdir "/tmp/${entry##*/}"
-            mount --rbind "$entry" "/tmp/${entry##*/}"
+            mount --rbind "$entry" "/tmp/${entry##*/}" || [[ ! -e $entry ]]
         elif [[ -f $entry ]]; then
             : >"/tmp/${entry##*/}"
-            mount --bind "$entry" "/tmp/${entry##*/}"
+            mount --bind "$entry" "/tmp/${entry##*/}" || [[ ! -e $entry ]]
         fi
     done
 }

@@ -1,5 +1,5 @@
 // The library as it is shipped, with linuxptp's ptp4l, in the scene of scripts/testbed.sh. Each
-// test takes a scene of its own.
+// test takes a scene of its own, with a grandmaster that is 5 ms ahead.
 
 #include <algorithm>
 #include <chrono>
@@ -53,11 +53,13 @@ protected:
 
     void SetUp() override {
         HostStatus status;
-        plugin.initialize(&slot, sceneConfiguration().c_str(), &status);
+        plugin.initialize(&slot, configuration().c_str(), &status);
         ASSERT_EQ(status.code, 0) << status.text();
         plugin.start(&slot, &status);
         ASSERT_EQ(status.code, 0) << status.text();
     }
+
+    virtual std::string configuration() const { return sceneConfiguration(); }
 
     bool waitForQuality(const std::string& reason, bool usable, std::size_t from = 0,
                         seconds deadline = seconds(30)) const {
@@ -118,6 +120,20 @@ protected:
     void* slot = nullptr;
 };
 
+/// Measures the delay to a neighbour, which the grandmaster does not.
+class RealDaemonWithPeerDelay : public RealDaemon {
+protected:
+    std::string configuration() const override {
+        Json changed = Json::parse(sceneConfiguration());
+        changed["delayMechanism"] = "P2P";
+        return changed.dump();
+    }
+};
+
+std::int64_t offsetOf(const RecordingHost::Call& pair) {
+    return static_cast<std::int64_t>(pair.localTime - pair.referenceTime);
+}
+
 /// pmc's "aabbcc.fffe.ddeeff" as the host gets it.
 std::string clockIdText(const std::string& text) {
     std::string id;
@@ -173,6 +189,59 @@ TEST_F(RealDaemon, GivesAPairForAtLeast95PercentOfTheSyncsIn30Seconds) {
     std::printf("%zu pairs of %ld Syncs\n", seen, syncs);
     EXPECT_GE(syncs, 200);
     EXPECT_GE(static_cast<double>(seen), 0.95 * static_cast<double>(syncs));
+}
+
+TEST_F(RealDaemon, OffsetIs0UntilADelayIsKnown) {
+    std::vector<RecordingHost::Call> pairs;
+    std::size_t before = 0;
+    const auto isKnown = [&] {
+        pairs = host.calls(Function::adjustTime);
+        before = static_cast<std::size_t>(
+            std::find_if(pairs.begin(), pairs.end(),
+                         [](const RecordingHost::Call& pair) { return offsetOf(pair) != 0; }) -
+            pairs.begin());
+        return before < pairs.size();
+    };
+    ASSERT_TRUE(waitUntil(isKnown));
+    std::printf("%zu pairs with offset 0\n", before);
+    EXPECT_NEAR(static_cast<double>(offsetOf(pairs[before])), -5e6, 1e6);
+}
+
+TEST_F(RealDaemonWithPeerDelay, GivesPairsOfOffset0AloneAndIsUsable) {
+    // Six seconds: longer than it ever takes until a delay is known.
+    ASSERT_TRUE(waitForPairs(48, seconds(30)));
+    for (const auto& pair : host.calls(Function::adjustTime)) {
+        EXPECT_EQ(offsetOf(pair), 0);
+    }
+    const auto quality = host.calls(Function::setTRQuality).back();
+    EXPECT_EQ(quality.text, roleHasChanged);
+    EXPECT_GT(quality.quality[0], 0);
+}
+
+TEST_F(RealDaemon, PortStaysUncalibratedWhileItFollows) {
+    ASSERT_TRUE(waitForPairs(48, seconds(30)));
+    const auto texts = host.calls(Function::updateMetaData);
+    EXPECT_EQ(Json::parse(texts.back().text)["Port1"]["portState"], "PTP_UNCALIBRATED");
+    for (const auto& metaData : texts) {
+        EXPECT_EQ(metaData.text.find("PTP_SLAVE"), std::string::npos);
+    }
+}
+
+TEST_F(RealDaemon, GrandmasterThatGoesGivesOnePairOf1970) {
+    ASSERT_TRUE(waitForPairs(8, seconds(30)));
+    const auto of1970 = [&] {
+        const auto pairs = host.calls(Function::adjustTime);
+        return std::count_if(pairs.begin(), pairs.end(), [](const RecordingHost::Call& pair) {
+            return pair.localTime == 0;
+        });
+    };
+    const std::size_t before = host.calls().size();
+    kill(grandmaster, SIGSTOP);
+    ASSERT_TRUE(waitForQuality(roleHasChanged, false, before));
+    EXPECT_TRUE(waitUntil([&] { return of1970() == 1; }));
+    const std::size_t polls = host.calls(Function::getTime).size();
+    EXPECT_TRUE(waitUntil([&] { return host.calls(Function::getTime).size() >= polls + 8; }));
+    EXPECT_EQ(of1970(), 1);
 }
 
 TEST_F(RealDaemon, MetadataEqualsWhatTheDaemonsOwnClientPrints) {
