@@ -4,6 +4,15 @@ namespace zekelVantel {
 
 // [oddity placeholder-name] $neighborPropDelayThreshold stands beside ptp4l's shorter
 // neighborPropDelayThresh: the placeholder carries the protocol's name of the parameter.
+//
+// [oddity stays-uncalibrated] With free_running 1 ptp4l never locks: the port that follows a
+// grandmaster stays UNCALIBRATED.
+//
+// [oddity follow-up-info] follow_up_info 1 beside transportSpecific 0 is written as asked for:
+// ptp4l up to 4.3 answers, and which one will read this is not known.
+//
+// [oddity read-only-socket] No uds_ro_address, which ptp4l's of one machine then share: those
+// before 4.0 refuse a file that has it.
 const char ptp4lConfigTemplate[] = R"template([global]
 #
 # Default Data Set

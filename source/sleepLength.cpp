@@ -3,6 +3,8 @@
 namespace zekelVantel {
 namespace {
 
+// [oddity passed-over-syncs] Whatever the interval of the Syncs: of more than 8 a second some are
+// passed over.
 constexpr std::uint32_t aimAfterSync = 128000;
 constexpr std::uint32_t shortestSleep = 16000;
 

@@ -124,6 +124,7 @@ void tPtp4lTimeRef::runPass(tHistory& history) {
         host_.setQuality(timeStatus.gmPresent == 0 ? tQuality::unusable : tQuality::usable,
                          roleHasChanged);
     }
+    // [oddity pair-of-1970] Also when it becomes 0, as it does when the grandmaster goes.
     if (timeStatus.ingressTime != history.timeStatus.ingressTime) {
         reportTimePair(timeStatus, history.epochOffset);
     }
@@ -147,6 +148,8 @@ void tPtp4lTimeRef::reportUnreachable(std::int32_t code) const {
     updateMetaData(tPtp4lMetaData());
 }
 
+// [oddity offset-of-before] Before ptp4l knows a delay, its offset is still the one of before;
+// nothing in its answers tells.
 void tPtp4lTimeRef::reportTimePair(const tTimeStatus& timeStatus, std::uint64_t& epochOffset) {
     drainEpochOffsets(epochOffset);
     const std::uint64_t offset = epochOffset + static_cast<std::uint64_t>(timeStatus.masterOffset);

@@ -231,9 +231,8 @@ TEST_F(RealDaemon, GrandmasterThatGoesGivesOnePairOf1970) {
     ASSERT_TRUE(waitForPairs(8, seconds(30)));
     const auto of1970 = [&] {
         const auto pairs = host.calls(Function::adjustTime);
-        return std::count_if(pairs.begin(), pairs.end(), [](const RecordingHost::Call& pair) {
-            return pair.localTime == 0;
-        });
+        return std::count_if(pairs.begin(), pairs.end(),
+                             [](const RecordingHost::Call& pair) { return pair.localTime == 0; });
     };
     const std::size_t before = host.calls().size();
     kill(grandmaster, SIGSTOP);

@@ -130,8 +130,8 @@ TEST_F(Simptp4l, StrictPaddingDropsAMessageLengthThatLeavesOutThePadding) {
 TEST_F(Simptp4l, StrictFollowUpInfoDropsWhatIsNotOfIeee8021As) {
     start("follow-up-info strict\n", "follow_up_info 1\n");
     ASSERT_TRUE(client->send(requests::timeStatus()));
-    EXPECT_TRUE(eventually(
-        [&] { return daemon->log().find("not of IEEE 802.1AS") != std::string::npos; }));
+    EXPECT_TRUE(
+        eventually([&] { return daemon->log().find("not of IEEE 802.1AS") != std::string::npos; }));
     EXPECT_TRUE(client->isQuiet());
     start("follow-up-info strict\n", "follow_up_info 1\ntransportSpecific 0x1\n");
     EXPECT_EQ(client->ask("1d" + requests::timeStatus().substr(2)).substr(0, 8), "1d020068");

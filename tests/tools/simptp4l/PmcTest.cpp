@@ -32,10 +32,11 @@ protected:
             .output;
     }
 
-    Daemon daemon{"clock fixed 1700000000123456789\noffset -1500\nsyncs-before-delay 0\nsync-interval 3600\n"
-                  "gm-identity 001B21FFFE0A0B0C\nclock-identity 0011223344556677\n",
-                  {"v0", "v1x"},
-                  "priority1 77\npriority2 88\nlogSyncInterval -3\n"};
+    Daemon daemon{
+        "clock fixed 1700000000123456789\noffset -1500\nsyncs-before-delay 0\nsync-interval 3600\n"
+        "gm-identity 001B21FFFE0A0B0C\nclock-identity 0011223344556677\n",
+        {"v0", "v1x"},
+        "priority1 77\npriority2 88\nlogSyncInterval -3\n"};
 };
 
 TEST_F(Simptp4lPmc, PrintsTimeStatusNp) {
