@@ -127,6 +127,7 @@ TEST_F(PollTest, DaemonThatTakesFollowUpInfoForIeee8021AsDropsTransportSpecific0
     session.start();
     ASSERT_TRUE(waitForLog(timedOut, 2));
     EXPECT_THAT(host.calls(Function::getTime), testing::IsEmpty());
+    ASSERT_TRUE(SimulatedDaemon::waitFor("request", 2));
     for (const auto& request : SimulatedDaemon::events("request")) {
         EXPECT_EQ(request.ignored, "not of IEEE 802.1AS");
     }

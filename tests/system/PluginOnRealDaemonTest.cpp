@@ -202,7 +202,7 @@ TEST_F(RealDaemon, OffsetIs0UntilADelayIsKnown) {
             pairs.begin());
         return before < pairs.size();
     };
-    ASSERT_TRUE(waitUntil(isKnown));
+    ASSERT_TRUE(waitUntil(isKnown, seconds(30)));
     std::printf("%zu pairs with offset 0\n", before);
     EXPECT_NEAR(static_cast<double>(offsetOf(pairs[before])), -5e6, 1e6);
 }
