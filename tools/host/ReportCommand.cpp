@@ -10,6 +10,7 @@
 
 #include <CLI/CLI.hpp>
 #include <fmt/format.h>
+#include <unistd.h>
 
 #include "RecordFile.h"
 #include "Report/Page.h"
@@ -34,19 +35,26 @@ Recording readRecording(const std::string& path) {
     return RecordingReader::read(file, path);
 }
 
+constexpr const char* standardOutput = "-";
+
+void writePage(const std::string& path, const std::string& page) {
+    const bool isFile = path != standardOutput;
+    const auto file = isFile ? std::make_unique<RecordFile>(path) : nullptr;
+    if (!writeAll(isFile ? file->descriptor() : STDOUT_FILENO, page)) {
+        throw std::runtime_error(fmt::format(
+            "cannot write {}: {}", isFile ? path : "the standard output", std::strerror(errno)));
+    }
+}
+
 /// The page is complete before the file is touched.
 int makeReport(const ReportOptions& options) {
     std::error_code ignored;
-    if (std::filesystem::equivalent(options.recording, options.page, ignored)) {
+    if (options.page != standardOutput &&
+        std::filesystem::equivalent(options.recording, options.page, ignored)) {
         throw UsageError("the page would replace the recording " + options.recording);
     }
     const auto name = std::filesystem::path(options.recording).filename().string();
-    const std::string page = reportPage(readRecording(options.recording), name);
-    const RecordFile file(options.page);
-    if (!writeAll(file.descriptor(), page)) {
-        throw std::runtime_error(
-            fmt::format("cannot write {}: {}", options.page, std::strerror(errno)));
-    }
+    writePage(options.page, reportPage(readRecording(options.recording), name));
     return exitClean;
 }
 
@@ -57,7 +65,9 @@ std::function<int()> prepareReport(CLI::App& command) {
     command.add_option("recording", options->recording, "What 'run --record' has written")
         ->type_name("FILE")
         ->required();
-    command.add_option("-o,--output", options->page, "The HTML page to write")
+    command
+        .add_option("-o,--output", options->page,
+                    "The HTML page to write; - is the standard output")
         ->type_name("FILE")
         ->required();
     return [options] { return makeReport(*options); };
