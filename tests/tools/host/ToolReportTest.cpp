@@ -48,21 +48,29 @@ public:
         return *this;
     }
 
+    /// With 3 ms from the ingress to the call.
+    Record& pair(double ingress, std::int64_t offset) {
+        const auto local = static_cast<std::uint64_t>((1000 + ingress) * 1e9);
+        const auto members = Json{
+            {"local", local},
+            {"reference", local - static_cast<std::uint64_t>(offset)},
+            {"offset", offset}}.dump();
+        return add("pair", ingress + 0.003, members.substr(1, members.size() - 2));
+    }
+
     Record& pairs(int number, double first) {
         for (int i = 0; i < number; ++i) {
-            const auto local = static_cast<std::uint64_t>((1000 + first + i * 0.125) * 1e9);
-            const auto offset = i * i - 20;
-            const auto members = Json{
-                {"local", local},
-                {"reference", local - static_cast<std::uint64_t>(offset)},
-                {"offset", offset}}.dump();
-            add("pair", first + i * 0.125 + 0.003, members.substr(1, members.size() - 2));
+            pair(first + i * 0.125, i * i - 20);
         }
         return *this;
     }
 
     std::string text;
 };
+
+std::string roleChange(const std::string& quality) {
+    return R"("quality":")" + quality + R"(","reason":"PTP role has changed.")";
+}
 
 /// A recording with everything, and with texts that are no harm as long as they are escaped.
 std::string wholeRecord() {
@@ -79,7 +87,7 @@ std::string wholeRecord() {
              R"("valid":true,"metadata":{"gmClockId":"a&b",
                 "Port1":{"portState":"PTP_SLAVE","interface":"\"; system('x')\nq"},
                 "Port2":{"portState":"PTP_MASTER","interface":"eth1"}})")
-        .add("quality", 1, R"("quality":"usable","reason":"PTP role has changed.")")
+        .add("quality", 1, roleChange("usable"))
         .pairs(6, 2)
         .pairs(12, 10)
         .add("error", 12, R"("operation":"<u>","problem":"it's broken")")
@@ -119,9 +127,9 @@ protected:
         }
     }
 
-    /// The drawing of this name in a page.
+    /// The drawing of this name in a page, as wide screens show it.
     static std::string drawing(const std::string& html, const std::string& name) {
-        const auto begin = html.find("<g id=\"" + name + "\"");
+        const auto begin = html.find("<g id=\"" + name + "_wide\"");
         return begin == std::string::npos ? ""
                                           : html.substr(begin, html.find("</svg>", begin) - begin);
     }
@@ -147,8 +155,9 @@ TEST_F(ToolReportDrawingTest, HasEverySection) {
           "Poll delay", "Quality", "Port states", "Errors", "Last metadata", "Settings"}) {
         EXPECT_THAT(html, HasSubstr("<h2>" + std::string(title) + "</h2>"));
     }
-    EXPECT_EQ(count(html, "<svg role=\"img\""), 7U);
-    EXPECT_EQ(count(html, "<title>"), 8U);
+    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"wide\""), 7U);
+    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"narrow\""), 7U);
+    EXPECT_EQ(count(html, "<title>"), 15U);
     EXPECT_THAT(html, HasSubstr("<tr><td>Time pairs</td><td>18</td></tr>"));
     EXPECT_THAT(html, HasSubstr("<tr><td>Quality usable</td><td>12 s (92.3 %)</td></tr>"));
     EXPECT_THAT(html, Not(HasSubstr("class=\"note\"")));
@@ -170,8 +179,9 @@ TEST_F(ToolReportDrawingTest, AllanDeviationHasAPointForEachOctave) {
 
 TEST_F(ToolReportDrawingTest, TimeLinesHaveABarForEachState) {
     const auto html = pageOf(wholeRecord());
-    EXPECT_EQ(count(drawing(html, "quality"), "<polygon"), 2U);
-    EXPECT_EQ(count(drawing(html, "ports"), "<polygon"), 3U);
+    // One more shades the outage.
+    EXPECT_EQ(count(drawing(html, "quality"), "<polygon"), 3U);
+    EXPECT_EQ(count(drawing(html, "ports"), "<polygon"), 4U);
     EXPECT_THAT(drawing(html, "ports"), HasSubstr("Port2 eth1"));
 }
 
@@ -220,8 +230,8 @@ TEST_F(ToolReportDrawingTest, ABrowserShowsAllOfIt) {
                  "--user-data-dir=" + folder.path("browser"), "--dump-dom", "file://" + page});
     ASSERT_EQ(child.wait(), 0) << child.errors();
     EXPECT_EQ(count(child.output(), "<section>"), 11U);
-    EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 7U);
-    EXPECT_EQ(count(child.output(), "</svg>"), 7U);
+    EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 14U);
+    EXPECT_EQ(count(child.output(), "</svg>"), 14U);
 }
 
 TEST_F(ToolReportDrawingTest, OnePairAloneIsEnough) {
@@ -240,11 +250,104 @@ TEST_F(ToolReportDrawingTest, ExtremeOffsetsAreDrawn) {
     EXPECT_NE(drawing(html, "histogram"), "");
 }
 
-TEST_F(ToolReportDrawingTest, ManyPairsAreThinnedOut) {
+TEST_F(ToolReportDrawingTest, ManyPairsAreBandsWithTheirMedian) {
     const auto html = pageOf(Record().pairs(20000, 1).text);
-    EXPECT_THAT(html, HasSubstr("the lowest and the highest value of each of 1500"));
-    EXPECT_LE(count(pathOf(drawing(html, "offset")), "L"), 3000U);
-    EXPECT_GE(count(pathOf(drawing(html, "offset")), "L"), 1500U);
+    EXPECT_THAT(html, HasSubstr("For each of 300 stretches of time: the median (line)"));
+    const auto bands = drawing(html, "offset");
+    EXPECT_EQ(count(bands, "fill-opacity = '0.300000'"), 1U);
+    EXPECT_EQ(count(bands, "fill-opacity = '0.500000'"), 1U);
+    EXPECT_LE(count(pathOf(bands), "L"), 599U);
+    EXPECT_GE(count(pathOf(bands), "L"), 500U);
+}
+
+TEST_F(ToolReportDrawingTest, PairsThatAreNoMeasurementsAreNamedAndLeftOut) {
+    const auto html =
+        pageOf(Record()
+                   .add("quality", 1, roleChange("usable"))
+                   .pair(1, 0)
+                   .pair(2, 0)
+                   .pair(3, -4999940)
+                   .pair(4, -4999950)
+                   .add("quality", 5, roleChange("unusable"))
+                   .add("pair", 5, R"("reference":4999950,"local":0,"offset":-4999950)")
+                   .add("quality", 7, roleChange("usable"))
+                   .pair(7, -4999950)
+                   .pair(8, -4999960)
+                   .text);
+    EXPECT_THAT(html,
+                HasSubstr("<tr><td>Time pairs</td><td>7, 1 of 1970, 3 with a false offset</td>"));
+    EXPECT_THAT(html, HasSubstr("Left out: 1 pair of 1970. A grandmaster went,"));
+    EXPECT_THAT(html, HasSubstr("Left out: 3 pairs with a false offset. A grandmaster came,"));
+    EXPECT_THAT(html, HasSubstr("<dt>max</dt><dd>-4999940 ns</dd>"));
+    EXPECT_THAT(html, HasSubstr("<dt>max</dt><dd>4 s</dd>"));
+    EXPECT_THAT(html, HasSubstr("<dt>max</dt><dd>3000000 ns</dd>"));
+    EXPECT_THAT(html, Not(HasSubstr("delayMechanism")));
+}
+
+TEST_F(ToolReportDrawingTest, OnlyOffsetsOfZeroAreAskedFor) {
+    Record record;
+    record.add("quality", 1, roleChange("usable"));
+    for (int i = 1; i <= 54; ++i) {
+        record.pair(i, 0);
+    }
+    const auto html = pageOf(record.text);
+    EXPECT_THAT(html, HasSubstr("<p class=\"note\">offset exactly 0 in 54 of 54 pairs: no delay is "
+                                "measured: delayMechanism?</p>"));
+    EXPECT_THAT(html, HasSubstr("No offset is a measurement."));
+    EXPECT_THAT(html, HasSubstr("<h2>Pair intervals</h2>"));
+    EXPECT_THAT(html, Not(HasSubstr("<h2>Allan deviation</h2>")));
+}
+
+TEST_F(ToolReportDrawingTest, ASpikeIsMarkedAtTheEdgeAndDoesNotFlattenTheOthers) {
+    Record record;
+    for (int i = 0; i < 400; ++i) {
+        record.pair(1 + i * 0.125, i == 200 ? 5000000 : 100 + i % 7);
+    }
+    const auto html = pageOf(record.text);
+    EXPECT_THAT(html, HasSubstr("Above the edge: 1, up to 5 ms."));
+    EXPECT_THAT(drawing(html, "offset"), HasSubstr("offset in ns"));
+    EXPECT_EQ(count(drawing(html, "offset"), "color='rgb(217,  72,  15)'"), 1U);
+}
+
+TEST_F(ToolReportDrawingTest, NanosecondsAreSeenBehindAnEpochOffset) {
+    Record record;
+    record.add("epoch-offset", 0.5, R"("offset":-37000000000)");
+    for (int i = 0; i < 100; ++i) {
+        record.pair(1 + i * 0.125, -36999999750 + i % 7);
+    }
+    const auto html = pageOf(record.text);
+    EXPECT_THAT(html, HasSubstr("0 on the axis stands for -36999999750 ns."));
+    EXPECT_THAT(html, HasSubstr("<dt>max</dt><dd>-36999999744 ns</dd>"));
+    EXPECT_THAT(drawing(html, "offset"), HasSubstr("<text>offset in ns</text>"));
+    EXPECT_THAT(drawing(html, "histogram"), HasSubstr("<text>offset in ns</text>"));
+}
+
+TEST_F(ToolReportDrawingTest, AxesHaveTheTimeOfDayAndOutagesAreShaded) {
+    const auto offset = drawing(pageOf(wholeRecord()), "offset");
+    EXPECT_THAT(offset, AllOf(HasSubstr(">UTC, from 1970-01-01<"), HasSubstr(">00:16:44<"),
+                              HasSubstr(">time since the host's start in s<")));
+    EXPECT_EQ(count(offset, "fill = 'rgb(224, 142,  11)'"), 1U);
+}
+
+TEST_F(ToolReportDrawingTest, NarrowScreensHaveDrawingsWhoseTextTheyCanRead) {
+    // A phone of 390 pixels leaves 358 to a drawing: no text gets less than 13 * 358 / 350.
+    const auto html = pageOf(wholeRecord());
+    const std::regex drawings(R"(class="narrow"[^>]*viewBox="0 0 350 )");
+    EXPECT_EQ(std::distance(std::sregex_iterator(html.begin(), html.end(), drawings), {}), 7);
+    EXPECT_EQ(count(html, "font-size=\""), count(html, "font-size=\"13.00\""));
+}
+
+TEST_F(ToolReportDrawingTest, TheSameRecordGivesTheSamePage) {
+    const auto first = pageOf(wholeRecord());
+    EXPECT_EQ(pageOf(wholeRecord()), first);
+}
+
+TEST_F(ToolReportDrawingTest, ADashIsTheStandardOutput) {
+    const auto html = pageOf(wholeRecord());
+    const auto result = report({recording, "-o", "-"});
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.errors, "");
+    EXPECT_EQ(result.output, html);
 }
 
 TEST_F(ToolReportTest, AnEmptyRecordingGivesAPageThatSaysSo) {
@@ -290,6 +393,11 @@ TEST_F(ToolReportTest, WhatCannotBeReadOrWrittenIsNamed) {
     const auto full = report({recording, "-o", "/dev/full"});
     EXPECT_EQ(full.status, 1);
     EXPECT_EQ(full.errors, "vantel-host: cannot write /dev/full: No space left on device\n");
+    Child child(
+        {"/bin/sh", "-c", R"(exec "$0" report "$1" -o - >/dev/full)", HOST_TOOL, recording});
+    EXPECT_EQ(child.wait(), 1);
+    EXPECT_EQ(child.errors(),
+              "vantel-host: cannot write the standard output: No space left on device\n");
 }
 
 TEST_F(ToolReportTest, TheRecordingIsNotReplacedByItsPage) {

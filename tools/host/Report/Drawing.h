@@ -3,9 +3,10 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
 #include <string>
 
-#include "Report/Units.h"
+#include "Report/Canvas.h"
 
 namespace vantelhost {
 
@@ -15,16 +16,11 @@ struct Caption {
     std::string title; ///< for those who do not see it
 };
 
-constexpr double drawingWidth = 960; ///< pixels
-
 /// @param height   pixels
-/// @param commands what gnuplot draws; no part of them may come from a stranger.
-/// @return HTML
+/// @param commands what gnuplot draws on a canvas; no part of them may come from a stranger.
+/// @return HTML: the drawing on every canvas
 /// Throws std::runtime_error.
-std::string draw(const Caption& caption, std::size_t height, const std::string& commands);
-
-/// The commands for the axis that all drawings over time have.
-/// @param duration seconds
-std::string timeAxis(double duration, const Unit& unit);
+std::string draw(const Caption& caption, std::size_t height,
+                 const std::function<std::string(const Canvas&)>& commands);
 
 } // namespace vantelhost

@@ -8,10 +8,35 @@ namespace vantelhost {
 
 namespace {
 
+/// The word, which may be broken only where its parts end. Short ones stay whole.
+std::string breakable(std::string_view word) {
+    constexpr std::size_t shortest = 24;
+    if (word.size() < shortest) {
+        return escaped(word);
+    }
+    std::string html;
+    while (!word.empty()) {
+        const auto end = word.find_first_of("/,:_");
+        const auto part = word.substr(0, end == std::string_view::npos ? end : end + 1);
+        word.remove_prefix(part.size());
+        html += escaped(part) + (word.empty() ? "" : "<wbr />");
+    }
+    return html;
+}
+
+std::string cellText(std::string_view text) {
+    std::string html;
+    for (auto end = text.find(' '); end != std::string_view::npos; end = text.find(' ')) {
+        html += breakable(text.substr(0, end)) + " ";
+        text.remove_prefix(end + 1);
+    }
+    return html + breakable(text);
+}
+
 std::string row(const Row& cells, const char* tag) {
     std::string html = "<tr>";
     for (const auto& cell : cells) {
-        html += fmt::format("<{0}>{1}</{0}>", tag, escaped(cell));
+        html += fmt::format("<{0}>{1}</{0}>", tag, cellText(cell));
     }
     return html + "</tr>\n";
 }
@@ -66,6 +91,14 @@ std::string table(const Row& head, const std::vector<Row>& rows) {
         html += row(each, "td");
     }
     return html + "</tbody>\n</table></div>\n";
+}
+
+std::string definitions(const std::vector<std::pair<std::string, std::string>>& texts) {
+    std::string html = "<dl>\n";
+    for (const auto& [name, text] : texts) {
+        html += fmt::format("<div><dt>{}</dt><dd>{}</dd></div>\n", escaped(name), escaped(text));
+    }
+    return html + "</dl>\n";
 }
 
 } // namespace vantelhost

@@ -4,6 +4,7 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 namespace vantelhost {
@@ -23,5 +24,8 @@ using Row = std::vector<std::string>;
 /// @param head the texts of the heading; may be empty
 /// @param rows the texts of the cells
 std::string table(const Row& head, const std::vector<Row>& rows);
+
+/// Short texts, each below its name, side by side as far as there is space.
+std::string definitions(const std::vector<std::pair<std::string, std::string>>& texts);
 
 } // namespace vantelhost

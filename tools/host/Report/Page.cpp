@@ -29,7 +29,21 @@ std::string notes(const Recording& recording) {
     if (!recording.summarised) {
         html += note("The recording has no summary: the host still ran, or was killed.");
     }
+    if (recording.counts.onlyZeros()) {
+        html += note(onlyZerosText(recording.counts));
+    }
     return html;
+}
+
+std::string pairCount(const PairCounts& counts) {
+    std::string text = fmt::format("{}", counts.all());
+    if (counts.of1970 > 0) {
+        text += fmt::format(", {} of 1970", counts.of1970);
+    }
+    if (counts.falseOffsets > 0) {
+        text += fmt::format(", {} with a false offset", counts.falseOffsets);
+    }
+    return text;
 }
 
 std::string pairRate(const std::vector<Pair>& pairs) {
@@ -49,7 +63,7 @@ std::string summarySection(const Recording& recording) {
         {"Duration", shownDuration(recording.duration)},
         {"Plug-in", recording.plugIn + ", " + recording.plugInFile},
         {"End", recording.stopCause.empty() ? "not recorded" : recording.stopCause},
-        {"Time pairs", fmt::format("{}", recording.pairs.size())},
+        {"Time pairs", pairCount(recording.counts)},
         {"Rate of pairs", pairRate(recording.pairs)},
         {"Quality usable", fmt::format("{} ({:.1f} %)", shownDuration(usable), share)},
         {"Changes of quality", fmt::format("{}", recording.qualities.count())},
@@ -109,8 +123,11 @@ std::string portTable(const Json& metadata) {
 
 std::string sections(const Recording& recording) {
     std::string html = summarySection(recording);
-    html += recording.pairs.empty() ? section("Offset", paragraph("There are no time pairs."))
-                                    : pairSections(recording);
+    html += recording.pairs.empty()
+                ? section("Offset",
+                          paragraph(recording.counts.all() == 0 ? "There are no time pairs."
+                                                                : "No pair is a measurement."))
+                : pairSections(recording);
     html += stateSections(recording);
     if (recording.metadata.is_object()) {
         html += section("Last metadata",

@@ -2,13 +2,14 @@
 
 #include <algorithm>
 #include <iterator>
+#include <utility>
 
 #include <fmt/format.h>
 
 #include "Report/AllanDeviation.h"
-#include "Report/Decimation.h"
 #include "Report/Figure.h"
 #include "Report/Html.h"
+#include "Report/SeriesFigure.h"
 #include "Report/Statistics.h"
 #include "Report/Units.h"
 #include "Tally.h"
@@ -16,8 +17,6 @@
 namespace vantelhost {
 
 namespace {
-
-constexpr std::size_t bins = 1500; ///< of time, two points each
 
 /// One value for each pair, at the time of its call.
 template <typename Value>
@@ -68,35 +67,102 @@ PhaseSeries phaseOf(const std::vector<Pair>& pairs) {
     return onGrid(times, offsets);
 }
 
-std::string series(const Caption& caption, const std::vector<Point>& points, double duration,
-                   double interval) {
-    const double gap = std::max(5 * interval, 3 * duration / static_cast<double>(bins));
-    const std::string note =
-        points.size() <= 2 * bins
-            ? ""
-            : paragraph(fmt::format("Drawn are the lowest and the highest value of each of {} "
-                                    "equal stretches of time.",
-                                    bins));
-    return seriesFigure(caption, decimate(points, bins), duration, gap) + note;
+std::string pairsText(std::size_t count) {
+    return fmt::format("{} pair{}", count, count == 1 ? "" : "s");
+}
+
+/// What an axis of this extent is counted from; empty if that is 0.
+std::string baseText(const Extent& extent) {
+    const double base = baseOf(extent);
+    return base == 0 ? "" : fmt::format(" 0 on the axis stands for {:.0f} ns.", base);
+}
+
+/// What a reader of the drawing must know.
+std::string howItIsDrawn(const std::vector<std::int64_t>& sorted, const Extent& range) {
+    std::string text = "Shaded: the quality was not usable." + baseText(range);
+    if (areBands(sorted.size())) {
+        text += fmt::format(" For each of {} stretches of time: the median (line), 25 to 75 % of "
+                            "the values (dark), 1 to 99 % (light), the lowest and the highest "
+                            "(strokes).",
+                            bandStretches);
+    }
+    const auto isBefore = [](std::int64_t value, double edge) {
+        return static_cast<double>(value) < edge;
+    };
+    const auto isBeyond = [](double edge, std::int64_t value) {
+        return edge < static_cast<double>(value);
+    };
+    const auto below = std::lower_bound(sorted.begin(), sorted.end(), range.low, isBefore);
+    const auto above = std::upper_bound(sorted.begin(), sorted.end(), range.high, isBeyond);
+    if (above != sorted.end()) {
+        text += fmt::format(" Above the edge: {}, up to {}.", sorted.end() - above,
+                            shownTime(static_cast<double>(sorted.back())));
+    }
+    if (below != sorted.begin()) {
+        text += fmt::format(" Below the edge: {}, down to {}.", below - sorted.begin(),
+                            shownTime(static_cast<double>(sorted.front())));
+    }
+    return paragraph(text);
 }
 
 /// Figures of values that ascend, in nanoseconds.
-std::string figures(const std::vector<std::int64_t>& sorted) {
+/// @param range where nearly all are
+std::string figures(const std::vector<std::int64_t>& sorted, const Extent& range) {
+    const bool isExact = baseOf(range) != 0;
+    const auto shown = [&](double value) {
+        return isExact ? fmt::format("{:.0f} ns", value) : shownTime(value);
+    };
     OffsetStatistics statistics;
     for (const auto value : sorted) {
         statistics.add(value);
     }
     const auto at = [&](unsigned perMille) {
-        return shownTime(static_cast<double>(percentile(sorted, perMille)));
+        return shown(static_cast<double>(percentile(sorted, perMille)));
     };
-    return table({"min", "1 %", "5 %", "median", "95 %", "99 %", "max", "mean", "rms"},
-                 {{at(0), at(10), at(50), at(500), at(950), at(990), at(1000),
-                   shownTime(statistics.mean()), shownTime(statistics.rms())}});
+    return definitions({{"min", at(0)},
+                        {"1 %", at(10)},
+                        {"5 %", at(50)},
+                        {"median", at(500)},
+                        {"95 %", at(950)},
+                        {"99 %", at(990)},
+                        {"max", at(1000)},
+                        {"mean", shown(statistics.mean())},
+                        {"rms", shown(statistics.rms())}});
+}
+
+/// A drawing of values over time, and their figures.
+/// @param sorted   the same values, ascending
+/// @param interval about the time from one to the next, seconds
+std::string series(const Caption& caption, std::vector<Point> points,
+                   const std::vector<std::int64_t>& sorted, const Recording& recording,
+                   double interval) {
+    const auto range = bulk(sorted);
+    const double gap = std::max(5 * interval, recording.duration / 500);
+    return seriesFigure(caption, {std::move(points), range, gap}, TimeAxis(recording)) +
+           howItIsDrawn(sorted, range) + figures(sorted, range);
+}
+
+/// What the figures below are not made of; empty if that is nothing.
+std::string leftOut(const PairCounts& counts) {
+    std::string html;
+    if (counts.of1970 > 0) {
+        html += paragraph(fmt::format("Left out: {} of 1970. A grandmaster went, no Sync is behind "
+                                      "it.",
+                                      pairsText(counts.of1970)));
+    }
+    if (counts.measured > 0 && counts.falseOffsets > 0) {
+        html += paragraph(fmt::format("Left out: {} with a false offset. A grandmaster came, and "
+                                      "no delay was measured yet.",
+                                      pairsText(counts.falseOffsets)));
+    }
+    return html;
 }
 
 std::string histogramSection(const std::vector<std::int64_t>& offsets) {
     const auto bars = histogram(offsets, 60);
-    std::string text = fmt::format("Each bar is {} wide.", shownTime(bars.width));
+    const double end = bars.low + bars.width * static_cast<double>(bars.counts.size());
+    std::string text =
+        fmt::format("Each bar is {} wide.", shownTime(bars.width)) + baseText({bars.low, end});
     if (bars.below + bars.above > 0) {
         text += fmt::format(" Further away: {} pairs to the left, {} to the right.", bars.below,
                             bars.above);
@@ -144,39 +210,45 @@ std::string intervalSection(const Recording& recording, const PhaseSeries& phase
         return section("Pair intervals", paragraph("There is one pair only."));
     }
     std::vector<Point> points;
+    points.reserve(intervals.size());
     for (std::size_t i = 0; i < intervals.size(); ++i) {
         points.push_back({recording.pairs[i + 1].seconds, static_cast<double>(intervals[i])});
     }
     std::sort(intervals.begin(), intervals.end());
     return section("Pair intervals",
                    paragraph("From the ingress of a pair's Sync to that of the next pair's.") +
-                       series({"interval", "Intervals of pairs over time"}, points,
-                              recording.duration, phase.interval) +
-                       figures(intervals));
+                       series({"interval", "Intervals of pairs over time"}, std::move(points),
+                              intervals, recording, phase.interval));
+}
+
+std::string delaySection(const Recording& recording, const PhaseSeries& phase) {
+    return section(
+        "Poll delay",
+        paragraph("From the ingress of the Sync to the call, in the host's clock (CLOCK_REALTIME). "
+                  "If ptp4l stamps with another clock, what is between the two is in it.") +
+            series({"delay", "Poll delay over time"}, pointsOf(recording.pairs, delayOf),
+                   sortedValues(recording.pairs, delayOf), recording, phase.interval));
+}
+
+std::string offsetSections(const Recording& recording, const PhaseSeries& phase) {
+    const auto offsets = sortedValues(recording.pairs, offsetOf);
+    return section("Offset",
+                   paragraph("Local minus reference time, at the time of the call.") +
+                       leftOut(recording.counts) +
+                       series({"offset", "Offset over time"}, pointsOf(recording.pairs, offsetOf),
+                              offsets, recording, phase.interval)) +
+           histogramSection(offsets) + deviationSection(phase);
 }
 
 } // namespace
 
 std::string pairSections(const Recording& recording) {
-    const auto& pairs = recording.pairs;
-    const auto phase = phaseOf(pairs);
-    const auto offsets = sortedValues(pairs, offsetOf);
-    std::string html =
-        section("Offset", paragraph("Local minus reference time, at the time of the call.") +
-                              series({"offset", "Offset over time"}, pointsOf(pairs, offsetOf),
-                                     recording.duration, phase.interval) +
-                              figures(offsets));
-    html += histogramSection(offsets);
-    html += deviationSection(phase);
-    html += intervalSection(recording, phase);
-    html += section(
-        "Poll delay",
-        paragraph("From the ingress of the Sync to the call, in the host's clock (CLOCK_REALTIME). "
-                  "If ptp4l stamps with another clock, what is between the two is in it.") +
-            series({"delay", "Poll delay over time"}, pointsOf(pairs, delayOf), recording.duration,
-                   phase.interval) +
-            figures(sortedValues(pairs, delayOf)));
-    return html;
+    const auto phase = phaseOf(recording.pairs);
+    const auto& counts = recording.counts;
+    return (counts.onlyZeros()
+                ? section("Offset", paragraph("No offset is a measurement.") + leftOut(counts))
+                : offsetSections(recording, phase)) +
+           intervalSection(recording, phase) + delaySection(recording, phase);
 }
 
 } // namespace vantelhost

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "Json.h"
+#include "PairFilter.h"
 
 namespace vantelhost {
 
@@ -80,7 +81,8 @@ struct Recording {
     std::string plugIn;      ///< its name; empty when it was not loaded
     std::string plugInFile;
     std::string stopCause; ///< empty when the host was not stopped
-    std::vector<Pair> pairs;
+    PairCounts counts;
+    std::vector<Pair> pairs;        ///< the measured ones; with only zeros, those of offset 0
     First<QualityChange> qualities; ///< only what differs from the one before
     First<PortChange> portChanges;
     First<Problem> problems;

@@ -107,15 +107,26 @@ void RecordingReader::takeMoment(const Json& line) {
 }
 
 void RecordingReader::takePair(const Json& line) {
-    const auto ingress =
-        line.at("local").get<std::uint64_t>() - static_cast<std::uint64_t>(recording_.epochOffset);
+    const auto local = line.at("local").get<std::uint64_t>();
+    const auto offset = line.at("offset").get<std::int64_t>();
+    const auto ingress = local - static_cast<std::uint64_t>(recording_.epochOffset);
     const auto delay = static_cast<std::int64_t>(line.at("time").get<std::uint64_t>() - ingress);
-    recording_.pairs.push_back({seconds_, ingress, line.at("offset").get<std::int64_t>(), delay});
+    const bool onlyZerosBefore = recording_.counts.onlyZeros();
+    const auto kind = filter_.pair(local, offset);
+    recording_.counts = filter_.counts();
+    if (onlyZerosBefore && kind == PairKind::measured) {
+        recording_.pairs.clear();
+    }
+    if (kind == PairKind::measured ||
+        (kind == PairKind::falseOffset && recording_.counts.onlyZeros())) {
+        recording_.pairs.push_back({seconds_, ingress, offset, delay});
+    }
 }
 
 void RecordingReader::takeQuality(const Json& line) {
     const QualityChange change{seconds_, line.at("quality").get<std::string>(),
                                line.at("reason").get<std::string>()};
+    filter_.quality(change.quality, change.reason);
     if (lastQuality_ != std::pair(change.quality, change.reason)) {
         recording_.qualities.add(change);
         lastQuality_ = {change.quality, change.reason};
@@ -173,6 +184,7 @@ void RecordingReader::takeOther(const std::string& event, const Json& line) {
     } else if (event == "epoch-offset") {
         ++recording_.epochOffsets;
         recording_.epochOffset = line.at("offset").get<std::int64_t>();
+        filter_.epochOffset(recording_.epochOffset);
     } else if (event == "chrony") {
         recording_.chrony = ChronyCount{line.at("sent").get<std::uint64_t>(),
                                         line.at("failed").get<std::uint64_t>()};

@@ -6,6 +6,7 @@
 #include <string>
 #include <utility>
 
+#include "PairFilter.h"
 #include "Report/Recording.h"
 
 namespace vantelhost {
@@ -30,6 +31,7 @@ private:
     void takeOther(const std::string& event, const Json& line);
 
     Recording recording_;
+    PairFilter filter_;
     double seconds_ = 0;                              ///< of the present line
     std::pair<std::string, std::string> lastQuality_; ///< with its reason
     std::map<std::string, std::string> portStates_;

@@ -30,12 +30,12 @@ std::string cappedTable(const Row& head, std::vector<Row> rows, std::size_t coun
 }
 
 /// @param fullSince when changes began to be counted only
-std::string timeLineParts(const Caption& caption, const TimeLine& timeLine, double duration,
+std::string timeLineParts(const Caption& caption, const TimeLine& timeLine, const TimeAxis& axis,
                           std::optional<double> fullSince) {
     if (timeLine.rows.size() > mostRows) {
         return paragraph("Too many rows for a drawing.");
     }
-    std::string html = timeLineFigure(caption, timeLine, duration) + timeLineLegend(timeLine);
+    std::string html = timeLineFigure(caption, timeLine, axis) + timeLineLegend(timeLine);
     if (fullSince) {
         html +=
             note(fmt::format("Too many changes: the drawing ends after {}.", atSecond(*fullSince)));
@@ -56,7 +56,7 @@ std::string qualitySection(const Recording& recording) {
                         changes[i].quality, changes[i].reason});
     }
     return section("Quality", timeLineParts({"quality", "Quality over time"}, timeLine,
-                                            recording.duration, recording.qualities.fullSince()) +
+                                            TimeAxis(recording), recording.qualities.fullSince()) +
                                   cappedTable({"at", "for", "quality", "reason"}, rows,
                                               recording.qualities.count()));
 }
@@ -72,7 +72,7 @@ std::string portSection(const Recording& recording) {
                         change.state.empty() ? "not reported any more" : change.state});
     }
     return section("Port states",
-                   timeLineParts({"ports", "Port states over time"}, timeLine, recording.duration,
+                   timeLineParts({"ports", "Port states over time"}, timeLine, TimeAxis(recording),
                                  recording.portChanges.fullSince()) +
                        cappedTable({"at", "port", "state"}, rows, recording.portChanges.count()));
 }

@@ -5,9 +5,6 @@
 
 namespace vantelhost {
 
-namespace {
-
-/// The next of 1, 2, 5, 10, 20 ... that is not smaller.
 double roundWidth(double width) {
     double power = 1;
     while (power * 10 <= width) {
@@ -21,22 +18,26 @@ double roundWidth(double width) {
     return 10 * power;
 }
 
-} // namespace
+Extent bulk(const std::vector<std::int64_t>& sorted) {
+    constexpr std::size_t few = 3;
+    const auto count = sorted.size();
+    const auto first = static_cast<double>(sorted.front());
+    const auto last = static_cast<double>(sorted.back());
+    const auto out = std::max(count / 1000, std::min(few, count / 10));
+    const auto low = static_cast<double>(sorted[out]);
+    const auto high = static_cast<double>(sorted[count - 1 - out]);
+    const double margin = std::max((high - low) / 4, 10.0);
+    return {std::max(first, low - margin), std::min(last, high + margin)};
+}
 
-std::int64_t percentile(const std::vector<std::int64_t>& sorted, unsigned perMille) {
-    const std::size_t rank = (perMille * sorted.size() + 999) / 1000;
-    return sorted[rank == 0 ? 0 : rank - 1];
+double baseOf(const Extent& extent) {
+    constexpr double shownParts = 1e4;
+    const double largest = std::max(std::abs(extent.low), std::abs(extent.high));
+    return (extent.high - extent.low) * shownParts < largest ? std::floor(extent.low) : 0;
 }
 
 Histogram histogram(const std::vector<std::int64_t>& sorted, std::size_t bins) {
-    const auto first = static_cast<double>(sorted.front());
-    const auto last = static_cast<double>(sorted.back());
-    const auto left = static_cast<double>(percentile(sorted, 10));
-    const auto right = static_cast<double>(percentile(sorted, 990));
-    const double margin = (right - left) / 2;
-    const double low = margin > 0 ? std::max(first, left - margin) : first;
-    const double high = margin > 0 ? std::min(last, right + margin) : last;
-
+    const auto [low, high] = bulk(sorted);
     Histogram result;
     result.width = roundWidth((high - low) / static_cast<double>(bins));
     result.low = std::floor(low / result.width) * result.width;

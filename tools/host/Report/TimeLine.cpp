@@ -64,6 +64,22 @@ TimeLine portTimeLine(const Recording& recording) {
     return timeLine;
 }
 
+std::vector<Span> outages(const Recording& recording) {
+    std::vector<Span> result;
+    const auto qualities = qualityTimeLine(recording);
+    for (const auto& span : qualities.spans) {
+        if (qualities.rows[span.row] == "usable") {
+            continue;
+        }
+        if (!result.empty() && result.back().end == span.begin) {
+            result.back().end = span.end;
+        } else {
+            result.push_back({0, span.begin, span.end, ""});
+        }
+    }
+    return result;
+}
+
 std::vector<std::string> labelsOf(const TimeLine& timeLine) {
     std::vector<std::string> labels;
     for (const auto& span : timeLine.spans) {

@@ -29,6 +29,9 @@ TimeLine qualityTimeLine(const Recording& recording);
 /// A row for each port; the label is its state.
 TimeLine portTimeLine(const Recording& recording);
 
+/// When the quality was not usable. The label is empty, the row 0.
+std::vector<Span> outages(const Recording& recording);
+
 /// The labels, each once, in the order of the spans.
 std::vector<std::string> labelsOf(const TimeLine& timeLine);
 

@@ -7,15 +7,14 @@
 #include <fmt/format.h>
 
 #include "Report/Html.h"
-#include "Report/Units.h"
 
 namespace vantelhost {
 
 namespace {
 
-/// Without what gnuplot could take for the end of a text; cut to what the margin takes.
+/// Without what gnuplot could take for the end of a text; cut to what a narrow drawing takes.
 std::string rowName(const std::string& name) {
-    constexpr std::size_t longest = 18;
+    constexpr std::size_t longest = 30;
     std::string plain = name.substr(0, longest);
     for (auto& character : plain) {
         const bool allowed = (character >= '0' && character <= '9') ||
@@ -40,7 +39,7 @@ constexpr std::array<Colour, 14> colours{{
     {"unusable: Unable to communicate with PTP sub process while attempting to retrieve time data",
      0xE08E0B},
     {"PTP_SLAVE", 0x2A9D4A},
-    {"PTP_MASTER", 0x2B6CB0},
+    {"PTP_MASTER", 0x3B7DD8},
     {"PTP_UNCALIBRATED", 0xE08E0B},
     {"PTP_LISTENING", 0x9AA0A6},
     {"PTP_FAULTY", 0xC0392B},
@@ -65,30 +64,29 @@ unsigned colourOf(const std::vector<std::string>& labels, const std::string& lab
 
 } // namespace
 
-std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, double duration) {
-    const auto unit = unitForDuration(duration);
+std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, const TimeAxis& axis) {
     const auto labels = labelsOf(timeLine);
-    const double narrowest = duration / drawingWidth;
     const auto count = timeLine.rows.size();
-    std::string data;
-    for (const auto& span : timeLine.spans) {
-        const auto y = static_cast<double>(count - span.row);
-        const double begin = span.begin * 1e9 / unit.size;
-        const double end = std::max(span.end, span.begin + narrowest) * 1e9 / unit.size;
-        data += fmt::format("{0:.9g} {1} {0:.9g} {2:.9g} {3} {4} {5}\n", begin, y, end, y - 0.35,
-                            y + 0.35, colourOf(labels, span.label));
-    }
-    std::string rows;
+    std::string names;
     for (std::size_t row = 0; row < count; ++row) {
-        rows += fmt::format("{}\"{}\" {}", row == 0 ? "" : ", ", rowName(timeLine.rows[row]),
-                            count - row);
+        names += fmt::format("set label \"{}\" at graph 0, first {}.3 left offset 0.5,0\n",
+                             rowName(timeLine.rows[row]), count - row);
     }
-    return draw(caption, 90 + 30 * count,
-                timeAxis(duration, unit) +
-                    fmt::format("set yrange [0.4:{}.6]\nset ytics ({})\n$data << END\n{}END\n"
-                                "plot $data using 1:2:3:4:5:6:7 with boxxyerror lc rgb variable "
-                                "fill solid noborder\n",
-                                count, rows, data));
+    return draw(caption, 140 + 36 * count, [&](const Canvas& canvas) {
+        std::string data;
+        for (const auto& span : timeLine.spans) {
+            const auto y = static_cast<double>(count - span.row);
+            const double begin = axis.at(span.begin);
+            const double end = axis.at(std::max(span.end, span.begin + axis.pixel(canvas)));
+            data += fmt::format("{0:.9g} {1} {0:.9g} {2:.9g} {3} {4} {5}\n", begin, y, end, y - 0.4,
+                                y + 0.05, colourOf(labels, span.label));
+        }
+        return axis.commands(canvas) + names +
+               fmt::format("set yrange [0.5:{}.6]\nunset ytics\n$data << END\n{}END\n"
+                           "plot $data using 1:2:3:4:5:6:7 with boxxyerror lc rgb variable "
+                           "fill solid noborder\n",
+                           count, data);
+    });
 }
 
 std::string timeLineLegend(const TimeLine& timeLine) {

@@ -5,12 +5,12 @@
 #include <string>
 
 #include "Report/Drawing.h"
+#include "Report/TimeAxis.h"
 #include "Report/TimeLine.h"
 
 namespace vantelhost {
 
-/// @param duration of the axis, seconds
-std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, double duration);
+std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, const TimeAxis& axis);
 
 /// What the colours of a time line mean, as HTML.
 std::string timeLineLegend(const TimeLine& timeLine);

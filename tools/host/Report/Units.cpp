@@ -36,13 +36,22 @@ std::string shownDuration(double seconds) {
     return fmt::format("{:.3g} {}", seconds * 1e9 / unit.size, unit.name);
 }
 
-std::string shownMoment(unsigned long long nanoseconds) {
-    const auto seconds = static_cast<std::time_t>(nanoseconds / 1000000000U);
+std::string shownDate(std::int64_t seconds) {
+    const std::time_t time = seconds;
     std::tm parts{};
-    ::gmtime_r(&seconds, &parts);
+    ::gmtime_r(&time, &parts);
     std::array<char, 64> text{};
-    std::strftime(text.data(), text.size(), "%Y-%m-%d %H:%M:%S UTC", &parts);
+    std::strftime(text.data(), text.size(), "%Y-%m-%d", &parts);
     return text.data();
+}
+
+std::string shownTimeOfDay(std::int64_t seconds) {
+    return fmt::format("{:02}:{:02}:{:02}", seconds / 3600 % 24, seconds / 60 % 60, seconds % 60);
+}
+
+std::string shownMoment(unsigned long long nanoseconds) {
+    const auto seconds = static_cast<std::int64_t>(nanoseconds / 1000000000U);
+    return shownDate(seconds) + " " + shownTimeOfDay(seconds) + " UTC";
 }
 
 } // namespace vantelhost

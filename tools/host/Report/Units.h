@@ -2,6 +2,7 @@
 /// Times as people read them.
 #pragma once
 
+#include <cstdint>
 #include <string>
 
 namespace vantelhost {
@@ -23,6 +24,14 @@ std::string shownTime(double nanoseconds);
 
 /// The duration in its unit, with three digits.
 std::string shownDuration(double seconds);
+
+/// The date in UTC: YYYY-MM-DD.
+/// @param seconds since 1970
+std::string shownDate(std::int64_t seconds);
+
+/// The time of day in UTC: HH:MM:SS.
+/// @param seconds since 1970
+std::string shownTimeOfDay(std::int64_t seconds);
 
 /// The moment in UTC, to the second.
 /// @param nanoseconds since 1970

@@ -19,6 +19,19 @@ TEST(Html, CellsOfATableAreEscaped) {
               "<tr><td>&gt;</td></tr>\n<tr><td>&amp;</td></tr>\n</tbody>\n</table></div>\n");
 }
 
+TEST(Html, ALongWordMayBreakWhereItsPartsEnd) {
+    EXPECT_EQ(table({}, {{"shorter_than_24_letters a/b, /usr/lib/aarch64-linux-gnu/libx_y.so"}}),
+              "<div class=\"table\"><table>\n<tbody>\n<tr><td>shorter_than_24_letters a/b, "
+              "/<wbr />usr/<wbr />lib/<wbr />aarch64-linux-gnu/<wbr />libx_<wbr />y.so</td></tr>\n"
+              "</tbody>\n</table></div>\n");
+}
+
+TEST(Html, DefinitionsAreEscaped) {
+    EXPECT_EQ(definitions({{"<", ">"}, {"a", "b"}}),
+              "<dl>\n<div><dt>&lt;</dt><dd>&gt;</dd></div>\n<div><dt>a</dt><dd>b</dd></div>\n"
+              "</dl>\n");
+}
+
 TEST(Units, TimesHaveTheUnitOfTheirSize) {
     EXPECT_EQ(shownTime(0), "0 ns");
     EXPECT_EQ(shownTime(-9999), "-9999 ns");

@@ -71,6 +71,35 @@ TEST(RecordingReader, DelayIsFromTheIngressWithoutTheEpochOffset) {
     EXPECT_EQ(recording.pairs[1].delay, 200000000);
 }
 
+TEST(RecordingReader, PairsThatAreNoMeasurementsAreCountedOnly) {
+    const std::string usable = R"("quality":"usable","reason":"PTP role has changed.")";
+    const std::string unusable = R"("quality":"unusable","reason":"PTP role has changed.")";
+    const auto recording =
+        read(line("quality", 1, usable) +
+             line("pair", 1, R"("reference":1001000000000,"local":1001000000000,"offset":0)") +
+             line("pair", 2, R"("reference":1001999999993,"local":1002000000000,"offset":7)") +
+             line("quality", 3, unusable) +
+             line("pair", 3, R"("reference":18446744073709551609,"local":0,"offset":7)") +
+             line("quality", 4, usable) +
+             line("pair", 4, R"("reference":1003999999993,"local":1004000000000,"offset":7)") +
+             line("pair", 5, R"("reference":1004999999992,"local":1005000000000,"offset":8)"));
+    ASSERT_EQ(recording.pairs.size(), 2U);
+    EXPECT_EQ(recording.pairs[0].offset, 7);
+    EXPECT_EQ(recording.pairs[1].offset, 8);
+    EXPECT_EQ(recording.counts.measured, 2U);
+    EXPECT_EQ(recording.counts.of1970, 1U);
+    EXPECT_EQ(recording.counts.falseOffsets, 2U);
+}
+
+TEST(RecordingReader, WithOnlyZerosTheTimesOfPairsAreKept) {
+    const auto recording =
+        read(line("pair", 1, R"("reference":1001000000000,"local":1001000000000,"offset":0)") +
+             line("pair", 2, R"("reference":0,"local":0,"offset":0)") +
+             line("pair", 3, R"("reference":1003000000000,"local":1003000000000,"offset":0)"));
+    EXPECT_EQ(recording.pairs.size(), 2U);
+    EXPECT_TRUE(recording.counts.onlyZeros());
+}
+
 TEST(RecordingReader, QualityThatIsRepeatedIsNoChange) {
     const std::string good = R"("quality":"usable","reason":"a")";
     const auto recording = read(line("quality", 1, good) + line("quality", 2, good) +

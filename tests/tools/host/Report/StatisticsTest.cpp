@@ -39,6 +39,51 @@ TEST(Percentile, OfHundredValuesIsTheirNumber) {
     EXPECT_EQ(percentile(values, 990), 99);
 }
 
+TEST(Bulk, ASpikeOfThreeValuesDoesNotCount) {
+    auto values = range(0, 399);
+    values.insert(values.end(), {5000000, 6000000, 7000000});
+    const auto bulkOf = bulk(values);
+    EXPECT_EQ(bulkOf.low, 0);
+    EXPECT_EQ(bulkOf.high, 498);
+}
+
+TEST(Bulk, IsAQuarterWiderThanTheThousandthPartsAtTheEnds) {
+    auto values = range(-100000, 100000);
+    values.insert(values.begin(), 100, -1000000000);
+    values.insert(values.end(), 100, 1000000000);
+    const auto bulkOf = bulk(values);
+    EXPECT_EQ(bulkOf.low, -149850);
+    EXPECT_EQ(bulkOf.high, 149850);
+}
+
+TEST(Bulk, ReachesNoFurtherThanTheValues) {
+    const auto bulkOf = bulk(range(-7, 92));
+    EXPECT_EQ(bulkOf.low, -7);
+    EXPECT_EQ(bulkOf.high, 92);
+}
+
+TEST(Bulk, OfFewValuesIsAll) {
+    const auto bulkOf = bulk({1, 2, 3, 4, 5, 6, 7, 8, 1000000});
+    EXPECT_EQ(bulkOf.low, 1);
+    EXPECT_EQ(bulkOf.high, 1000000);
+}
+
+TEST(Bulk, OfEqualValuesAndASpikeIsWhatIsEqual) {
+    std::vector<std::int64_t> values(20, 250);
+    values.push_back(1000000);
+    const auto bulkOf = bulk(values);
+    EXPECT_EQ(bulkOf.low, 250);
+    EXPECT_EQ(bulkOf.high, 260);
+}
+
+TEST(Base, IsTakenAwayWhereDigitsWouldNotTellValuesApart) {
+    EXPECT_EQ(baseOf({-36999999839, -36999999662}), -36999999839);
+    EXPECT_EQ(baseOf({124999990.5, 125000010}), 124999990);
+    EXPECT_EQ(baseOf({124000000, 126000000}), 0);
+    EXPECT_EQ(baseOf({-200, 300}), 0);
+    EXPECT_EQ(baseOf({0, 0}), 0);
+}
+
 TEST(Histogram, CountsEveryValueOnce) {
     const auto result = histogram({-3, -1, 0, 0, 2, 5}, 9);
     EXPECT_EQ(result.low, -3);
@@ -65,7 +110,7 @@ TEST(Histogram, FewValuesFarAwayAreOnlyCounted) {
     EXPECT_EQ(result.below, 1U);
     EXPECT_EQ(result.above, 2U);
     EXPECT_EQ(result.width, 50);
-    EXPECT_EQ(result.low, -500);
+    EXPECT_EQ(result.low, -250);
 }
 
 TEST(Histogram, OfEqualValuesIsOneBin) {
@@ -74,12 +119,12 @@ TEST(Histogram, OfEqualValuesIsOneBin) {
     EXPECT_THAT(result.counts, ElementsAre(3));
 }
 
-TEST(Histogram, OfEqualValuesButOneReachesThatOne) {
+TEST(Histogram, OfEqualValuesButOneIsOneBin) {
     std::vector<std::int64_t> values(1000, 0);
     values.push_back(100);
     const auto result = histogram(values, 10);
     EXPECT_EQ(result.counts.front(), 1000U);
-    EXPECT_EQ(result.counts.back(), 1U);
+    EXPECT_EQ(result.above, 1U);
 }
 
 TEST(Histogram, TakesTheWholeRangeOfOffsets) {

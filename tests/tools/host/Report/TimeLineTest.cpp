@@ -53,7 +53,18 @@ TEST(TimeLine, EndsWhereChangesWereOnlyCounted) {
     EXPECT_EQ(qualityTimeLine(recording).spans.back().end, 5000);
 }
 
+TEST(TimeLine, NeighboursThatAreNotUsableAreOneOutage) {
+    Recording recording;
+    recording.duration = 10;
+    recording.qualities.add({1, "unusable", "a"});
+    recording.qualities.add({2, "other", "b"});
+    recording.qualities.add({4, "usable", "c"});
+    recording.qualities.add({7, "unusable", "a"});
+    EXPECT_THAT(outages(recording), ElementsAre(Span{0, 1, 4, ""}, Span{0, 7, 10, ""}));
+}
+
 TEST(TimeLine, OfNothingIsEmpty) {
     EXPECT_TRUE(qualityTimeLine({}).spans.empty());
+    EXPECT_TRUE(outages({}).empty());
     EXPECT_TRUE(portTimeLine({}).rows.empty());
 }
