@@ -9,6 +9,14 @@ cd "$(dirname "$0")/.."
 preset=${1:-release}
 options=("${@:2}")
 case $preset in
+  --help)
+    sed -n '2,/^set /s/^# \{0,1\}//p' "$0"
+    exit 0
+    ;;
+  -*)
+    sed -n 's/^#   /usage: /p' "$0" >&2
+    exit 2
+    ;;
   armhf) groups=(armhf) ;;
   clang | fuzz) groups=(tests checks) ;;
   *) groups=(tests) ;;

@@ -74,7 +74,7 @@ if [[ $(id -u) -ne 0 ]]; then
       echo "  dpkg --add-architecture armhf" >&2
     fi
     echo "  apt-get update" >&2
-    echo "  apt-get install ${missing[*]}" >&2
+    echo "  apt-get install --no-install-recommends ${missing[*]}" >&2
     exit 1
   fi
   as_root=(sudo -n env)
@@ -95,6 +95,6 @@ apt install -y --no-install-recommends "${missing[@]}" || true
 find_missing
 if [[ ${#missing[@]} -gt 0 ]]; then
   echo "setup: still missing: ${missing[*]}. Look at apt-get's messages above, then run" \
-    "'apt-get install ${missing[*]}'" >&2
+    "'apt-get install --no-install-recommends ${missing[*]}'" >&2
   exit 1
 fi
