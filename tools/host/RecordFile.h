@@ -5,7 +5,8 @@
 
 namespace vantelhost {
 
-/// A new, empty file to write a record to; closed with this object.
+/// A new, empty file to write to; closed with this object. A regular file is nobody else's
+/// RecordFile at the same time.
 class RecordFile {
 public:
     /// Throws UsageError.
