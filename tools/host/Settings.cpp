@@ -1,7 +1,9 @@
 #include "Settings.h"
 
 #include <algorithm>
+#include <map>
 #include <set>
+#include <sstream>
 
 #include <fmt/format.h>
 #include <strings.h>
@@ -13,6 +15,12 @@ namespace vantelhost {
 namespace {
 
 constexpr char interfaceKey[] = "interface";
+
+/// The line of the octet before which `count` others stand.
+std::size_t lineAt(const std::string& text, std::size_t count) {
+    const auto end = text.begin() + static_cast<std::ptrdiff_t>(std::min(count, text.size()));
+    return static_cast<std::size_t>(std::count(text.begin(), end, '\n')) + 1;
+}
 
 /// Gathers the settings of all sources, then sorts them out by the schema.
 class Completion {
@@ -36,28 +44,41 @@ public:
 private:
     void error(const std::string& key, const std::string& problem) {
         if (bad_.insert(key).second) {
-            settings_.errors.push_back(fmt::format("{}: {}", key, problem));
+            settings_.errors.push_back(fmt::format("{}{}: {}", placeOf(key), key, problem));
         }
+    }
+
+    /// File and line of a key's value; empty when it is not from the file.
+    std::string placeOf(const std::string& key) const {
+        const auto line = lines_.find(key);
+        return line == lines_.end() ? "" : fmt::format("{}:{}: ", user_.textName, line->second);
     }
 
     /// @return false when the text has no settings to go on with.
     bool readText(const std::string& text) {
-        std::set<std::string> seen;
-        const auto watchKeys = [&](int depth, Json::parse_event_t event, Json& key) {
-            if (event == Json::parse_event_t::key && depth == 1 &&
-                !seen.insert(key.get<std::string>()).second) {
-                error(key.get<std::string>(), "is given twice");
+        std::istringstream stream(text);
+        const auto line = [&] {
+            return lineAt(text, text.size() - static_cast<std::size_t>(stream.rdbuf()->in_avail()));
+        };
+        const auto watchKeys = [&](int depth, Json::parse_event_t event, Json& value) {
+            if (event == Json::parse_event_t::key && depth == 1) {
+                const auto key = value.get<std::string>();
+                if (!lines_.insert_or_assign(key, line()).second) {
+                    error(key, "is given twice");
+                }
             }
             return true;
         };
         try {
-            given_ = Json::parse(text, watchKeys);
+            given_ = Json::parse(stream, watchKeys);
         } catch (const Json::exception& failure) {
-            error("configuration", failure.what());
+            settings_.errors.push_back(
+                fmt::format("{}:{}: {}", user_.textName, line(), failure.what()));
             return false;
         }
         if (!given_.is_object()) {
-            error("configuration", "must be a JSON object, not " + shown(given_));
+            settings_.errors.push_back(
+                fmt::format("{}:1: must be a JSON object, not {}", user_.textName, shown(given_)));
         }
         return given_.is_object();
     }
@@ -70,6 +91,7 @@ private:
             return;
         }
         const std::string value = assignment.substr(equals + 1);
+        lines_.erase(key);
         if (!isUtf8(assignment)) {
             error(toAscii(key), "is not UTF-8 text");
         } else if (key == interfaceKey) {
@@ -86,6 +108,7 @@ private:
         if (!std::all_of(user_.interfaces.begin(), user_.interfaces.end(), isUtf8)) {
             error(interfaceKey, "is not UTF-8 text");
         } else if (!user_.interfaces.empty()) {
+            lines_.erase(interfaceKey);
             given_[interfaceKey] = user_.interfaces;
         }
     }
@@ -123,7 +146,8 @@ private:
                 continue;
             }
             settings_.warnings.push_back(
-                fmt::format("{}: is unknown to the plug-in{}, passed on as it is", key, hint(key)));
+                fmt::format("{}{}: is unknown to the plug-in{}, passed on as it is", placeOf(key),
+                            key, hint(key)));
             settings_.values[key] = value;
         }
     }
@@ -140,6 +164,7 @@ private:
     const Schema& schema_;
     const UserSettings& user_;
     Json given_ = Json::object();
+    std::map<std::string, std::size_t> lines_; ///< in the text, of the keys whose value is from it
     std::set<std::string> bad_;
     Settings settings_;
 };

@@ -14,6 +14,7 @@ namespace vantelhost {
 /// What the user gave. Later sources win: text, assignments, interfaces.
 struct UserSettings {
     std::optional<std::string> text;      ///< a JSON object
+    std::string textName;                 ///< the file that it is from
     std::vector<std::string> assignments; ///< each "key=value"
     std::vector<std::string> interfaces;
     bool interfacesRequired = true;
@@ -21,7 +22,7 @@ struct UserSettings {
 
 struct Settings {
     Json values = Json::object();      ///< complete: the schema's keys, "interface", then the rest
-    std::vector<std::string> errors;   ///< one line per bad key, beginning with the key
+    std::vector<std::string> errors;   ///< one per bad key, with file and line if it is from a file
     std::vector<std::string> warnings; ///< the same for keys that the schema does not know
 };
 

@@ -16,6 +16,8 @@ namespace vantelhost {
 
 namespace {
 
+constexpr char standardInput[] = "the standard input";
+
 [[noreturn]] void refuse(const std::string& name) {
     throw UsageError(fmt::format("cannot read {}: {}", name, std::strerror(errno)));
 }
@@ -58,7 +60,7 @@ std::optional<std::string> readConfig(const SettingsOptions& options) {
         return std::nullopt;
     }
     if (name == "-") {
-        return readAll(std::cin, "the standard input");
+        return readAll(std::cin, standardInput);
     }
     std::ifstream file(name, std::ios::binary);
     if (!file) {
@@ -68,7 +70,8 @@ std::optional<std::string> readConfig(const SettingsOptions& options) {
 }
 
 UserSettings userSettings(const SettingsOptions& options, std::optional<std::string> configText) {
-    return {std::move(configText), options.assignments, options.interfaces, !options.noInterfaces};
+    return {std::move(configText), options.configFile == "-" ? standardInput : options.configFile,
+            options.assignments, options.interfaces, !options.noInterfaces};
 }
 
 } // namespace vantelhost

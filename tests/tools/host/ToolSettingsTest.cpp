@@ -42,33 +42,57 @@ TEST_F(ToolTest, BadSettingsNameTheirKeyAndNothingIsInitialised) {
         const char* complaint;
     };
     for (const auto& row : {
-             Row{R"({"count":101})", "vantel-host: count: 101 is out of range, -5 to 100"},
-             Row{R"({"count":-6})", "vantel-host: count: -6 is out of range"},
-             Row{R"({"wide":4294967296})", "vantel-host: wide: 4294967296 is out of range"},
-             Row{R"({"wide":-1})", "vantel-host: wide: -1 is out of range"},
-             Row{R"({"wide":99999999999999999999999})", "vantel-host: wide: must be an integer"},
-             Row{R"({"count":"7"})", "vantel-host: count: must be an integer, not \"7\""},
-             Row{R"({"count":1.5})", "vantel-host: count: must be an integer, not 1.5"},
-             Row{R"({"count":null})", "vantel-host: count: must be an integer, not null"},
-             Row{R"({"count":[1]})", "vantel-host: count: must be an integer, not [1]"},
-             Row{R"({"twoStep":1})", "vantel-host: twoStep: must be true or false, not 1"},
-             Row{R"({"twoStep":"true"})", "vantel-host: twoStep: must be true or false"},
-             Row{R"({"script":5})", "vantel-host: script: must be a string, not 5"},
-             Row{R"({"script":"a\u0000b"})", "vantel-host: script: must not contain"},
-             Row{R"({"count":1,"count":2})", "vantel-host: count: is given twice"},
-             Row{R"({"interface":"eth0"})", "vantel-host: interface: must be an array of names"},
-             Row{R"({"interface":[]})", "vantel-host: interface: must name at least one"},
-             Row{R"({"interface":[7]})", "vantel-host: interface: must be an array of names"},
+             Row{R"({"count":101})",
+                 "vantel-host: the standard input:1: count: 101 is out of range, -5 to 100"},
+             Row{R"({"count":-6})", "vantel-host: the standard input:1: count: -6 is out of range"},
+             Row{R"({"wide":4294967296})",
+                 "vantel-host: the standard input:1: wide: 4294967296 is out of range"},
+             Row{R"({"wide":-1})", "vantel-host: the standard input:1: wide: -1 is out of range"},
+             Row{R"({"wide":99999999999999999999999})",
+                 "vantel-host: the standard input:1: wide: must be an integer"},
+             Row{R"({"count":"7"})",
+                 "vantel-host: the standard input:1: count: must be an integer, not \"7\""},
+             Row{R"({"count":1.5})",
+                 "vantel-host: the standard input:1: count: must be an integer, not 1.5"},
+             Row{R"({"count":null})",
+                 "vantel-host: the standard input:1: count: must be an integer, not null"},
+             Row{R"({"count":[1]})",
+                 "vantel-host: the standard input:1: count: must be an integer, not [1]"},
+             Row{R"({"twoStep":1})",
+                 "vantel-host: the standard input:1: twoStep: must be true or false, not 1"},
+             Row{R"({"twoStep":"true"})",
+                 "vantel-host: the standard input:1: twoStep: must be true or false"},
+             Row{R"({"script":5})",
+                 "vantel-host: the standard input:1: script: must be a string, not 5"},
+             Row{R"({"script":"a\u0000b"})",
+                 "vantel-host: the standard input:1: script: must not contain"},
+             Row{R"({"count":1,"count":2})",
+                 "vantel-host: the standard input:1: count: is given twice"},
+             Row{R"({"interface":"eth0"})",
+                 "vantel-host: the standard input:1: interface: must be an array of names"},
+             Row{R"({"interface":[]})",
+                 "vantel-host: the standard input:1: interface: must name at least one"},
+             Row{R"({"interface":[7]})",
+                 "vantel-host: the standard input:1: interface: must be an array of names"},
              Row{R"({})", "vantel-host: interface: is missing"},
-             Row{R"([])", "vantel-host: configuration: must be a JSON object"},
-             Row{R"({"count":)", "vantel-host: configuration: "},
-             Row{"", "vantel-host: configuration: "},
+             Row{R"([])", "vantel-host: the standard input:1: must be a JSON object"},
+             Row{R"({"count":)", "vantel-host: the standard input:1: "},
+             Row{"", "vantel-host: the standard input:1: "},
          }) {
         const auto result = run({"--config", "-", "--seconds", "0"}, row.setting);
         EXPECT_EQ(result.status, 2) << row.setting;
         EXPECT_THAT(result.errors, HasSubstr(row.complaint)) << row.setting;
         EXPECT_THAT(record(), IsEmpty()) << row.setting;
     }
+}
+
+TEST_F(ToolTest, BadSettingsOfAFileNameFileAndLine) {
+    const std::string path = folder.path("a.json");
+    writeFile(path, "{\n \"interface\": [\"a\"],\n \"count\": 101\n}");
+    EXPECT_THAT(run({"--config", path}).errors,
+                HasSubstr("vantel-host: " + path + ":3: count: 101 is out of range"));
+    writeFile(path, "{\n \"count\": \n}");
+    EXPECT_THAT(run({"--config", path}).errors, HasSubstr("vantel-host: " + path + ":3: "));
 }
 
 TEST_F(ToolTest, BadAssignmentsNameTheirKey) {
@@ -108,9 +132,12 @@ TEST_F(ToolTest, UnknownKeysAreWarnedOfAndPassedOn) {
     const auto result = run({"--config", "-", "--seconds", "0"},
                             R"({"interface":["a"],"other":{"x":[1]},"TwoStep":true})");
     EXPECT_EQ(result.status, 0);
-    EXPECT_THAT(result.errors, HasSubstr("vantel-host: warning: other: is unknown"));
     EXPECT_THAT(result.errors,
-                HasSubstr("warning: TwoStep: is unknown to the plug-in (\"twoStep\""));
+                HasSubstr("vantel-host: warning: the standard input:1: other: is unknown"));
+    EXPECT_THAT(
+        result.errors,
+        HasSubstr(
+            "warning: the standard input:1: TwoStep: is unknown to the plug-in (\"twoStep\""));
     EXPECT_EQ(configuration()["other"].dump(), R"({"x":[1]})");
     EXPECT_EQ(configuration()["twoStep"], false);
 }
