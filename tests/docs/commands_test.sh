@@ -65,7 +65,6 @@ run_all() {
 
 # What the machine must provide, and Debian's does not.
 prepare_scene() {
-  mkdir -p /var/run/morwen/ClockHub
   ip link set bc0 down
   ip link set bc0 name eth0
   ip link set eth0 up

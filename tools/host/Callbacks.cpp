@@ -1,5 +1,7 @@
 #include "Callbacks.h"
 
+#include <utility>
+
 #include <fmt/format.h>
 
 #include "HostStatus.h"
@@ -13,8 +15,10 @@ std::atomic<Callbacks*> activeCallbacks{nullptr};
 
 } // namespace
 
-Callbacks::Callbacks(Journal& journal, bool refuseWhileStopping)
-    : journal_(journal), refuseWhileStopping_(refuseWhileStopping) {
+Callbacks::Callbacks(Journal& journal, bool refuseWhileStopping, std::function<bool()> endsBySignal)
+    : journal_(journal),
+      refuseWhileStopping_(refuseWhileStopping),
+      endsBySignal_(std::move(endsBySignal)) {
     activeCallbacks = this;
 }
 
@@ -44,13 +48,13 @@ void Callbacks::setTRQuality(void** context, const double* quality, const char* 
                              zeerr_Status* status) {
     const bool hasData = quality != nullptr && reason != nullptr;
     if (accepts(context, hasData, "zekel_setTRQuality", status)) {
-        journal_.quality(quality, reason);
+        journal_.quality(quality, reason, endsBySignal_());
     }
 }
 
 void Callbacks::updateMetaData(void** context, const char* metadataJson, zeerr_Status* status) {
     if (accepts(context, metadataJson != nullptr, "zekel_updateMetaData", status)) {
-        journal_.metadata(metadataJson);
+        journal_.metadata(metadataJson, endsBySignal_());
     }
 }
 

@@ -3,6 +3,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <functional>
 
 #include <vantel_bc/status.h>
 
@@ -18,7 +19,11 @@ namespace vantelhost {
 class Callbacks {
 public:
     /// @param refuseWhileStopping answer ZEKEL_HOST_IS_STOPPING once stopping has begun.
-    Callbacks(Journal& journal, bool refuseWhileStopping);
+    /// @param endsBySignal        whether a signal ends the run: what is told of quality and
+    ///                            metadata then is expected. Called from any thread.
+    Callbacks(
+        Journal& journal, bool refuseWhileStopping,
+        std::function<bool()> endsBySignal = [] { return false; });
     ~Callbacks();
     Callbacks(const Callbacks&) = delete;
     Callbacks& operator=(const Callbacks&) = delete;
@@ -44,6 +49,7 @@ private:
 
     Journal& journal_;
     const bool refuseWhileStopping_;
+    const std::function<bool()> endsBySignal_;
     std::atomic<bool> stopping_{false};
     void* slot_ = nullptr;
 };

@@ -49,6 +49,15 @@ std::string statusSummary(const Json& object) {
     return summary;
 }
 
+std::string endText(const ChildEnd& end) {
+    if (!end.bySignal) {
+        return fmt::format("ended with status {}", end.status);
+    }
+    const char* const name = ::sigabbrev_np(end.status);
+    return name == nullptr ? fmt::format("was ended by signal {}", end.status)
+                           : fmt::format("was ended by SIG{}", name);
+}
+
 std::string offsetSummary(const Tally& tally) {
     if (tally.offsets.count == 0) {
         return "no offsets";
@@ -148,6 +157,33 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
     return {"chrony",
             std::move(text),
             {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
+}
+
+Event folderEvent(const std::string& path) {
+    return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
+}
+
+Event expectedEvent(const Event& event) {
+    Json members{{"call", event.name}};
+    members.update(event.members);
+    return {"expected", fmt::format("{} {}", event.name, event.text), std::move(members)};
+}
+
+Event daemonEndedEvent(const ChildEnd& end, const std::deque<std::string>& words) {
+    std::string text = fmt::format("ptp4l, process {}, {}", end.pid, endText(end));
+    text += words.empty() ? ", without a word"
+                          : fmt::format("; its last words: {}", fmt::join(words, " / "));
+    return {"daemon-ended",
+            std::move(text),
+            {{"pid", end.pid}, {end.bySignal ? "signal" : "status", end.status}, {"words", words}}};
+}
+
+Event causeEvent(const std::string& cause) {
+    return {"cause", cause, Json{{"text", cause}}};
+}
+
+Event mendEvent(const std::string& mend) {
+    return {"mend", mend, Json{{"text", mend}}};
 }
 
 Event stoppingEvent(const std::string& cause) {

@@ -3,9 +3,11 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
 #include <string>
 
 #include "Json.h"
+#include "Signals.h"
 #include "Tally.h"
 
 namespace vantelhost {
@@ -44,6 +46,21 @@ Event refusedEvent(const std::string& function);
 /// Whether chronyd takes the time pairs, and how many it took.
 /// @param problem why it does not; empty when it does.
 Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem);
+
+/// The host made a folder that was missing.
+Event folderEvent(const std::string& path);
+
+/// A quality or metadata event that came after a signal had ended the run: ptp4l, which gets the
+/// terminal's signals too, may have ended before it is stopped.
+Event expectedEvent(const Event& event);
+
+/// ptp4l has ended unasked.
+/// @param words its last lines
+Event daemonEndedEvent(const ChildEnd& end, const std::deque<std::string>& words);
+
+/// Why the run failed, and what to do about it.
+Event causeEvent(const std::string& cause);
+Event mendEvent(const std::string& mend);
 
 Event stoppingEvent(const std::string& cause);
 Event stoppedEvent();

@@ -1,5 +1,6 @@
 #include "Journal.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <system_error>
 #include <utility>
@@ -15,14 +16,14 @@ std::int64_t difference(std::uint64_t local, std::uint64_t reference) {
 
 } // namespace
 
-Journal::Journal(EventSink output, std::function<void()> onLostOutput,
+Journal::Journal(EventSink output, std::function<void(const std::string&)> onLostOutput,
                  Moment::Clock::time_point begin)
     : begin_(begin) {
     outputs_.push_back({"output", std::move(output), std::move(onLostOutput), false});
 }
 
 void Journal::addOutput(const std::string& name, EventSink output) {
-    outputs_.push_back({name, std::move(output), [] {}, false});
+    outputs_.push_back({name, std::move(output), [](const std::string&) {}, false});
 }
 
 void Journal::handPairsTo(PairTaker taker) {
@@ -40,13 +41,18 @@ void Journal::error(const Event& event) {
     print(event);
 }
 
-void Journal::quality(const double* quality, const std::string& reason) {
+void Journal::quality(const double* quality, const std::string& reason, bool expected) {
     const Event event = qualityEvent(quality, reason);
     const std::lock_guard lock(mutex_);
+    if (expected) {
+        print(expectedEvent(event));
+        return;
+    }
     if (event.text != lastQuality_) {
         ++tally_.qualityChanges;
         lastQuality_ = event.text;
     }
+    tally_.wasUsable = tally_.wasUsable || event.members["quality"] == "usable";
     print(event);
 }
 
@@ -64,7 +70,7 @@ void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     }
 }
 
-void Journal::metadata(const std::string& text) {
+void Journal::metadata(const std::string& text, bool expected) {
     const Json metadata = Json::parse(text, nullptr, false);
     if (!metadata.is_object()) {
         error(invalidMetadataEvent(text));
@@ -72,7 +78,13 @@ void Journal::metadata(const std::string& text) {
     }
     const Event event = metadataEvent(metadata);
     const std::lock_guard lock(mutex_);
+    if (expected) {
+        print(expectedEvent(event));
+        return;
+    }
     ++tally_.metadataUpdates;
+    tally_.hasPorts = std::any_of(metadata.begin(), metadata.end(),
+                                  [](const Json& member) { return member.is_object(); });
     print(event);
 }
 
@@ -110,9 +122,10 @@ void Journal::pass(const Event& event, const Moment& moment) {
     std::vector<Event> losses;
     for (auto& output : outputs_) {
         if (!output.lost && !output.take(event, moment)) {
-            losses.push_back(failureEvent(output.name, std::system_category().message(errno)));
+            const std::string reason = std::system_category().message(errno);
+            losses.push_back(failureEvent(output.name, reason));
             output.lost = true;
-            output.onLost();
+            output.onLost(reason);
         }
     }
     for (const auto& loss : losses) {

@@ -28,9 +28,9 @@ using PairTaker = std::function<std::optional<Event>(std::uint64_t reference, st
 /// An output that loses an event gets no more, and the others are told: an error.
 class Journal {
 public:
-    /// @param onLostOutput called once when this output loses an event.
+    /// @param onLostOutput called once when this output loses an event, with the reason.
     /// @param begin        the moments of events are counted from then.
-    Journal(EventSink output, std::function<void()> onLostOutput,
+    Journal(EventSink output, std::function<void(const std::string&)> onLostOutput,
             Moment::Clock::time_point begin = Moment::Clock::now());
 
     /// One more output. To be called before other threads use the journal, as the next.
@@ -46,12 +46,14 @@ public:
     /// Something that makes the run unclean.
     void error(const Event& event);
 
-    /// @param quality ZEKEL_QUALITY_LENGTH doubles
-    void quality(const double* quality, const std::string& reason);
+    /// @param quality  ZEKEL_QUALITY_LENGTH doubles
+    /// @param expected it only says that a signal ends the run: neither counted nor news.
+    void quality(const double* quality, const std::string& reason, bool expected = false);
     void pair(std::uint64_t reference, std::uint64_t local);
 
     /// A text that is not a JSON object is an error.
-    void metadata(const std::string& text);
+    /// @param expected as above
+    void metadata(const std::string& text, bool expected = false);
 
     void timeRequest();
 
@@ -69,7 +71,7 @@ private:
     struct Output {
         std::string name;
         EventSink take;
-        std::function<void()> onLost;
+        std::function<void(const std::string&)> onLost;
         bool lost;
     };
 

@@ -1,15 +1,22 @@
 #include "Run.h"
 
 #include <algorithm>
+#include <array>
 #include <chrono>
+#include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <string_view>
 #include <utility>
 
 #include <fmt/format.h>
+#include <poll.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
+#include "Checks/DaemonChecks.h"
+#include "PlainPrinter.h"
+#include "Preparations.h"
 #include "Settings.h"
 #include "SettingsOptions.h"
 #include "Text.h"
@@ -19,7 +26,10 @@ namespace vantelhost {
 
 namespace {
 
-using Clock = StopSignal::Clock;
+using Clock = Moment::Clock;
+
+/// With which a child of the plug-in ends that did not become ptp4l, without a word.
+constexpr int notExecuted = 255;
 
 /// How long the live view may stand still.
 constexpr std::chrono::milliseconds refreshTime(500);
@@ -35,26 +45,52 @@ Clock::time_point after(Clock::time_point begin, double seconds) {
            std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(seconds));
 }
 
+/// Also where that cannot be written: nothing is thrown.
 void complain(const std::string& text) {
-    fmt::print(stderr, "vantel-host: {}\n", onOneLine(text));
+    std::fputs(fmt::format("vantel-host: {}\n", onOneLine(text)).c_str(), stderr);
+}
+
+void onLostOutput(const std::string& reason) {
+    complain("output: " + reason);
+    Signals::requestStop();
+}
+
+/// Until there is something to read, or the deadline; for ever without one.
+void waitForInput(std::array<int, 2> descriptors, std::optional<Clock::time_point> deadline) {
+    // Rounded up, lest it ends in many short waits; and not longer than an int is large.
+    constexpr std::chrono::milliseconds longest = std::chrono::hours(1);
+    int milliseconds = -1;
+    if (deadline) {
+        const auto left = std::chrono::ceil<std::chrono::milliseconds>(*deadline - Clock::now());
+        milliseconds = static_cast<int>(std::clamp(left, longest * 0, longest).count());
+    }
+    std::array<pollfd, 2> inputs{{{descriptors[0], POLLIN, 0}, {descriptors[1], POLLIN, 0}}};
+    ::poll(inputs.data(), inputs.size(), milliseconds);
+}
+
+bool isThere(const std::string& path) {
+    struct stat state {};
+    return ::stat(path.c_str(), &state) == 0;
 }
 
 } // namespace
 
-Run::Run(const RunOptions& options, std::optional<std::string> configText,
-         const StopSignal& stopSignal)
+Run::Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals)
     : options_(options),
       configText_(std::move(configText)),
-      stopSignal_(stopSignal),
-      journal_(output(), StopSignal::request, begin_),
-      callbacks_(journal_, options.refuseWhileStopping) {
+      signals_(signals),
+      journal_(output(), onLostOutput, begin_),
+      callbacks_(journal_, options.refuseWhileStopping, [this] { return signals_.stopHasCome(); }),
+      words_(view_ ? -1 : STDERR_FILENO) {
     connectOutputs();
 }
 
 EventSink Run::output() {
+    if (options_.jsonLines) {
+        return EventPrinter(STDOUT_FILENO, Format::jsonLines);
+    }
     if (!showsLive(options_)) {
-        return EventPrinter(STDOUT_FILENO,
-                            options_.jsonLines ? Format::jsonLines : Format::readable);
+        return PlainPrinter(STDOUT_FILENO);
     }
     view_.emplace(STDOUT_FILENO, begin_);
     return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };
@@ -79,6 +115,7 @@ int Run::execute() {
     if (chrony_) {
         journal_.note(chrony_->state());
     }
+    tellFailure();
     journal_.summary();
     return journal_.isClean() ? exitClean : exitFailed;
 }
@@ -92,6 +129,7 @@ void Run::session() {
         return;
     }
     const Json settings = completedSettings(schema);
+    prepare(settings);
     openFifo();
     if (initialise(plugIn, settings)) {
         startAndStop(plugIn);
@@ -129,6 +167,16 @@ Json Run::completedSettings(const Schema& schema) const {
     return settings.values;
 }
 
+void Run::prepare(const Json& settings) {
+    if (!options_.force) {
+        refuseSocketInUse(settings);
+    }
+    if (const auto folder = makeConfigFolder(settings)) {
+        journal_.note(folderEvent(*folder));
+    }
+    facts_.patience = patienceFor(settings);
+}
+
 bool Run::initialise(const PlugIn& plugIn, const Json& settings) {
     HostStatus status;
     plugIn.initialise(callbacks_.slot(), settings.dump(), status);
@@ -148,6 +196,7 @@ void Run::startAndStop(const PlugIn& plugIn) {
     journal_.note(stoppingEvent(startAndWait(plugIn)));
     callbacks_.stoppingBegins();
     plugIn.stop(callbacks_.slot());
+    words_.take();
     journal_.note(stoppedEvent());
     if (view_) {
         view_->close();
@@ -159,17 +208,28 @@ std::string Run::startAndWait(const PlugIn& plugIn) {
         if (options_.epochOffset) {
             writeOffset(*options_.epochOffset);
         }
-        HostStatus status;
-        plugIn.start(callbacks_.slot(), status);
-        if (!succeeded("start", status)) {
+        if (!start(plugIn)) {
             return "start failed";
         }
+        const auto begin = Clock::now();
         journal_.note(startedEvent());
-        return waitForEnd();
+        std::string cause = waitForEnd();
+        facts_.seconds = std::chrono::duration<double>(Clock::now() - begin).count();
+        facts_.fifoIsThere = isThere(options_.fifo);
+        return cause;
     } catch (const std::exception& error) {
         journal_.error(failureEvent("run", error.what()));
         return "failure";
     }
+}
+
+bool Run::start(const PlugIn& plugIn) {
+    HostStatus status;
+    {
+        const LastWords::Redirection redirection(words_);
+        plugIn.start(callbacks_.slot(), status);
+    }
+    return succeeded("start", status);
 }
 
 std::string Run::waitForEnd() {
@@ -198,12 +258,56 @@ std::optional<std::string> Run::waitUntil(std::optional<Clock::time_point> deadl
             const auto soon = Clock::now() + refreshTime;
             next = deadline ? std::min(*deadline, soon) : soon;
         }
-        if (auto signal = stopSignal_.waitUntil(next)) {
+        waitForInput({signals_.descriptor(), words_.descriptor()}, next);
+        if (auto signal = takeNews()) {
             return signal;
         }
         if (deadline && Clock::now() >= *deadline) {
             return std::nullopt;
         }
+    }
+}
+
+std::optional<std::string> Run::takeNews() {
+    words_.take();
+    while (const auto news = signals_.take()) {
+        if (!news->stop.empty()) {
+            return news->stop;
+        }
+        if (news->childEnd) {
+            tellDaemonEnd(*news->childEnd);
+        }
+    }
+    return std::nullopt;
+}
+
+void Run::tellDaemonEnd(const ChildEnd& end) {
+    words_.take();
+    const Event event = daemonEndedEvent(end, words_.lines());
+    journal_.note(event);
+    if (!facts_.daemonEnd.empty()) {
+        return;
+    }
+    facts_.daemonEnd = event.text;
+    if (end.bySignal || end.status != notExecuted || !words_.lines().empty()) {
+        return;
+    }
+    const Finding daemon = checkDaemon(Subject());
+    if (daemon.verdict == Verdict::fail) {
+        facts_.daemonEnd += ": " + daemon.found;
+        facts_.daemonMend = daemon.mend;
+    }
+}
+
+void Run::tellFailure() {
+    facts_.tally = journal_.tally();
+    facts_.fifo = options_.fifo;
+    if (chrony_ && chrony_->tookNone()) {
+        facts_.chronyFailure = chrony_->state().text;
+    }
+    if (const auto failure = failureOf(facts_)) {
+        journal_.error(causeEvent(failure->cause));
+        journal_.note(mendEvent(failure->mend));
     }
 }
 

@@ -7,15 +7,17 @@
 #include "Callbacks.h"
 #include "ChronyClock.h"
 #include "EpochFifo.h"
+#include "Failure.h"
 #include "HostStatus.h"
 #include "Journal.h"
 #include "Json.h"
+#include "LastWords.h"
 #include "LiveView.h"
 #include "PlugIn.h"
 #include "RecordFile.h"
 #include "RunOptions.h"
 #include "Schema.h"
-#include "StopSignal.h"
+#include "Signals.h"
 
 namespace vantelhost {
 
@@ -23,10 +25,9 @@ namespace vantelhost {
 class Run {
 public:
     /// @param configText the content of the configuration file, if there is one
-    /// @param stopSignal made before any thread
+    /// @param signals    made before any thread
     /// Throws UsageError.
-    Run(const RunOptions& options, std::optional<std::string> configText,
-        const StopSignal& stopSignal);
+    Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals);
 
     /// Throws UsageError.
     /// @return the exit status.
@@ -40,14 +41,22 @@ private:
     void session();
     bool readSchema(const PlugIn& plugIn, Schema& schema);
     Json completedSettings(const Schema& schema) const;
+    void prepare(const Json& settings);
     bool initialise(const PlugIn& plugIn, const Json& settings);
     void startAndStop(const PlugIn& plugIn);
+    bool start(const PlugIn& plugIn);
 
     /// Start and wait do not throw: the plug-in's child must be stopped whatever happens.
     /// @return why the run ends.
     std::string startAndWait(const PlugIn& plugIn);
     std::string waitForEnd();
-    std::optional<std::string> waitUntil(std::optional<StopSignal::Clock::time_point> deadline);
+    std::optional<std::string> waitUntil(std::optional<Moment::Clock::time_point> deadline);
+
+    /// Takes what has come from outside.
+    /// @return the name of a signal that ends the run.
+    std::optional<std::string> takeNews();
+    void tellDaemonEnd(const ChildEnd& end);
+    void tellFailure();
     void openFifo();
     void writeOffset(std::int64_t nanoseconds);
 
@@ -57,7 +66,7 @@ private:
 
     const RunOptions& options_;
     std::optional<std::string> configText_;
-    const StopSignal& stopSignal_;
+    Signals& signals_;
     const Moment::Clock::time_point begin_ = Moment::Clock::now();
     std::optional<LiveView> view_;
     std::optional<RecordFile> record_;
@@ -65,6 +74,8 @@ private:
     Journal journal_;
     Callbacks callbacks_;
     std::optional<EpochFifo> fifo_;
+    LastWords words_;
+    RunFacts facts_;
 };
 
 } // namespace vantelhost

@@ -6,7 +6,7 @@
 #include "Run.h"
 #include "RunOptions.h"
 #include "SettingsOptions.h"
-#include "StopSignal.h"
+#include "Signals.h"
 
 namespace vantelhost {
 
@@ -15,8 +15,8 @@ namespace {
 /// Reads the settings before the signals are blocked: Ctrl-C still ends a wait for typed ones.
 int run(const RunOptions& options) {
     auto configText = readConfig(options);
-    const StopSignal stopSignal;
-    return Run(options, std::move(configText), stopSignal).execute();
+    Signals signals;
+    return Run(options, std::move(configText), signals).execute();
 }
 
 } // namespace

@@ -49,6 +49,8 @@ void addBehaviour(CLI::App& command, RunOptions& options) {
         ->type_name("N");
     command.add_flag("--refuse-while-stopping", options.refuseWhileStopping,
                      "Refuse the plug-in's calls while stopping");
+    command.add_flag("--force", options.force,
+                     "Run also when somebody listens at udsAddress, and take the socket away");
 }
 
 void addOutput(CLI::App& command, RunOptions& options) {
@@ -110,9 +112,10 @@ void addRunOptions(CLI::App& command, RunOptions& options) {
     addOutput(command, options);
     addFifo(command, options);
     command.footer(
-        "Exit status: 0 after a clean run; 1 when the plug-in reported an error or broke "
-        "the rules of\nthe interface, or the output was lost; 2 for a bad option, "
-        "setting, library or FIFO.");
+        "Exit status: 0 after a clean run; 1 when the plug-in reported an error or broke the rules "
+        "of\nthe interface, ptp4l ended unasked, no time pair came that is of use, chronyd took "
+        "none, or the\noutput was lost; 2 for a bad option, setting, library or FIFO, or when "
+        "udsAddress is in use.");
     command.final_callback([&command, &options] { finish(options, command.count("--fifo") > 0); });
 }
 

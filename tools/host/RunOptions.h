@@ -34,6 +34,7 @@ struct RunOptions : SettingsOptions {
     std::optional<std::int64_t> epochOffset;
     std::vector<TimedOffset> timedOffsets; ///< in the order of their times
     bool refuseWhileStopping = false;
+    bool force = false; ///< also when somebody listens at "udsAddress"
 };
 
 /// Adds the options to a command. They are filled when the command line is read.

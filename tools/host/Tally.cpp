@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include <fmt/format.h>
+
 namespace vantelhost {
 
 void OffsetStatistics::add(std::int64_t offset) {
@@ -21,6 +23,17 @@ double OffsetStatistics::mean() const {
 double OffsetStatistics::rms() const {
     return count == 0 ? 0
                       : static_cast<double>(std::sqrt(squares / static_cast<long double>(count)));
+}
+
+std::string zeroOffsets(const OffsetStatistics& offsets) {
+    // A sound ptp4l begins with up to 14 of them.
+    constexpr std::uint64_t fewest = 20;
+    if (offsets.count < fewest || offsets.smallest != 0 || offsets.largest != 0) {
+        return {};
+    }
+    return fmt::format(
+        "offset exactly 0 in {0} of {0} pairs: no delay is measured: delayMechanism?",
+        offsets.count);
 }
 
 } // namespace vantelhost

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 
 namespace vantelhost {
 
@@ -21,6 +22,10 @@ struct OffsetStatistics {
     double rms() const;
 };
 
+/// What is to be said of offsets that are all exactly 0, as only those of a clock that measures no
+/// delay are; empty when there are others, or so few that it may only have begun.
+std::string zeroOffsets(const OffsetStatistics& offsets);
+
 struct Tally {
     OffsetStatistics offsets;          ///< one for each time pair
     std::uint64_t qualityChanges = 0;  ///< quality calls whose values or reason are new
@@ -28,6 +33,8 @@ struct Tally {
     std::uint64_t timeRequests = 0;
     std::uint64_t refused = 0; ///< calls refused because the host is stopping
     std::uint64_t errors = 0;
+    bool wasUsable = false; ///< the quality, at any time
+    bool hasPorts = false;  ///< the last metadata: those after a failed poll have none
 };
 
 } // namespace vantelhost

@@ -13,11 +13,63 @@ namespace {
 
 using Lines = std::vector<std::string>;
 
+constexpr std::size_t labelWidth = 14;
+constexpr char missing[] = "...";
+
 /// Lines under one label, which stands before the first.
 void add(Lines& lines, const std::string& label, const Lines& texts) {
     for (const auto& text : texts) {
-        lines.push_back(fmt::format("{:<13} {}", &text == &texts.front() ? label : "", text));
+        lines.push_back(
+            fmt::format("{:<{}}{}", &text == &texts.front() ? label : "", labelWidth, text));
     }
+}
+
+std::string printable(const std::string& text) {
+    std::string result = onOneLine(text);
+    std::replace_if(
+        result.begin(), result.end(),
+        [](char each) { return static_cast<unsigned char>(each) >= 0x80; }, '?');
+    return result;
+}
+
+/// What of a line there is room for beside the labels.
+std::size_t roomOf(ScreenSize size) {
+    return size.columns > labelWidth ? size.columns - labelWidth : 0;
+}
+
+std::string withoutEnd(std::string text, std::size_t columns) {
+    const std::size_t mark = sizeof(missing) - 1;
+    if (text.size() > columns) {
+        text.resize(columns);
+        text.replace(columns > mark ? columns - mark : 0, mark, missing, std::min(columns, mark));
+    }
+    text.erase(text.find_last_not_of(' ') + 1);
+    return text;
+}
+
+/// Both ends say something: what it is, and why.
+std::string withoutMiddle(const std::string& text, std::size_t columns) {
+    const std::size_t mark = sizeof(missing) + 1; // with a space at each side
+    if (text.size() <= columns || columns < 4 * mark) {
+        return text;
+    }
+    const std::size_t tail = (columns - mark) / 2;
+    const std::size_t head = columns - mark - tail;
+    return fmt::format("{} {} {}", text.substr(0, head), missing, text.substr(text.size() - tail));
+}
+
+/// At spaces, where there are some.
+Lines wrapped(std::string text, std::size_t columns) {
+    constexpr std::size_t narrowest = 20;
+    Lines lines;
+    while (text.size() > columns && columns >= narrowest) {
+        const auto space = text.rfind(' ', columns);
+        const auto end = space == std::string::npos || space == 0 ? columns : space;
+        lines.push_back(text.substr(0, end));
+        text.erase(0, end == space ? end + 1 : end);
+    }
+    lines.push_back(text);
+    return lines;
 }
 
 std::string shownDuration(double seconds) {
@@ -38,7 +90,7 @@ std::string qualityText(const ViewState& state, double now) {
         return "none yet";
     }
     return fmt::format("{} for {}: {}", state.quality, shownDuration(now - state.qualitySince),
-                       state.reason);
+                       state.daemonEnd.empty() ? state.reason : state.daemonEnd);
 }
 
 std::string clockText(const Json& metadata, const char* identity, const char* clockClass,
@@ -50,8 +102,29 @@ std::string clockText(const Json& metadata, const char* identity, const char* cl
                        member(metadata, accuracy));
 }
 
-std::string offsetText(const ViewState& state) {
-    return state.offset ? shownOffset(static_cast<double>(*state.offset)) : "none yet";
+std::string offsetText(const ViewState& state, double now) {
+    constexpr double fresh = 3;
+    if (!state.offset) {
+        return "none yet";
+    }
+    const std::string offset = shownOffset(static_cast<double>(*state.offset));
+    const double age = now - state.offsetSeconds;
+    return age < fresh ? offset : fmt::format("{}, {} ago", offset, shownDuration(age));
+}
+
+/// What the other rows do not tell by themselves; empty when there is nothing.
+std::string hintText(const ViewState& state, double now) {
+    constexpr double patience = 5;
+    constexpr std::uint64_t few = 2; // of a poll or two, while the quality changes
+    const bool isUsable = state.quality == "usable";
+    if (isUsable && state.allOffsets.count == 0 && now > state.qualitySince + patience) {
+        return "no time pairs though the quality is usable: is the epoch FIFO there?";
+    }
+    if (state.quality == "unusable" && state.pairsSinceQuality > few) {
+        return "time pairs come though the quality is unusable: it stays so until the grandmaster "
+               "changes or the host is restarted (silent-recovery)";
+    }
+    return zeroOffsets(state.allOffsets);
 }
 
 std::string windowText(const ViewState& state, double now) {
@@ -87,22 +160,16 @@ Lines cutTo(Lines texts, std::size_t most) {
     return texts;
 }
 
-Lines problemTexts(const ViewState& state, double now) {
+Lines problemTexts(const ViewState& state, double now, std::size_t room) {
     Lines texts;
     for (auto each = state.problems.rbegin(); each != state.problems.rend(); ++each) {
-        texts.push_back(fmt::format("{} ago  {}", shownDuration(now - each->seconds), each->text));
+        const std::string times = each->times > 1 ? fmt::format("{} times, ", each->times) : "";
+        texts.push_back(
+            withoutMiddle(fmt::format("{}{} ago  {}", times, shownDuration(now - each->seconds),
+                                      printable(each->text)),
+                          room));
     }
     return texts.empty() ? Lines{"none"} : texts;
-}
-
-std::string printable(const std::string& text, std::size_t columns) {
-    std::string result;
-    for (const char character : onOneLine(text)) {
-        result += static_cast<unsigned char>(character) < 0x80 ? character : '?';
-    }
-    result.resize(std::min(result.size(), columns));
-    result.erase(result.find_last_not_of(' ') + 1);
-    return result;
 }
 
 } // namespace
@@ -127,19 +194,23 @@ std::string shownOffset(double nanoseconds) {
 
 std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSize size) {
     Lines before{fmt::format("{}, {}, up {}", state.plugIn, state.phase, shownDuration(now))};
-    add(before, "quality", {qualityText(state, now)});
+    const std::size_t room = roomOf(size);
+    add(before, "quality", wrapped(printable(qualityText(state, now)), room));
     add(before, "grandmaster",
         {clockText(state.metadata, "gmClockId", "gmClockClass", "gmClockAccuracy")});
     add(before, "this clock",
         {clockText(state.metadata, "localClockId", "clockClass", "clockAccuracy")});
-    add(before, "offset", {offsetText(state)});
+    add(before, "offset", {offsetText(state, now)});
     add(before, fmt::format("last {:.0f} s", state.offsets.length()), {windowText(state, now)});
-    add(before, "pairs", {fmt::format("{}", state.pairs)});
+    add(before, "pairs", {fmt::format("{}", state.allOffsets.count)});
+    if (const std::string hint = hintText(state, now); !hint.empty()) {
+        add(before, "hint", wrapped(hint, room));
+    }
     Lines after;
     if (!state.chrony.empty()) {
         add(after, "chronyd", {state.chrony});
     }
-    add(after, "last errors", problemTexts(state, now));
+    add(after, "last errors", problemTexts(state, now, room));
 
     const auto others = before.size() + after.size();
     const auto ports = portTexts(state.metadata);
@@ -148,7 +219,7 @@ std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSiz
     before.insert(before.end(), after.begin(), after.end());
     before.resize(std::min(before.size(), size.rows));
     for (auto& line : before) {
-        line = printable(line, size.columns);
+        line = withoutEnd(printable(line), size.columns);
     }
     return before;
 }

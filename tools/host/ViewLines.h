@@ -14,8 +14,9 @@ struct ScreenSize {
     std::size_t columns;
 };
 
-/// The live view, line by line, in printable ASCII. Lines are cut to the width; of ports, as many
-/// are left out as the height asks for, then of all from the end.
+/// The live view, line by line, in printable ASCII. Quality and hints are wrapped, other lines cut
+/// to the width, with "..." in place of what is missing; of ports, as many are left out as the
+/// height asks for, then of all from the end.
 std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSize size);
 
 /// Nanoseconds as people read them, with a unit that leaves at most four digits before the point.

@@ -9,7 +9,9 @@ constexpr std::size_t mostProblems = 5;
 void addProblem(ViewState& state, double seconds, const std::string& text) {
     auto& problems = state.problems;
     if (!problems.empty() && problems.back().text == text) {
-        problems.pop_back();
+        problems.back().seconds = seconds;
+        ++problems.back().times;
+        return;
     }
     problems.push_back({seconds, text});
     if (problems.size() > mostProblems) {
@@ -20,6 +22,11 @@ void addProblem(ViewState& state, double seconds, const std::string& text) {
 void updateQuality(ViewState& state, const Json& members, double seconds) {
     const std::string quality = members["quality"];
     const std::string reason = members["reason"];
+    state.pairsSinceQuality = 0;
+    // What is told then follows from it.
+    if (!state.daemonEnd.empty() && quality == state.quality) {
+        return;
+    }
     if (quality != state.quality || reason != state.reason) {
         state.quality = quality;
         state.reason = reason;
@@ -29,6 +36,14 @@ void updateQuality(ViewState& state, const Json& members, double seconds) {
     if (state.started && quality != "usable") {
         addProblem(state, seconds, quality + ": " + reason);
     }
+}
+
+void updateOffset(ViewState& state, std::int64_t offset, double seconds) {
+    ++state.pairsSinceQuality;
+    state.offset = offset;
+    state.offsetSeconds = seconds;
+    state.allOffsets.add(offset);
+    state.offsets.add(seconds, offset);
 }
 
 void updateMetadata(ViewState& state, const Event& event, double seconds) {
@@ -55,13 +70,14 @@ void update(ViewState& state, const Event& event, double seconds) {
     } else if (event.name == "quality") {
         updateQuality(state, members, seconds);
     } else if (event.name == "pair") {
-        ++state.pairs;
-        state.offset = members["offset"];
-        state.offsets.add(seconds, *state.offset);
+        updateOffset(state, members["offset"], seconds);
     } else if (event.name == "metadata") {
         updateMetadata(state, event, seconds);
     } else if (event.name == "chrony") {
         state.chrony = event.text;
+    } else if (event.name == "daemon-ended") {
+        state.daemonEnd = event.text;
+        addProblem(state, seconds, event.text);
     } else if (event.name == "error" || event.name == "warning" || event.name == "refused") {
         addProblem(state, seconds, event.text);
     }

@@ -9,14 +9,16 @@
 #include "Events.h"
 #include "Json.h"
 #include "OffsetWindow.h"
+#include "Tally.h"
 
 namespace vantelhost {
 
 /// What the live view shows. Times are seconds since the beginning of the run.
 struct ViewState {
     struct Problem {
-        double seconds;
+        double seconds; ///< the last time
         std::string text;
+        std::uint64_t times = 1; ///< in a row
     };
 
     std::string plugIn; ///< its name; empty until it is loaded
@@ -25,9 +27,12 @@ struct ViewState {
     std::string quality; ///< empty until there is one
     std::string reason;
     double qualitySince = 0;
+    std::uint64_t pairsSinceQuality = 0; ///< since the plug-in last told a quality
+    std::string daemonEnd;               ///< how ptp4l ended unasked; empty while it runs
     Json metadata = Json::object();
     std::optional<std::int64_t> offset; ///< of the last pair, in nanoseconds
-    std::uint64_t pairs = 0;
+    double offsetSeconds = 0;           ///< when it came
+    OffsetStatistics allOffsets;
     OffsetWindow offsets{60};
     std::string chrony;           ///< empty when chronyd gets nothing
     std::deque<Problem> problems; ///< the last five, oldest first

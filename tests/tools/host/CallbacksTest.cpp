@@ -53,7 +53,7 @@ protected:
     Folder folder;
     std::string path = folder.path("out");
     int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC | O_APPEND, 0600);
-    Journal journal{EventPrinter(file, Format::jsonLines), [] {}};
+    Journal journal{EventPrinter(file, Format::jsonLines), [](const std::string&) {}};
     std::string lastText;
 };
 
@@ -69,6 +69,17 @@ TEST_F(CallbacksTest, CallsWithTheSlotAreTaken) {
     EXPECT_EQ(journal.tally().offsets.count, 1U);
     EXPECT_EQ(journal.tally().qualityChanges, 1U);
     EXPECT_EQ(journal.tally().metadataUpdates, 1U);
+}
+
+TEST_F(CallbacksTest, WhatIsToldWhenASignalEndsTheRunIsExpectedButPairsCount) {
+    Callbacks callbacks(journal, false, [] { return true; });
+    EXPECT_EQ(callAll(callbacks.slot()), (Codes{0, 0, 0, 0}));
+    const auto shown = events();
+    ASSERT_EQ(shown.size(), 3U);
+    EXPECT_EQ(shown[0]["event"], "pair");
+    EXPECT_EQ(shown[1]["event"], "expected");
+    EXPECT_EQ(shown[2]["event"], "expected");
+    EXPECT_EQ(journal.tally().metadataUpdates, 0U);
 }
 
 TEST_F(CallbacksTest, TheTimeIsTheRealtimeClockInNanoseconds) {

@@ -15,6 +15,7 @@
 #include <csignal>
 #include <fcntl.h>
 #include <nlohmann/json.hpp>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <vantel_bc/zekel.h>
@@ -87,7 +88,8 @@ public:
         : context_(context),
           record_(config["record"]),
           script_(config["script"]),
-          fifo_(config["fifo"]) {
+          fifo_(config["fifo"]),
+          child_(config.value("child", "")) {
         if (config.contains("configFile")) {
             std::ofstream(std::string(config["configFile"])) << config.value("content", "");
         }
@@ -104,6 +106,7 @@ public:
     }
 
     void play() {
+        startChild();
         openFifo();
         playData();
         playMistakes();
@@ -119,6 +122,10 @@ public:
         if (fifoDescriptor_ >= 0) {
             readFifo();
             ::close(fifoDescriptor_);
+        }
+        if (childPid_ > 0) {
+            ::kill(childPid_, SIGTERM);
+            ::waitpid(childPid_, nullptr, 0);
         }
         record("stop");
     }
@@ -152,6 +159,11 @@ private:
             pair(1000, 990);
             pair(2000, 2030);
             pair(0xFFFFFFFFFFFFFFFF, 1);
+        }
+        if (does("zeros")) {
+            for (std::uint64_t i = 0; i < 20; ++i) {
+                pair(i, i);
+            }
         }
         if (does("metadata")) {
             update(metadata);
@@ -197,6 +209,21 @@ private:
         other.join();
     }
 
+    /// As ptp4l: with the host's descriptors, and no signal held back.
+    void startChild() {
+        if (child_.empty()) {
+            return;
+        }
+        childPid_ = ::fork();
+        if (childPid_ == 0) {
+            sigset_t none;
+            sigemptyset(&none);
+            pthread_sigmask(SIG_SETMASK, &none, nullptr);
+            ::execl("/bin/sh", "sh", "-c", child_.c_str(), nullptr);
+            ::_exit(127);
+        }
+    }
+
     void openFifo() {
         if (!fifo_.empty()) {
             fifoDescriptor_ = ::open(fifo_.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
@@ -220,6 +247,8 @@ private:
     std::string record_;
     std::string script_;
     std::string fifo_;
+    std::string child_; ///< a command for the shell; empty when there is none
+    pid_t childPid_ = -1;
     int fifoDescriptor_ = -1;
 };
 

@@ -2,6 +2,7 @@
 
 #include <array>
 #include <cerrno>
+#include <functional>
 #include <optional>
 
 #include <fcntl.h>
@@ -26,7 +27,12 @@ protected:
     std::string path = folder.path("out");
     int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0600);
     int lost = 0;
-    Journal journal{EventPrinter(file, Format::jsonLines), [this] { ++lost; }};
+    std::string reason;
+    std::function<void(const std::string&)> onLost = [this](const std::string& why) {
+        ++lost;
+        reason = why;
+    };
+    Journal journal{EventPrinter(file, Format::jsonLines), onLost};
 };
 
 } // namespace
@@ -53,6 +59,39 @@ TEST_F(JournalTest, ARepeatedQualityIsShownButIsNoChange) {
     journal.quality(usable.data(), "b");
     EXPECT_EQ(events().size(), 3U);
     EXPECT_EQ(journal.tally().qualityChanges, 2U);
+}
+
+TEST_F(JournalTest, WhatIsExpectedIsShownAsSuchAndNotCounted) {
+    constexpr std::array unusable{-2.0, -2.0, -1.0};
+    journal.metadata(R"({"Port1":{}})");
+    journal.quality(unusable.data(), "died", true);
+    journal.metadata(R"({"a":1})", true);
+    const auto shown = events();
+    ASSERT_EQ(shown.size(), 3U);
+    EXPECT_EQ(shown[1]["event"], "expected");
+    EXPECT_EQ(shown[1]["call"], "quality");
+    EXPECT_EQ(shown[1]["reason"], "died");
+    EXPECT_EQ(shown[2]["call"], "metadata");
+    EXPECT_EQ(shown[2]["metadata"]["a"], 1);
+    EXPECT_EQ(journal.tally().qualityChanges, 0U);
+    EXPECT_EQ(journal.tally().metadataUpdates, 1U);
+    EXPECT_TRUE(journal.tally().hasPorts);
+    journal.metadata("{", true);
+    EXPECT_FALSE(journal.isClean());
+}
+
+TEST_F(JournalTest, TheTallyKnowsWhetherThereWereAUsableQualityAndPorts) {
+    constexpr std::array usable{2.5e-08, 1e-06, -1.0};
+    constexpr std::array unusable{-2.0, -2.0, -1.0};
+    journal.quality(unusable.data(), "a");
+    EXPECT_FALSE(journal.tally().wasUsable);
+    journal.quality(usable.data(), "a");
+    journal.quality(unusable.data(), "a");
+    EXPECT_TRUE(journal.tally().wasUsable);
+    journal.metadata(R"({"Port1":{}})");
+    EXPECT_TRUE(journal.tally().hasPorts);
+    journal.metadata(R"({"gmClockId":""})");
+    EXPECT_FALSE(journal.tally().hasPorts);
 }
 
 TEST_F(JournalTest, MetadataMustBeAJsonObject) {
@@ -88,10 +127,11 @@ TEST_F(JournalTest, RefusalsAndNotesLeaveTheRunClean) {
 
 TEST_F(JournalTest, LostOutputIsToldOnceAndIsNotClean) {
     const int full = ::open("/dev/full", O_WRONLY | O_CLOEXEC);
-    Journal lossy(EventPrinter(full, Format::readable), [this] { ++lost; });
+    Journal lossy(EventPrinter(full, Format::readable), onLost);
     lossy.note(startedEvent());
     lossy.note(stoppedEvent());
     EXPECT_EQ(lost, 1);
+    EXPECT_EQ(reason, "No space left on device");
     EXPECT_FALSE(lossy.isClean());
     ::close(full);
 }

@@ -17,7 +17,7 @@ using namespace vantelhost;
 namespace {
 
 std::uint64_t hostTime() {
-    Journal journal(EventPrinter(STDOUT_FILENO, Format::jsonLines), [] {});
+    Journal journal(EventPrinter(STDOUT_FILENO, Format::jsonLines), [](const std::string&) {});
     Callbacks callbacks(journal, false);
     HostStatus status;
     std::uint64_t time = 0;

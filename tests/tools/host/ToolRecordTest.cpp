@@ -68,6 +68,15 @@ TEST_F(ToolRecordTest, AnOldFileIsReplaced) {
     EXPECT_EQ(recorded().events().at(0)["event"], "loaded");
 }
 
+TEST_F(ToolRecordTest, AFileThatAnotherRunWritesIsLeftAlone) {
+    Child first(command({"--interface", "eth0", "--record", file}));
+    ASSERT_TRUE(first.waitForOutput("started"));
+    const auto result = play("", {"--record", file});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.errors, "vantel-host: cannot write " + file + ": somebody else writes it\n");
+    EXPECT_EQ(recorded().events().at(0)["event"], "loaded");
+}
+
 TEST_F(ToolRecordTest, AnUnwritablePathIsAMistake) {
     const auto result = play("", {"--record", folder.path("none/run.jsonl")});
     EXPECT_EQ(result.status, 2);
@@ -100,9 +109,13 @@ TEST_F(ToolRecordTest, AFileThatFillsLaterIsToldOnceAndTheRunGoesOn) {
     EXPECT_EQ(ToolTest::record().back(), "finalise");
 }
 
-TEST_F(ToolRecordTest, WithoutChronydTheRunIsCleanAndSaysSoOnceAndAtTheEnd) {
+TEST_F(ToolRecordTest, WithoutChronydTheRunFailsAndSaysSoOnceAndAtTheEnd) {
     const auto result = play("pairs", {"--chrony", folder.path("none")});
-    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.status, 1);
+    EXPECT_THAT(result.events("cause").at(0)["text"].get<std::string>(),
+                HasSubstr("No such file or directory; 0 sent, 3 failed"));
+    EXPECT_EQ(result.events("mend").at(0)["text"],
+              "start chronyd with \"refclock SOCK\" and that path");
     const auto told = result.events("chrony");
     ASSERT_EQ(told.size(), 2U);
     EXPECT_EQ(told[0]["reachable"], false);

@@ -67,8 +67,8 @@ TEST(View, FollowingAGrandmaster) {
                             "quality       usable for 1:02:04: PTP role has changed.",
                             "grandmaster   00:1B:21:FF:FE:0A:0B:0C, class 6, WITHIN_100NS",
                             "this clock    02:00:00:FF:FE:00:00:01, class 248, ACCURACY_UNKNOWN",
-                            "offset        4 ns", "last 60 s     no pairs", "pairs         2",
-                            "ports         Port1   PTP_SLAVE         eth0",
+                            "offset        4 ns, 1:02:02 ago", "last 60 s     no pairs",
+                            "pairs         2", "ports         Port1   PTP_SLAVE         eth0",
                             "              Port2   PTP_MASTER        eth1", "last errors   none"));
     EXPECT_EQ(viewLines(following(), 8, roomy)[5],
               "last 60 s     min -3 ns, max 4 ns, rms 4 ns, 0.5 pairs/s");
@@ -130,7 +130,7 @@ TEST(View, LinesAreCutToTheWidth) {
     for (const auto& line : viewLines(following(), 8, {40, 30})) {
         EXPECT_THAT(line, SizeIs(testing::Le(30U)));
     }
-    EXPECT_EQ(viewLines(following(), 8, {40, 30})[2], "grandmaster   00:1B:21:FF:FE:0");
+    EXPECT_EQ(viewLines(following(), 8, {40, 30})[3], "this clock    02:00:00:FF:F...");
 }
 
 TEST(View, PortsAreLeftOutBeforeErrors) {
@@ -158,6 +158,102 @@ TEST(View, TextsOfThePlugInCannotControlTheTerminal) {
     ViewState state = running();
     update(state, qualityEvent(usable.data(), "a\x1b[2J\n\xFF"), 1);
     EXPECT_EQ(viewLines(state, 1, roomy)[1], "quality       usable for 0:00:00: a\\x1B[2J\\x0A?");
+}
+
+TEST(View, ALongQualityIsWrapped) {
+    ViewState state = running();
+    update(state,
+           qualityEvent(unusable.data(), "Unable to communicate with PTP sub process while "
+                                         "attempting to retrieve time data"),
+           1);
+    const auto lines = viewLines(state, 2, {24, 80});
+    EXPECT_EQ(lines[1],
+              "quality       unusable for 0:00:01: Unable to communicate with PTP sub process");
+    EXPECT_EQ(lines[2], "              while attempting to retrieve time data");
+    EXPECT_THAT(lines[3], StartsWith("grandmaster"));
+}
+
+TEST(View, AWordLongerThanALineIsBroken) {
+    ViewState state = running();
+    update(state, qualityEvent(unusable.data(), std::string(30, 'x')), 1);
+    const auto lines = viewLines(state, 1, {24, 40});
+    EXPECT_EQ(lines[1], "quality       unusable for 0:00:00:");
+    EXPECT_EQ(lines[2], "              " + std::string(26, 'x'));
+    EXPECT_EQ(lines[3], "              xxxx");
+}
+
+TEST(View, ALongErrorShowsBothEnds) {
+    ViewState state = running();
+    update(state, failureEvent("start", std::string(80, 'x') + " the end"), 1);
+    const auto lines = viewLines(state, 1, {24, 60});
+    EXPECT_EQ(lines.back(), "last errors   0:00:00 ago  start: x ... xxxxxxxxxxxx the end");
+    EXPECT_THAT(lines.back(), SizeIs(60));
+}
+
+TEST(View, ARepeatedErrorIsCounted) {
+    ViewState state = running();
+    for (int i = 0; i < 40; ++i) {
+        update(state, failureEvent("a", "b"), i);
+    }
+    EXPECT_EQ(viewLines(state, 40, roomy).back(), "last errors   40 times, 0:00:01 ago  a: b");
+}
+
+TEST(View, TheEndOfTheDaemonStaysTheCause) {
+    ViewState state = following();
+    update(state, daemonEndedEvent({12, false, 3}, {"bad option"}), 8);
+    update(state, qualityEvent(unusable.data(), "Unable to communicate"), 9);
+    update(state, qualityEvent(unusable.data(), "PTP sub process has died unexpectedly"), 10);
+    update(state, qualityEvent(unusable.data(), "Unable to communicate"), 11);
+    EXPECT_EQ(
+        viewLines(state, 12, roomy)[1],
+        "quality       unusable for 0:00:03: ptp4l, process 12, ended with status 3; its last "
+        "words: bad option");
+    EXPECT_EQ(state.problems.back().text, "unusable: Unable to communicate");
+    EXPECT_EQ(state.problems.size(), 2U);
+}
+
+TEST(View, WhatIsExpectedIsNotShown) {
+    ViewState state = following();
+    const auto before = viewLines(state, 8, roomy);
+    update(state, expectedEvent(qualityEvent(unusable.data(), "died")), 8);
+    update(state, expectedEvent(metadataEvent(Json{{"gmClockId", "0"}})), 8);
+    EXPECT_EQ(viewLines(state, 8, roomy), before);
+}
+
+TEST(View, PairsOfAnUnusableQualityGetAHint) {
+    ViewState state = following();
+    update(state, qualityEvent(unusable.data(), "Unable to communicate"), 8);
+    update(state, pairEvent(3000, 3001, 1), 9);
+    update(state, pairEvent(4000, 4001, 1), 10);
+    EXPECT_THAT(viewLines(state, 10, roomy), Not(Contains(StartsWith("hint"))));
+    update(state, pairEvent(5000, 5001, 1), 11);
+    EXPECT_THAT(
+        viewLines(state, 11, roomy),
+        Contains(StartsWith("hint          time pairs come though the quality is unusable")));
+    update(state, qualityEvent(usable.data(), "PTP role has changed."), 12);
+    EXPECT_THAT(viewLines(state, 12, roomy), Not(Contains(StartsWith("hint"))));
+}
+
+TEST(View, AUsableQualityWithoutPairsGetsAHint) {
+    ViewState state = running();
+    update(state, qualityEvent(usable.data(), "PTP role has changed."), 5);
+    EXPECT_THAT(viewLines(state, 10, roomy), Not(Contains(StartsWith("hint"))));
+    EXPECT_EQ(viewLines(state, 11, roomy)[7],
+              "hint          no time pairs though the quality is usable: is the epoch FIFO there?");
+}
+
+TEST(View, OffsetsOfExactlyZeroGetAHint) {
+    ViewState state = running();
+    update(state, qualityEvent(usable.data(), "PTP role has changed."), 5);
+    for (std::uint64_t i = 0; i < 19; ++i) {
+        update(state, pairEvent(i, i, 0), 6);
+    }
+    EXPECT_THAT(viewLines(state, 7, roomy), Not(Contains(StartsWith("hint"))));
+    update(state, pairEvent(20, 20, 0), 6);
+    EXPECT_EQ(viewLines(state, 7, roomy)[7], "hint          offset exactly 0 in 20 of 20 pairs: no "
+                                             "delay is measured: delayMechanism?");
+    update(state, pairEvent(20, 21, 1), 7);
+    EXPECT_THAT(viewLines(state, 7, roomy), Not(Contains(StartsWith("hint"))));
 }
 
 TEST(View, MetadataWithoutTheUsualMembersIsShownToo) {
