@@ -18,6 +18,10 @@ using Arguments = std::vector<const char*>;
 /// The options of the last "run" that was accepted.
 std::optional<RunOptions> accepted;
 
+/// What the last reading wrote.
+std::string output;
+std::string errors;
+
 std::function<int()> prepareRun(CLI::App& command) {
     const auto options = std::make_shared<RunOptions>();
     addRunOptions(command, *options);
@@ -40,8 +44,8 @@ int read(const Arguments& words) {
     testing::internal::CaptureStderr();
     const int status = execute({{"run", "", prepareRun}, {"other", "", prepareOther}},
                                static_cast<int>(argv.size()), argv.data());
-    testing::internal::GetCapturedStdout();
-    testing::internal::GetCapturedStderr();
+    output = testing::internal::GetCapturedStdout();
+    errors = testing::internal::GetCapturedStderr();
     return status;
 }
 
@@ -60,7 +64,7 @@ TEST(CommandLine, DefaultsOfRun) {
     EXPECT_EQ(options.seconds, std::nullopt);
     EXPECT_EQ(options.fifo, VANTEL_EPOCH_FIFO_PATH);
     EXPECT_FALSE(options.useFifo || options.createFifo || options.jsonLines || options.plain ||
-                 options.noInterfaces || options.refuseWhileStopping);
+                 options.noInterfaces || options.refuseWhileStopping || options.force);
 }
 
 TEST(CommandLine, AllOptionsOfRun) {
@@ -83,6 +87,7 @@ TEST(CommandLine, AllOptionsOfRun) {
                               "--fifo",
                               "f",
                               "--refuse-while-stopping",
+                              "--force",
                               "--record",
                               "r.jsonl",
                               "--chrony",
@@ -96,7 +101,7 @@ TEST(CommandLine, AllOptionsOfRun) {
     EXPECT_EQ(options.recordFile, "r.jsonl");
     EXPECT_EQ(options.chronySocket, "c.sock");
     EXPECT_TRUE(options.useFifo && options.createFifo && options.jsonLines &&
-                options.refuseWhileStopping);
+                options.refuseWhileStopping && options.force);
 }
 
 TEST(CommandLine, OffsetsMayBeNegativeAndUseTheFifo) {
@@ -121,6 +126,25 @@ TEST(CommandLine, TimedOffsetsComeInTheOrderOfTheirTimes) {
 TEST(CommandLine, TheNamedSubcommandGivesTheStatus) {
     EXPECT_EQ(read({"run"}), 42);
     EXPECT_EQ(read({"other"}), 43);
+}
+
+TEST(CommandLine, TheVersionIsNoMistake) {
+    EXPECT_EQ(read({"--version"}), 0);
+    EXPECT_EQ(output, "vantel-host " VANTEL_VERSION "\n");
+}
+
+TEST(CommandLine, AMistakeIsToldWithWhatThereIs) {
+    EXPECT_EQ(read({"frobnicate"}), 2);
+    EXPECT_EQ(errors,
+              "vantel-host: there is no command \"frobnicate\"; the commands are: run, other\n");
+    EXPECT_EQ(read({}), 2);
+    EXPECT_EQ(errors, "vantel-host: a command is missing; the commands are: run, other\n");
+    EXPECT_EQ(read({"run", "extra", "more"}), 2);
+    EXPECT_EQ(errors, "vantel-host: an argument too many: \"extra\", \"more\"\n");
+    EXPECT_EQ(read({"run", "--nonsense"}), 2);
+    EXPECT_EQ(errors,
+              "vantel-host: there is no option \"--nonsense\"; --help behind a command lists "
+              "them\n");
 }
 
 TEST(CommandLine, HelpIsNoMistake) {
