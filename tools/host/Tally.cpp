@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
-#include <fmt/format.h>
+#include "PairFilter.h"
 
 namespace vantelhost {
 
@@ -31,9 +31,7 @@ std::string zeroOffsets(const OffsetStatistics& offsets) {
     if (offsets.count < fewest || offsets.smallest != 0 || offsets.largest != 0) {
         return {};
     }
-    return fmt::format(
-        "offset exactly 0 in {0} of {0} pairs: no delay is measured: delayMechanism?",
-        offsets.count);
+    return onlyZerosText({0, 0, static_cast<std::size_t>(offsets.count)});
 }
 
 } // namespace vantelhost
