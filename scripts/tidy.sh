@@ -1,13 +1,17 @@
 #!/usr/bin/env bash
 # Runs clang-tidy over files and folders (default: the library); every finding fails.
+# The exit status is 77, after a line with the reason, where there is no clang-tidy of the right version.
 # usage: scripts/tidy.sh [file or folder]...
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-if ! command -v clang-tidy-14 clang++ >/dev/null; then
-  echo "tidy: clang-tidy-14 or clang is missing; run scripts/setup.sh checks" >&2
-  exit 1
-fi
+for tool in clang-tidy-14 clang++; do
+  if ! command -v "$tool" >/dev/null; then
+    echo "SKIPPED: $tool is missing, and other versions find other things. Debian 12 has it: run" \
+      "scripts/setup.sh checks" >&2
+    exit 77
+  fi
+done
 if [[ $# -eq 0 ]]; then
   set -- source support
 fi
