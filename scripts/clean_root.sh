@@ -8,6 +8,21 @@ debian_mirror() {
     "Codename: $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release)" | sort -u | head -n 1
 }
 
+# Runs a command in a root as in a system that was booted from it, with processes and mounts of its own: /
+# is a mount point there, which it is in no chroot, and which scripts/testbed.sh needs.
+run_booted() { # root, command...
+  # The words of the inner shell are its own.
+  # shellcheck disable=SC2016
+  unshare --mount --pid --fork --kill-child bash -euc '
+    mount --rbind "$1" "$1"
+    cd "$1"
+    mount -t proc proc proc
+    mount --move . /
+    shift
+    exec chroot . env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin HOME=/root LC_ALL=C.UTF-8 "$@"' \
+    booted "$@" </dev/null
+}
+
 # Makes a root, in which the hooks among the options do the work, and removes it. Where none can be made, it
 # ends the script with status 77, after a line that says why: hooks print "the root is there" first.
 in_clean_root() { # release, log, options of mmdebstrap and further mirrors...

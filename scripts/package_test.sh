@@ -14,7 +14,8 @@ packages=("$PWD"/build/packages/*_"$architecture".deb)
 hook="$PWD/tests/packaging/installed_test.sh"
 
 if [[ $architecture == "$native" ]]; then
-  options=(--variant=apt --customize-hook="$hook \"\$1\" native ${packages[*]}")
+  options=(--variant=apt "--include=iproute2,linuxptp,mount,systemd-standalone-tmpfiles"
+    --customize-hook="$hook \"\$1\" native ${packages[*]}")
 else
   # Nothing of another architecture can run in the root: apt resolves, and only unpacks.
   repository=$(mktemp -d)

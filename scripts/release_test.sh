@@ -6,23 +6,10 @@ set -euo pipefail
 cd "$(dirname "$0")/.."
 . scripts/clean_root.sh
 
-# The hook of mmdebstrap. To the scenes of the tests the root must look as one that was booted: / is a mount
-# point, which it is in no chroot.
-run_in_root() { # root
-  echo "release_test: the root is there"
-  # The words of the inner shell are its own.
-  # shellcheck disable=SC2016
-  unshare --mount --pid --fork --kill-child bash -euc '
-    mount --rbind "$1" "$1"
-    cd "$1"
-    mount -t proc proc proc
-    mount --move . /
-    exec chroot . env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin HOME=/root LC_ALL=C.UTF-8 \
-      sh -euc "cd /project; scripts/demo.sh; scripts/check.sh"' inside "$1" </dev/null
-}
-
+# The hook of mmdebstrap, below.
 if [[ ${1-} == --inside ]]; then
-  run_in_root "$2"
+  echo "release_test: the root is there"
+  run_booted "$2" sh -euc 'cd /project; scripts/demo.sh; scripts/check.sh'
   exit
 fi
 release=${1-}

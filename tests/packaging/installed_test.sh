@@ -4,6 +4,8 @@
 # usage: tests/packaging/installed_test.sh ROOT native|armhf PACKAGE.deb...
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
+# shellcheck source=scripts/clean_root.sh
+. "$here/../../scripts/clean_root.sh"
 root=$1
 kind=$2
 shift 2
@@ -26,9 +28,9 @@ if [[ $kind != native ]]; then
   }
 fi
 
-# What packages may leave changed: apt's and dpkg's own records.
+# What packages may leave changed: apt's and dpkg's own records, and what the next boot removes.
 list_files() {
-  (cd "$root" && find . -xdev \( -path ./proc -o -path ./sys -o -path ./dev -o -path ./tmp \
+  (cd "$root" && find . -xdev \( -path ./proc -o -path ./sys -o -path ./dev -o -path ./tmp -o -path ./run \
     -o -path ./packages -o -path ./var/lib/apt -o -path ./var/lib/dpkg -o -path ./var/cache \
     -o -path ./var/log \) -prune -o -print) | sort
 }
@@ -55,7 +57,10 @@ purge_packages() {
 
 # The headers and libraries come from the root, all else from here.
 compile() { # source, program
-  "$compiler" -I"$root/usr/include" "$1" -rdynamic -ldl -o "$root$2"
+  local flags folder=("$root"/usr/lib/*/pkgconfig)
+  read -ra flags < <(PKG_CONFIG_LIBDIR=${folder[0]} PKG_CONFIG_SYSROOT_DIR=$root \
+    pkg-config --cflags --libs vantel_bc)
+  "$compiler" "$1" "${flags[@]}" -o "$root$2"
 }
 
 check_hosts() {
@@ -76,6 +81,39 @@ check_tools() {
   done
 }
 
+# The plug-in is built for the place where Debian has ptp4l.
+check_daemon_path() {
+  grep -qF /usr/sbin/ptp4l "$root"/usr/lib/*/libvantel_bc.so.19 ||
+    fail "the library does not know /usr/sbin/ptp4l"
+}
+
+# Nothing but the packages is there: no link, no folder made by hand. Where the root has no time stamps in
+# hardware, ptp4l becomes a script as README.Debian says.
+check_clock() {
+  local output status=0
+  [[ -d $root/run/morwen/ClockHub ]] || fail "the folder of configFile was not made"
+  output=$(in_root vantel-host check --interface lo --set networkTransport=UDPv4) || true
+  grep -q '^ok    daemon  *//*usr/sbin/ptp4l' <<<"$output" || fail "check says: $output"
+
+  in_root dpkg-divert --rename --add --divert /usr/sbin/ptp4l.distrib /usr/sbin/ptp4l
+  printf '#!/bin/sh\nexec /usr/sbin/ptp4l.distrib -S "$@"\n' >"$root/usr/sbin/ptp4l"
+  chmod 755 "$root/usr/sbin/ptp4l"
+  cp "$here/../../scripts/testbed.sh" "$root"
+  # A scene has an empty /run, as a boot has.
+  output=$(run_booted "$root" /testbed.sh -- sh -ec '
+    systemd-tmpfiles --create libvantel-bc19.conf
+    vantel-host run --interface bc0 --set networkTransport=UDPv4 --create-fifo --seconds 15 --plain' \
+    2>&1) || status=$?
+  if [[ $status -eq 77 ]]; then
+    echo "installed_test: not run: $output"
+  else
+    [[ $status -eq 0 && $output =~ pair\ .*pair\  ]] || fail "run ended with $status: $output"
+    tail -n 1 <<<"$output"
+  fi
+  rm "$root/usr/sbin/ptp4l" "$root/testbed.sh"
+  in_root dpkg-divert --rename --remove /usr/sbin/ptp4l
+}
+
 echo "installed_test: the root is there"
 before=$(list_files)
 if [[ $kind == native ]]; then
@@ -83,7 +121,9 @@ if [[ $kind == native ]]; then
 fi
 check_hosts
 check_tools
+check_daemon_path
 if [[ $kind == native ]]; then
+  check_clock
   purge_packages
   diff <(echo "$before") <(list_files) || fail "this is left, or lost"
 fi

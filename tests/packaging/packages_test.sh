@@ -76,6 +76,7 @@ SameBuildGivesTheSameOctets() {
 LibraryPackageHoldsTheLibraryAlone() {
   expect_equal "files" "usr/lib/TRIPLET/libvantel_bc.so.19 -> libvantel_bc.so.19.0.0
 usr/lib/TRIPLET/libvantel_bc.so.19.0.0
+usr/lib/tmpfiles.d/libvantel-bc19.conf
 usr/share/doc/libvantel-bc19/CHANGELOG.md
 usr/share/doc/libvantel-bc19/README.Debian
 usr/share/doc/libvantel-bc19/changelog.gz
@@ -89,6 +90,7 @@ usr/include/vantel_bc/status.h
 usr/include/vantel_bc/zekel.h
 usr/include/vantel_bc/zekeltr.h
 usr/lib/TRIPLET/libvantel_bc.so -> libvantel_bc.so.19
+usr/lib/TRIPLET/pkgconfig/vantel_bc.pc
 usr/share/doc/libvantel-bc-dev/changelog.gz
 usr/share/doc/libvantel-bc-dev/configuration.md
 usr/share/doc/libvantel-bc-dev/copyright
@@ -99,8 +101,11 @@ usr/share/doc/libvantel-bc-dev/operations.md
 usr/share/doc/libvantel-bc-dev/wire-format.md" "$(files libvantel-bc-dev)"
 }
 
-HostPackageHoldsBothToolsWithManualPagesAndScripts() {
-  local expected=(usr/bin/simptp4l usr/bin/vantel-host usr/share/doc/vantel-host/simptp4l.md) file
+HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
+  local expected=(usr/bin/simptp4l usr/bin/vantel-host) file
+  for file in configuration host-interface oddities operations security simptp4l vantel-host; do
+    expected+=("usr/share/doc/vantel-host/$file.md")
+  done
   for file in "$here"/../../tools/simptp4l/examples/*.sim; do
     expected+=("usr/share/doc/vantel-host/examples/${file##*/}")
   done
@@ -138,19 +143,33 @@ DependenciesNameTheLibrariesInUse() {
   names() { field "$1" Depends | sed 's/ ([^)]*)//g'; }
   expect_equal "libraries of the library" "libc6, libcjson1, libgcc-s1, libstdc++6" \
     "$(names libvantel-bc19)"
-  expect_equal "libraries of the tools" "libc6, libfmt9, libgcc-s1, libstdc++6, libvantel-bc19" \
-    "$(names vantel-host)"
+  # Each release of Debian has its own fmt.
+  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libstdc++6, libvantel-bc19" \
+    "$(names vantel-host | sed 's/libfmt[0-9]*/libfmtN/')"
 }
 
-NoPackageRunsScriptsOfItsOwn() {
+# Scripts of the packages, as "package: script".
+scripts() {
   local package
   for package in libvantel-bc19 libvantel-bc-dev vantel-host; do
     rm -rf "$scratch/control"
     dpkg-deb --control "$(deb $package)" "$scratch/control"
-    if compgen -G "$scratch/control/p*"; then
-      fail "$package has maintainer scripts"
-    fi
+    find "$scratch/control" -name 'p*' -printf "$package: %f\n"
   done
+}
+
+LibraryPackageAloneRunsAScript() {
+  expect_equal "scripts" "libvantel-bc19: postinst" "$(scripts)"
+}
+
+LibraryPackageMakesTheFolderOfTheDefaultConfigurationFile() {
+  local folder
+  dpkg-deb -x "$(deb libvantel-bc19)" "$scratch/root"
+  folder=$(grep -o '/[^"]*/ptp4l_bc\.conf' "$here/../../source/parameterSchema.cpp")
+  # tmpfiles.d warns of the old name of /run.
+  folder=${folder%/*}
+  grep -qx "d ${folder#/var} 0755 root root -" \
+    "$scratch/root/usr/lib/tmpfiles.d/libvantel-bc19.conf" || fail "$folder is not made"
 }
 
 LibraryIsStrippedAndKeepsItsNotes() {
