@@ -14,13 +14,14 @@ run_booted() { # root, command...
   # The words of the inner shell are its own.
   # shellcheck disable=SC2016
   unshare --mount --pid --fork --kill-child bash -euc '
+    export PATH=/usr/sbin:/usr/bin:/sbin:/bin
     mount --rbind "$1" "$1"
     cd "$1"
     mount -t proc proc proc
-    mount --move . /
+    pivot_root . mnt
+    umount -l /mnt
     shift
-    exec chroot . env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin HOME=/root LC_ALL=C.UTF-8 "$@"' \
-    booted "$@" </dev/null
+    exec env -i PATH="$PATH" HOME=/root LC_ALL=C.UTF-8 "$@"' booted "$@" </dev/null
 }
 
 # Makes a root, in which the hooks among the options do the work, and removes it. Where none can be made, it
@@ -28,12 +29,16 @@ run_booted() { # root, command...
 in_clean_root() { # release, log, options of mmdebstrap and further mirrors...
   local release=$1 log=$2 mirror status=0
   shift 2
+  if ! command -v mmdebstrap >/dev/null; then
+    echo "SKIPPED: mmdebstrap is missing; run scripts/setup.sh packages"
+    exit 77
+  fi
   mirror=$(debian_mirror)
   mkdir -p "${log%/*}"
   mmdebstrap --format=null --dpkgopt=force-unsafe-io --aptopt='Acquire::Retries "3"' \
     "$release" - ${mirror:+"$mirror"} "$@" 2>&1 | tee "$log" || status=$?
   if [[ $status -ne 0 ]] && ! grep -q ': the root is there$' "$log"; then
-    echo "SKIPPED: no clean root can be made here: $(grep -m 1 '^E: ' "$log")"
+    echo "SKIPPED: no clean root can be made here: $(grep -m 1 '^E: ' "$log" || tail -n 1 "$log")"
     exit 77
   fi
   return "$status"

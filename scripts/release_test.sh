@@ -27,7 +27,7 @@ trap 'rm -rf "$folder"' EXIT
 chmod 755 "$folder"
 git archive --prefix project/ --output "$folder/project.tar" HEAD
 
-in_clean_root "$release" "$log" --variant=apt --include=mount \
+in_clean_root "$release" "$log" --variant=minbase \
   --customize-hook="tar-in $folder/project.tar /" \
   --customize-hook="$PWD/scripts/release_test.sh --inside \"\$1\""
 if grep -E '^CMake .*Warning|: warning: ' "$log" | grep -v '^update-alternatives: '; then

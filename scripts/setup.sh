@@ -10,7 +10,7 @@ set -euo pipefail
 
 build=(cmake ninja-build g++ pkg-config libcjson-dev libboost-dev nlohmann-json3-dev libcli11-dev
   libfmt-dev systemtap-sdt-dev)
-daemon=(linuxptp iproute2 util-linux procps)
+daemon=(linuxptp iproute2 mount util-linux procps)
 tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
   gnuplot-nox libxml2-utils mandoc groff-base)
 # chrony would take the place of another time daemon, so nobody gets it who only wants to build.
