@@ -34,6 +34,6 @@ if grep -E '^CMake .*Warning|: warning: ' "$log" | grep -v '^update-alternatives
   echo "release_test: these are warnings" >&2
   exit 1
 fi
-echo
-echo "$release: demo: $(grep -m 1 ' pairs, .* errors' "$log")"
-echo "$release: check: $(grep '% tests passed' "$log" | tail -n 1)"
+demo=$(grep -m 1 ' pairs, .* errors' "$log")
+check=$(grep '% tests passed' "$log" | tail -n 1)
+printf '\n%s: demo: %s\n%s: check: %s\n' "$release" "$demo" "$release" "$check"

@@ -95,7 +95,7 @@ check_clock() {
   output=$(in_root vantel-host check --interface lo --set networkTransport=UDPv4) || true
   grep -q '^ok    daemon  *//*usr/sbin/ptp4l' <<<"$output" || fail "check says: $output"
 
-  in_root dpkg-divert --rename --add --divert /usr/sbin/ptp4l.distrib /usr/sbin/ptp4l
+  in_root dpkg-divert --add --rename /usr/sbin/ptp4l
   printf '#!/bin/sh\nexec /usr/sbin/ptp4l.distrib -S "$@"\n' >"$root/usr/sbin/ptp4l"
   chmod 755 "$root/usr/sbin/ptp4l"
   cp "$here/../../scripts/testbed.sh" "$root"
