@@ -13,7 +13,7 @@ case ${1:-} in
     ;;
 esac
 if ! command -v clang-format-14 >/dev/null; then
-  echo "SKIPPED: clang-format-14 is missing, and others format otherwise. Debian 12 has it: run" \
+  echo "SKIPPED: clang-format-14 is missing. Another version would format otherwise. Debian 12 has it: run" \
     "scripts/setup.sh checks" >&2
   exit 77
 fi

@@ -7,7 +7,7 @@ cd "$(dirname "$0")/.."
 
 for tool in clang-tidy-14 clang++; do
   if ! command -v "$tool" >/dev/null; then
-    echo "SKIPPED: $tool is missing, and other versions find other things. Debian 12 has it: run" \
+    echo "SKIPPED: $tool is missing. Another version would find other things. Debian 12 has it: run" \
       "scripts/setup.sh checks" >&2
     exit 77
   fi

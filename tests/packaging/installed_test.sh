@@ -30,8 +30,8 @@ fi
 
 # What packages may leave changed: apt's and dpkg's own records, and what the next boot removes.
 list_files() {
-  (cd "$root" && find . -xdev \( -path ./proc -o -path ./sys -o -path ./dev -o -path ./tmp -o -path ./run \
-    -o -path ./packages -o -path ./var/lib/apt -o -path ./var/lib/dpkg -o -path ./var/cache \
+  (cd "$root" && find . -xdev \( -path ./proc -o -path ./sys -o -path ./dev -o -path ./tmp \
+    -o -path ./run -o -path ./packages -o -path ./var/lib/apt -o -path ./var/lib/dpkg -o -path ./var/cache \
     -o -path ./var/log \) -prune -o -print) | sort
 }
 
@@ -93,7 +93,7 @@ check_clock() {
   local output status=0
   [[ -d $root/run/morwen/ClockHub ]] || fail "the folder of configFile was not made"
   output=$(in_root vantel-host check --interface lo --set networkTransport=UDPv4) || true
-  grep -q '^ok    daemon  *//*usr/sbin/ptp4l' <<<"$output" || fail "check says: $output"
+  grep -q '^ok    daemon  */usr/sbin/ptp4l' <<<"$output" || fail "check says: $output"
 
   in_root dpkg-divert --add --rename /usr/sbin/ptp4l
   printf '#!/bin/sh\nexec /usr/sbin/ptp4l.distrib -S "$@"\n' >"$root/usr/sbin/ptp4l"
