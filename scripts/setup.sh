@@ -8,8 +8,9 @@
 #   packages  build Debian packages, check and install them
 set -euo pipefail
 
-build=(cmake ninja-build g++ pkg-config libcjson-dev libboost-dev nlohmann-json3-dev libcli11-dev
-  libfmt-dev systemtap-sdt-dev)
+# GCC optimises across files with make, and warns without it.
+build=(cmake ninja-build g++ make pkg-config libcjson-dev libboost-dev nlohmann-json3-dev
+  libcli11-dev libfmt-dev systemtap-sdt-dev)
 daemon=(linuxptp iproute2 mount util-linux procps)
 tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
   gnuplot-nox libxml2-utils mandoc groff-base)
