@@ -43,6 +43,7 @@ interrupt_when_shown() { # process group, text, file
 check() { # status, command, text
   local output=$place/output status=0
   echo "==> $2"
+  : >"$output" # what the last command showed counts for that one alone
   set -m # a process group of its own, which hears interrupts
   bash -c "$2" >"$output" 2>&1 </dev/null &
   set +m
