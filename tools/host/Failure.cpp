@@ -51,8 +51,8 @@ std::optional<Failure> failureOf(const RunFacts& facts) {
     if (facts.tally.offsets.count == 0) {
         return facts.seconds > facts.patience ? std::optional(withoutPairs(facts)) : std::nullopt;
     }
-    if (auto zeros = zeroOffsets(facts.tally.offsets); !zeros.empty()) {
-        return Failure{std::move(zeros), "--set delayMechanism=..., as the network has it"};
+    if (auto frozen = frozenOffsets(facts.tally.offsets); !frozen.empty()) {
+        return Failure{std::move(frozen), "--set delayMechanism=..., as the network has it"};
     }
     if (!facts.chronyFailure.empty()) {
         return Failure{"chronyd " + facts.chronyFailure,

@@ -24,6 +24,16 @@ Journal::Journal(EventSink output, std::function<void(const std::string&)> onLos
 
 void Journal::addOutput(const std::string& name, EventSink output) {
     outputs_.push_back({name, std::move(output), [](const std::string&) {}, false});
+    const auto events = early_.value();
+    for (const auto& [event, moment] : events) {
+        if (const auto loss = give(outputs_.back(), event, moment)) {
+            tell({*loss}, moment);
+        }
+    }
+}
+
+void Journal::outputsAreComplete() {
+    early_.reset();
 }
 
 void Journal::handPairsTo(PairTaker taker) {
@@ -119,19 +129,33 @@ void Journal::print(const Event& event) {
 }
 
 void Journal::pass(const Event& event, const Moment& moment) {
+    if (early_) {
+        early_->emplace_back(event, moment);
+    }
     std::vector<Event> losses;
     for (auto& output : outputs_) {
-        if (!output.lost && !output.take(event, moment)) {
-            const std::string reason = std::system_category().message(errno);
-            losses.push_back(failureEvent(output.name, reason));
-            output.lost = true;
-            output.onLost(reason);
+        if (auto loss = give(output, event, moment)) {
+            losses.push_back(std::move(*loss));
         }
     }
+    tell(losses, moment);
+}
+
+void Journal::tell(const std::vector<Event>& losses, const Moment& moment) {
     for (const auto& loss : losses) {
         ++tally_.errors;
         pass(loss, moment);
     }
+}
+
+std::optional<Event> Journal::give(Output& output, const Event& event, const Moment& moment) {
+    if (output.lost || output.take(event, moment)) {
+        return std::nullopt;
+    }
+    const std::string reason = std::system_category().message(errno);
+    output.lost = true;
+    output.onLost(reason);
+    return failureEvent(output.name, reason);
 }
 
 } // namespace vantelhost

@@ -6,6 +6,7 @@
 #include <mutex>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "Events.h"
@@ -33,9 +34,13 @@ public:
     Journal(EventSink output, std::function<void(const std::string&)> onLostOutput,
             Moment::Clock::time_point begin = Moment::Clock::now());
 
-    /// One more output. To be called before other threads use the journal, as the next.
+    /// One more output, which also gets what has come so far. To be called before other threads use
+    /// the journal, as the next two.
     /// @param name for people
     void addOutput(const std::string& name, EventSink output);
+
+    /// There will be no more outputs: what has come so far need not be kept.
+    void outputsAreComplete();
 
     /// Who gets the time pairs besides.
     void handPairsTo(PairTaker taker);
@@ -77,10 +82,15 @@ private:
 
     void print(const Event& event);
     void pass(const Event& event, const Moment& moment);
+    void tell(const std::vector<Event>& losses, const Moment& moment);
+
+    /// @return the loss, if the output has now lost this event.
+    static std::optional<Event> give(Output& output, const Event& event, const Moment& moment);
 
     mutable std::mutex mutex_;
     const Moment::Clock::time_point begin_;
     std::vector<Output> outputs_;
+    std::optional<std::vector<std::pair<Event, Moment>>> early_{std::in_place};
     PairTaker pairTaker_;
     std::string lastQuality_;
     Tally tally_;

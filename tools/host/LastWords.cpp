@@ -25,6 +25,8 @@ LastWords::Redirection::Redirection(LastWords& words)
     }
     // The writing end stays as it is: whoever gets it may rely on waiting.
     ::fcntl(ends[0], F_SETFL, O_NONBLOCK);
+    // Nobody reads while the plug-in stops ptp4l, which must not wait for that with its last words.
+    ::fcntl(ends[0], F_SETPIPE_SZ, 1 << 20);
     ::dup2(ends[1], STDERR_FILENO);
     ::close(ends[1]);
     words.reading_ = ends[0];
@@ -44,7 +46,7 @@ LastWords::~LastWords() {
 }
 
 void LastWords::take() {
-    constexpr int most = 16; // a pipe full: a writer that never pauses must not hold the host
+    constexpr int most = 256; // a pipe full: a writer that never pauses must not hold the host
     std::array<char, 4096> buffer{};
     for (int i = 0; i < most && reading_ >= 0; ++i) {
         const ssize_t count = ::read(reading_, buffer.data(), buffer.size());

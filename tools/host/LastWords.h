@@ -36,6 +36,8 @@ public:
     /// Takes what has come. Never waits.
     void take();
 
+    bool arePassedOn() const { return passOn_ >= 0; }
+
     /// At most three, oldest first.
     std::deque<std::string> lines() const;
 

@@ -4,10 +4,10 @@
 
 namespace vantelhost {
 
-std::string onlyZerosText(const PairCounts& counts) {
-    return fmt::format("offset exactly 0 in {0} of {0} pairs: no delay is measured: "
+std::string noDelayText(std::int64_t offset, std::uint64_t count) {
+    return fmt::format("offset exactly {0} in {1} of {1} pairs: no delay is measured: "
                        "delayMechanism?",
-                       counts.falseOffsets);
+                       offset == 0 ? "0" : fmt::format("{} ns", offset), count);
 }
 
 void PairFilter::epochOffset(std::int64_t nanoseconds) {

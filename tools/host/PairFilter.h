@@ -27,8 +27,8 @@ struct PairCounts {
     bool onlyZeros() const { return measured == 0 && falseOffsets > 0; }
 };
 
-/// What to say about counts with only zeros.
-std::string onlyZerosText(const PairCounts& counts);
+/// What to say about so many pairs that all have this offset, in nanoseconds.
+std::string noDelayText(std::int64_t offset, std::uint64_t count);
 
 /// Tells the time pairs of a session that are measurements from those that are none. Wants to hear
 /// all that the session reports, in its order. Knows nothing of threads.

@@ -15,26 +15,36 @@ namespace vantelhost {
 
 namespace {
 
-/// What keeps a file that is open from being this process's own and empty; null when nothing does.
-const char* problemWith(int descriptor) {
+bool isRegular(int descriptor) {
     struct stat state {};
-    if (::fstat(descriptor, &state) != 0 || !S_ISREG(state.st_mode)) {
-        return nullptr;
-    }
-    if (::flock(descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) {
-        return "somebody else writes it";
-    }
-    return ::ftruncate(descriptor, 0) == 0 ? nullptr : std::strerror(errno);
+    return ::fstat(descriptor, &state) == 0 && S_ISREG(state.st_mode);
+}
+
+bool isSomebodyElses(int descriptor) {
+    return isRegular(descriptor) && ::flock(descriptor, LOCK_EX | LOCK_NB) != 0 &&
+           errno == EWOULDBLOCK;
+}
+
+[[noreturn]] void refuse(const std::string& path, const char* problem) {
+    throw UsageError(fmt::format("cannot write {}: {}", path, problem));
 }
 
 } // namespace
 
 RecordFile::RecordFile(const std::string& path)
-    : descriptor_(::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644)) {
-    const char* const problem = descriptor_ < 0 ? std::strerror(errno) : problemWith(descriptor_);
-    if (problem != nullptr) {
+    : path_(path), descriptor_(::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644)) {
+    if (descriptor_ < 0) {
+        refuse(path, std::strerror(errno));
+    }
+    if (isSomebodyElses(descriptor_)) {
         ::close(descriptor_);
-        throw UsageError(fmt::format("cannot write {}: {}", path, problem));
+        refuse(path, "somebody else writes it");
+    }
+}
+
+void RecordFile::begin() const {
+    if (isRegular(descriptor_) && ::ftruncate(descriptor_, 0) != 0) {
+        refuse(path_, std::strerror(errno));
     }
 }
 

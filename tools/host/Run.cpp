@@ -81,8 +81,16 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
       signals_(signals),
       journal_(output(), onLostOutput, begin_),
       callbacks_(journal_, options.refuseWhileStopping, [this] { return signals_.stopHasCome(); }),
-      words_(view_ ? -1 : STDERR_FILENO) {
-    connectOutputs();
+      words_(view_ && ::isatty(STDERR_FILENO) == 1 ? -1 : STDERR_FILENO) {
+    if (!options_.recordFile.empty()) {
+        record_.emplace(options_.recordFile);
+    }
+    if (!options_.chronySocket.empty()) {
+        chrony_.emplace(options_.chronySocket);
+        journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
+            return chrony_->take(reference, local);
+        });
+    }
 }
 
 EventSink Run::output() {
@@ -94,20 +102,6 @@ EventSink Run::output() {
     }
     view_.emplace(STDOUT_FILENO, begin_);
     return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };
-}
-
-void Run::connectOutputs() {
-    if (!options_.recordFile.empty()) {
-        record_.emplace(options_.recordFile);
-        journal_.addOutput("record " + options_.recordFile,
-                           EventPrinter(record_->descriptor(), Format::jsonLines));
-    }
-    if (!options_.chronySocket.empty()) {
-        chrony_.emplace(options_.chronySocket);
-        journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
-            return chrony_->take(reference, local);
-        });
-    }
 }
 
 int Run::execute() {
@@ -124,14 +118,16 @@ void Run::session() {
     const PlugIn plugIn(options_.pluginPath);
     journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
     Schema schema;
-    // Nothing is begun when the output or the record is lost already.
     if (!journal_.isClean() || !readSchema(plugIn, schema)) {
+        beginRecord();
         return;
     }
     const Json settings = completedSettings(schema);
     prepare(settings);
     openFifo();
-    if (initialise(plugIn, settings)) {
+    beginRecord();
+    // Nothing is begun when the output or the record is lost already.
+    if (journal_.isClean() && initialise(plugIn, settings)) {
         startAndStop(plugIn);
         plugIn.finalise(callbacks_.slot());
     }
@@ -177,6 +173,15 @@ void Run::prepare(const Json& settings) {
     facts_.patience = patienceFor(settings);
 }
 
+void Run::beginRecord() {
+    if (record_) {
+        record_->begin();
+        journal_.addOutput("record " + options_.recordFile,
+                           EventPrinter(record_->descriptor(), Format::jsonLines));
+    }
+    journal_.outputsAreComplete();
+}
+
 bool Run::initialise(const PlugIn& plugIn, const Json& settings) {
     HostStatus status;
     plugIn.initialise(callbacks_.slot(), settings.dump(), status);
@@ -200,6 +205,15 @@ void Run::startAndStop(const PlugIn& plugIn) {
     journal_.note(stoppedEvent());
     if (view_) {
         view_->close();
+        tellLastWords();
+    }
+}
+
+void Run::tellLastWords() {
+    if (!words_.arePassedOn() && facts_.daemonEnd.empty()) {
+        for (const auto& line : words_.lines()) {
+            complain("ptp4l: " + line);
+        }
     }
 }
 
@@ -292,8 +306,9 @@ void Run::tellDaemonEnd(const ChildEnd& end) {
     if (end.bySignal || end.status != notExecuted || !words_.lines().empty()) {
         return;
     }
+    // Only of the library that was built with this program the path is known.
     const Finding daemon = checkDaemon(Subject());
-    if (daemon.verdict == Verdict::fail) {
+    if (options_.pluginPath == RunOptions().pluginPath && daemon.verdict == Verdict::fail) {
         facts_.daemonEnd += ": " + daemon.found;
         facts_.daemonMend = daemon.mend;
     }

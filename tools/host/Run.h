@@ -35,16 +35,21 @@ public:
 
 private:
     EventSink output();
-    void connectOutputs();
 
     /// The steps of a run. A step that says false ends the run; the journal then knows why.
     void session();
     bool readSchema(const PlugIn& plugIn, Schema& schema);
     Json completedSettings(const Schema& schema) const;
     void prepare(const Json& settings);
+
+    /// Mistakes are refused before: an old record is then left as it was.
+    void beginRecord();
     bool initialise(const PlugIn& plugIn, const Json& settings);
     void startAndStop(const PlugIn& plugIn);
     bool start(const PlugIn& plugIn);
+
+    /// Those that a view would have been spoilt by.
+    void tellLastWords();
 
     /// Start and wait do not throw: the plug-in's child must be stopped whatever happens.
     /// @return why the run ends.

@@ -25,13 +25,13 @@ double OffsetStatistics::rms() const {
                       : static_cast<double>(std::sqrt(squares / static_cast<long double>(count)));
 }
 
-std::string zeroOffsets(const OffsetStatistics& offsets) {
-    // A sound ptp4l begins with up to 14 of them.
+std::string frozenOffsets(const OffsetStatistics& offsets) {
+    // A sound ptp4l begins with up to 15 of them.
     constexpr std::uint64_t fewest = 20;
-    if (offsets.count < fewest || offsets.smallest != 0 || offsets.largest != 0) {
+    if (offsets.count < fewest || offsets.smallest != offsets.largest) {
         return {};
     }
-    return onlyZerosText({0, 0, static_cast<std::size_t>(offsets.count)});
+    return noDelayText(offsets.smallest, offsets.count);
 }
 
 } // namespace vantelhost

@@ -22,9 +22,10 @@ struct OffsetStatistics {
     double rms() const;
 };
 
-/// What is to be said of offsets that are all exactly 0, as only those of a clock that measures no
-/// delay are; empty when there are others, or so few that it may only have begun.
-std::string zeroOffsets(const OffsetStatistics& offsets);
+/// What is to be said of offsets that are all exactly the same, as only those of a clock that
+/// measures no delay are: 0, or the epoch offset. Empty when they differ, or are so few that it may
+/// only have begun.
+std::string frozenOffsets(const OffsetStatistics& offsets);
 
 struct Tally {
     OffsetStatistics offsets;          ///< one for each time pair

@@ -118,13 +118,14 @@ std::string hintText(const ViewState& state, double now) {
     constexpr std::uint64_t few = 2; // of a poll or two, while the quality changes
     const bool isUsable = state.quality == "usable";
     if (isUsable && state.allOffsets.count == 0 && now > state.qualitySince + patience) {
-        return "no time pairs though the quality is usable: is the epoch FIFO there?";
+        return "no time pairs though the quality is usable: no epoch FIFO? Or, in ptp4l's log, "
+               "\"SYNC without timestamp\"?";
     }
     if (state.quality == "unusable" && state.pairsSinceQuality > few) {
         return "time pairs come though the quality is unusable: it stays so until the grandmaster "
                "changes or the host is restarted (silent-recovery)";
     }
-    return zeroOffsets(state.allOffsets);
+    return frozenOffsets(state.allOffsets);
 }
 
 std::string windowText(const ViewState& state, double now) {

@@ -68,6 +68,16 @@ TEST(Failure, OffsetsThatAreAllExactlyZeroMeasureNoDelay) {
     EXPECT_EQ(causeOf(facts), "");
 }
 
+TEST(Failure, OffsetsThatAreAllTheEpochOffsetMeasureNoDelay) {
+    auto facts = inVain();
+    for (int i = 0; i < 20; ++i) {
+        EXPECT_EQ(causeOf(facts).substr(0, 6), i == 0 ? "no tim" : "");
+        facts.tally.offsets.add(37000000000);
+    }
+    EXPECT_EQ(causeOf(facts), "offset exactly 37000000000 ns in 20 of 20 pairs: no delay is "
+                              "measured: delayMechanism?");
+}
+
 TEST(Failure, AChronydThatTookNothingIsOne) {
     auto facts = inVain();
     facts.tally.offsets.add(5);

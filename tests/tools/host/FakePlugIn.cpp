@@ -197,7 +197,7 @@ private:
     void playConcurrently() {
         const auto work = [this] {
             for (std::uint64_t i = 0; i < 250; ++i) {
-                pair(i, i + 5);
+                pair(i + 5, i % 2 == 0 ? i : i + 10);
                 update(metadata);
                 CallStatus call;
                 std::uint64_t time = 0;

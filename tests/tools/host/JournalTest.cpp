@@ -162,6 +162,30 @@ TEST_F(JournalTest, ALostSecondOutputIsAnErrorThatTheOthersAreToldOnce) {
     EXPECT_EQ(shown[2]["event"], "stopped");
 }
 
+TEST_F(JournalTest, ALaterOutputGetsWhatHasComeBefore) {
+    journal.note(startedEvent());
+    std::vector<std::string> names;
+    journal.addOutput("record r", [&](const Event& event, const Moment&) {
+        names.push_back(event.name);
+        return true;
+    });
+    journal.outputsAreComplete();
+    journal.note(stoppedEvent());
+    EXPECT_THAT(names, testing::ElementsAre("started", "stopped"));
+    EXPECT_EQ(events().size(), 2U);
+}
+
+TEST_F(JournalTest, ALaterOutputThatLosesWhatCameBeforeIsTold) {
+    journal.note(startedEvent());
+    journal.addOutput("record r", [](const Event&, const Moment&) {
+        errno = ENOSPC;
+        return false;
+    });
+    EXPECT_FALSE(journal.isClean());
+    EXPECT_EQ(events().at(1)["operation"], "record r");
+    EXPECT_EQ(events().size(), 2U);
+}
+
 TEST_F(JournalTest, EveryOutputGetsTheSameMoment) {
     std::vector<Moment> moments;
     for (int i = 0; i < 2; ++i) {

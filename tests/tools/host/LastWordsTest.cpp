@@ -62,7 +62,7 @@ TEST(LastWords, WithoutAWriterNothingIsWaitedFor) {
 
 TEST(LastWords, OfMuchTheEndIsKept) {
     LastWords words(-1);
-    say(words, std::string(60000, 'x') + "\nthe end\n");
+    say(words, std::string(600000, 'x') + "\nthe end\n");
     words.take();
     EXPECT_EQ(words.lines().back(), "the end");
     EXPECT_LE(words.lines().front().size(), 2000U);

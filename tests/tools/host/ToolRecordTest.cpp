@@ -77,6 +77,13 @@ TEST_F(ToolRecordTest, AFileThatAnotherRunWritesIsLeftAlone) {
     EXPECT_EQ(recorded().events().at(0)["event"], "loaded");
 }
 
+TEST_F(ToolRecordTest, AMistakeLeavesAnOldFileAsItWas) {
+    writeFile(file, "old\n");
+    const auto result = play("", {"--record", file, "--set", "count=x"});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(contentOf(file), "old\n");
+}
+
 TEST_F(ToolRecordTest, AnUnwritablePathIsAMistake) {
     const auto result = play("", {"--record", folder.path("none/run.jsonl")});
     EXPECT_EQ(result.status, 2);

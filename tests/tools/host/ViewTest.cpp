@@ -238,8 +238,10 @@ TEST(View, AUsableQualityWithoutPairsGetsAHint) {
     ViewState state = running();
     update(state, qualityEvent(usable.data(), "PTP role has changed."), 5);
     EXPECT_THAT(viewLines(state, 10, roomy), Not(Contains(StartsWith("hint"))));
-    EXPECT_EQ(viewLines(state, 11, roomy)[7],
-              "hint          no time pairs though the quality is usable: is the epoch FIFO there?");
+    EXPECT_EQ(
+        viewLines(state, 11, roomy)[7],
+        "hint          no time pairs though the quality is usable: no epoch FIFO? Or, in ptp4l's "
+        "log, \"SYNC without timestamp\"?");
 }
 
 TEST(View, OffsetsOfExactlyZeroGetAHint) {

@@ -30,7 +30,7 @@ std::string notes(const Recording& recording) {
         html += note("The recording has no summary: the host still ran, or was killed.");
     }
     if (recording.counts.onlyZeros()) {
-        html += note(onlyZerosText(recording.counts));
+        html += note(noDelayText(0, recording.counts.falseOffsets));
     }
     return html;
 }
