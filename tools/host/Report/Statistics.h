@@ -13,7 +13,9 @@ namespace vantelhost {
 /// @param perMille 0 to 1000; 500 is the median.
 template <typename Number>
 Number percentile(const std::vector<Number>& sorted, unsigned perMille) {
-    const std::size_t rank = (perMille * sorted.size() + 999) / 1000;
+    // Of some millions the product is beyond 32 bits.
+    const auto rank =
+        static_cast<std::size_t>((std::uint64_t{perMille} * sorted.size() + 999) / 1000);
     return sorted[rank == 0 ? 0 : rank - 1];
 }
 

@@ -39,6 +39,13 @@ TEST(Percentile, OfHundredValuesIsTheirNumber) {
     EXPECT_EQ(percentile(values, 990), 99);
 }
 
+TEST(Percentile, OfMillionsOfValuesNeedsMoreThan32Bits) {
+    std::vector<std::uint8_t> values(4300000, 0);
+    values.back() = 1;
+    EXPECT_EQ(percentile(values, 999), 0);
+    EXPECT_EQ(percentile(values, 1000), 1);
+}
+
 TEST(Bulk, ASpikeOfThreeValuesDoesNotCount) {
     auto values = range(0, 399);
     values.insert(values.end(), {5000000, 6000000, 7000000});
