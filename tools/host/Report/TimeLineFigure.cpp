@@ -38,9 +38,10 @@ constexpr std::array<Colour, 14> colours{{
     {"unusable: PTP sub process has died unexpectedly", 0xC0392B},
     {"unusable: Unable to communicate with PTP sub process while attempting to retrieve time data",
      0xE08E0B},
+    // It follows, and stays so where ptp4l steers no clock: as good as a slave.
+    {"PTP_UNCALIBRATED", 0x2A9D4A},
     {"PTP_SLAVE", 0x2A9D4A},
     {"PTP_MASTER", 0x3B7DD8},
-    {"PTP_UNCALIBRATED", 0xE08E0B},
     {"PTP_LISTENING", 0x9AA0A6},
     {"PTP_FAULTY", 0xC0392B},
     {"PTP_PASSIVE", 0x8E5EA2},
