@@ -1,6 +1,7 @@
 // The command "report".
 
 #include <algorithm>
+#include <csignal>
 #include <cstdlib>
 #include <filesystem>
 #include <regex>
@@ -10,6 +11,7 @@
 #include "Tool.h"
 
 using testing::AllOf;
+using testing::ContainsRegex;
 using testing::HasSubstr;
 using testing::Not;
 using vantelhost::Json;
@@ -298,6 +300,16 @@ TEST_F(ToolReportDrawingTest, OnlyOffsetsOfZeroAreAskedFor) {
     EXPECT_THAT(html, Not(HasSubstr("<h2>Allan deviation</h2>")));
 }
 
+TEST_F(ToolReportDrawingTest, OnlyZerosThatAreTheCauseAreToldOnce) {
+    ASSERT_EQ(play("zeros", {"--record", recording}).status, 1);
+    const auto html = pageOf(contentOf(recording));
+    EXPECT_EQ(count(html, "class=\"note\""), 1U);
+    EXPECT_THAT(html, HasSubstr("<p class=\"note\">offset exactly 0 in 20 of 20 pairs: no delay is "
+                                "measured: delayMechanism? -- mend: --set delayMechanism=..., as "
+                                "the network has it</p>"));
+    EXPECT_THAT(html, HasSubstr("No offset is a measurement."));
+}
+
 TEST_F(ToolReportDrawingTest, ASpikeIsMarkedAtTheEdgeAndDoesNotFlattenTheOthers) {
     Record record;
     for (int i = 0; i < 400; ++i) {
@@ -359,6 +371,22 @@ TEST_F(ToolReportTest, ARecordingOfNothingButTheStartNeedsNoDrawing) {
     EXPECT_THAT(html,
                 AllOf(HasSubstr("There are no time pairs."), HasSubstr("No quality was reported."),
                       HasSubstr("No port"), HasSubstr("No errors, warnings or refused calls.")));
+}
+
+TEST_F(ToolReportTest, ADeadDaemonIsTheFirstThingTold) {
+    Child child(command({"--interface", "eth0", "--set", "child=echo bad option >&2; exit 3",
+                         "--json", "--record", recording}));
+    ASSERT_TRUE(child.waitForOutput("\"event\":\"daemon-ended\""));
+    child.signal(SIGTERM);
+    ASSERT_EQ(child.wait(), 1);
+    const auto html = pageOf(contentOf(recording));
+    EXPECT_THAT(html, ContainsRegex("<p>Recording of vantel-host</p>\n<p class=\"note\">ptp4l, "
+                                    "process [0-9]+, ended with status 3; its last words: bad "
+                                    "option -- mend: &quot;vantel-host check&quot; with the "));
+    EXPECT_THAT(html, HasSubstr("<tr><td>Errors</td><td>1</td></tr>"));
+    EXPECT_THAT(html, AllOf(HasSubstr("<td>daemon-ended</td><td>ptp4l, process "),
+                            HasSubstr("<td>cause</td><td>ptp4l, process "),
+                            HasSubstr("<td>mend</td><td>&quot;vantel-host check")));
 }
 
 TEST_F(ToolReportTest, AKilledHostAndACutLineAreTold) {

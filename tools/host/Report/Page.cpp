@@ -17,19 +17,29 @@ namespace vantelhost {
 
 namespace {
 
+/// Why the run was in vain, and what to do about it.
+std::string causeNote(const Recording& recording) {
+    if (recording.cause.empty()) {
+        return "";
+    }
+    return note(recording.cause + (recording.mend.empty() ? "" : " -- mend: " + recording.mend));
+}
+
 /// What a reader must know before the figures.
 std::string notes(const Recording& recording) {
     if (recording.lines == 0) {
         return note("The recording is empty.");
     }
-    std::string html;
+    std::string html = causeNote(recording);
     if (recording.truncated) {
         html += note("The last line of the recording is cut; it is left out.");
     }
     if (!recording.summarised) {
         html += note("The recording has no summary: the host still ran, or was killed.");
     }
-    if (recording.counts.onlyZeros()) {
+    // The cause may say so already, of the pairs as the run counted them.
+    const bool isTold = recording.cause.find("no delay is measured") != std::string::npos;
+    if (recording.counts.onlyZeros() && !isTold) {
         html += note(noDelayText(0, recording.counts.falseOffsets));
     }
     return html;

@@ -39,7 +39,7 @@ struct ChronyCount {
     std::uint64_t failed;
 };
 
-/// An error, a warning or a refused call.
+/// An error, a warning or a refused call; ptp4l's end; the cause of a run in vain, and its mend.
 struct Problem {
     double seconds;
     std::string kind;
@@ -81,6 +81,8 @@ struct Recording {
     std::string plugIn;      ///< its name; empty when it was not loaded
     std::string plugInFile;
     std::string stopCause; ///< empty when the host was not stopped
+    std::string cause;     ///< why the run was in vain; empty when it was not, or was not told
+    std::string mend;      ///< what to do about it
     PairCounts counts;
     std::vector<Pair> pairs;        ///< the measured ones; with only zeros, those of offset 0
     First<QualityChange> qualities; ///< only what differs from the one before

@@ -1,13 +1,17 @@
 #include "Report/RecordingReader.h"
 
+#include <algorithm>
+#include <array>
 #include <cerrno>
 #include <cstring>
+#include <deque>
 #include <stdexcept>
 #include <string_view>
 #include <vector>
 
 #include <fmt/format.h>
 
+#include "Events.h"
 #include "Report/JsonText.h"
 #include "UsageError.h"
 
@@ -32,10 +36,27 @@ std::string portLabel(const std::string& name, const Json& port) {
     return interface.empty() ? name : name + " " + interface;
 }
 
+bool isProblem(std::string_view event) {
+    constexpr std::array<std::string_view, 6> problems{"error",        "warning", "refused",
+                                                       "daemon-ended", "cause",   "mend"};
+    return std::find(problems.begin(), problems.end(), event) != problems.end();
+}
+
+/// As the host told it.
+std::string daemonEndText(const Json& line) {
+    const bool bySignal = line.contains("signal");
+    const ChildEnd end{line.at("pid").get<pid_t>(), bySignal,
+                       line.at(bySignal ? "signal" : "status").get<int>()};
+    return daemonEndedEvent(end, line.at("words").get<std::deque<std::string>>()).text;
+}
+
 /// What went wrong, in words.
-std::string problemText(const Json& line) {
+std::string problemText(const std::string& kind, const Json& line) {
+    if (kind == "daemon-ended") {
+        return daemonEndText(line);
+    }
     std::string text;
-    for (const char* key : {"operation", "function", "code", "problem", "status"}) {
+    for (const char* key : {"operation", "function", "code", "problem", "status", "text"}) {
         const auto word = jsonText(line, key);
         text += (text.empty() || word.empty() ? "" : ": ") + word;
     }
@@ -85,8 +106,8 @@ void RecordingReader::take(const Json& line) {
         takeQuality(line);
     } else if (event == "metadata") {
         takeMetadata(line);
-    } else if (event == "error" || event == "warning" || event == "refused") {
-        takeProblem(line);
+    } else if (isProblem(event)) {
+        takeProblem(event, line);
     } else {
         takeOther(event, line);
     }
@@ -164,12 +185,21 @@ void RecordingReader::takePorts(const Json& metadata) {
     portStates_ = std::move(states);
 }
 
-void RecordingReader::takeProblem(const Json& line) {
-    const auto kind = line.at("event").get<std::string>();
-    ++(kind == "error"     ? recording_.errors
-       : kind == "warning" ? recording_.warnings
-                           : recording_.refused);
-    recording_.problems.add({seconds_, kind, problemText(line)});
+void RecordingReader::takeProblem(const std::string& kind, const Json& line) {
+    const auto text = problemText(kind, line);
+    recording_.problems.add({seconds_, kind, text});
+    if (kind == "error") {
+        ++recording_.errors;
+    } else if (kind == "warning") {
+        ++recording_.warnings;
+    } else if (kind == "refused") {
+        ++recording_.refused;
+    } else if (kind == "cause") {
+        ++recording_.errors;
+        recording_.cause = text;
+    } else if (kind == "mend") {
+        recording_.mend = text;
+    }
 }
 
 void RecordingReader::takeOther(const std::string& event, const Json& line) {

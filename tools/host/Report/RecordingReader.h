@@ -27,7 +27,7 @@ private:
     void takeQuality(const Json& line);
     void takeMetadata(const Json& line);
     void takePorts(const Json& metadata);
-    void takeProblem(const Json& line);
+    void takeProblem(const std::string& kind, const Json& line);
     void takeOther(const std::string& event, const Json& line);
 
     Recording recording_;

@@ -143,6 +143,33 @@ TEST(RecordingReader, ProblemsAreCountedByKind) {
     EXPECT_EQ(problems[3].text, "zekel_getTime");
 }
 
+TEST(RecordingReader, ADaemonThatEndedIsAProblemWithItsLastWords) {
+    const auto recording =
+        read(line("daemon-ended", 1, R"("pid":71,"status":3,"words":["one","bad option"])") +
+             line("daemon-ended", 2, R"("pid":72,"signal":9,"words":[])"));
+    EXPECT_EQ(recording.errors, 0U);
+    const auto& problems = recording.problems.items();
+    ASSERT_EQ(problems.size(), 2U);
+    EXPECT_EQ(problems[0].kind, "daemon-ended");
+    EXPECT_EQ(problems[0].text,
+              "ptp4l, process 71, ended with status 3; its last words: one / bad option");
+    EXPECT_EQ(problems[1].text, "ptp4l, process 72, was ended by SIGKILL, without a word");
+}
+
+TEST(RecordingReader, TheCauseOfARunInVainIsAnErrorThatItsMendFollows) {
+    const auto recording =
+        read(line("cause", 1, R"("text":"no time pair came")") + line("mend", 1, R"("text":"x")"));
+    EXPECT_EQ(recording.cause, "no time pair came");
+    EXPECT_EQ(recording.mend, "x");
+    EXPECT_EQ(recording.errors, 1U);
+    const auto& problems = recording.problems.items();
+    ASSERT_EQ(problems.size(), 2U);
+    EXPECT_EQ(problems[0].kind, "cause");
+    EXPECT_EQ(problems[0].text, "no time pair came");
+    EXPECT_EQ(problems[1].kind, "mend");
+    EXPECT_EQ(problems[1].text, "x");
+}
+
 TEST(RecordingReader, OfThousandsOnlyTheFirstAreKept) {
     std::string text;
     for (int i = 0; i < 5002; ++i) {
@@ -189,6 +216,7 @@ TEST(RecordingReader, WhatIsNoRecordIsNamedWithItsLine) {
              line("started", 4),
              line("started", 1e300 / 1e290),
              line("quality", 6, R"("quality":5,"reason":"")"),
+             line("daemon-ended", 6, R"("pid":1,"words":[])"),
          }) {
         EXPECT_THAT(complaint(good + bad + good), StartsWith(prefix)) << bad;
     }
