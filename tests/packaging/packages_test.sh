@@ -121,6 +121,29 @@ HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
   fi
 }
 
+# Links to other places, without the headings there, as "document link".
+links_in() { # folder
+  (cd "$1" && grep -roE --include='*.md' '\]\([^)#]+' . | grep -v '://' | sed 's/:](/ /')
+}
+
+LinksOfDocumentsLeadToWhatThePackageHolds() {
+  local package folder document link
+  for package in libvantel-bc-dev vantel-host; do
+    dpkg-deb -x "$(deb $package)" "$scratch/$package"
+    folder=$scratch/$package/usr/share/doc/$package
+    links_in "$folder" >"$scratch/links"
+    while read -r document link; do
+      [[ -e $folder/${document%/*}/$link ]] || fail "$package: $document links to $link"
+    done <"$scratch/links"
+    for link in configuration.md oddities.md operations.md host-interface.md; do
+      grep -q " $link\$" "$scratch/links" || fail "$package: nothing links to $link"
+    done
+  done
+  # The last package is vantel-host.
+  grep -qxF "./configuration.md vantel-host.md" "$scratch/links" || fail "vantel-host.md is not linked to"
+  grep -qF "as DaemonMessages.cpp lists it" "$folder/vantel-host.md" || fail "a link's text is lost"
+}
+
 FieldsSayWhatDebianMustKnow() {
   local package
   for package in libvantel-bc19 libvantel-bc-dev vantel-host; do
