@@ -104,8 +104,8 @@ check_clock() {
     systemd-tmpfiles --create libvantel-bc19.conf
     vantel-host run --interface bc0 --set networkTransport=UDPv4 --create-fifo --seconds 15 --plain' \
     2>&1) || status=$?
-  if [[ $status -eq 77 ]]; then
-    echo "installed_test: not run: $output"
+  if [[ $status -eq 77 ]] && skipped=$(grep '^SKIPPED: ' <<<"$output"); then
+    echo "$skipped"
   else
     [[ $status -eq 0 && $output =~ pair\ .*pair\  ]] || fail "run ended with $status: $output"
     tail -n 1 <<<"$output"
@@ -114,6 +114,7 @@ check_clock() {
   in_root dpkg-divert --rename --remove /usr/sbin/ptp4l
 }
 
+skipped= # the line that says why the clock was not run
 echo "installed_test: the root is there"
 before=$(list_files)
 if [[ $kind == native ]]; then
@@ -127,4 +128,4 @@ if [[ $kind == native ]]; then
   purge_packages
   diff <(echo "$before") <(list_files) || fail "this is left, or lost"
 fi
-echo "installed_test: passed"
+echo "installed_test: passed${skipped:+, but a run of the clock was $skipped}"
