@@ -1,6 +1,5 @@
 #include "CheckCommand.h"
 
-#include <cstdio>
 #include <memory>
 #include <string>
 
@@ -14,6 +13,7 @@
 #include "SettingsOptions.h"
 #include "Text.h"
 #include "UsageError.h"
+#include "WriteAll.h"
 
 namespace vantelhost {
 
@@ -40,10 +40,8 @@ int check(const CheckOptions& options) {
     for (auto& result : checkMachine(subject)) {
         results.push_back(std::move(result));
     }
-    const std::string text =
-        options.json ? toAscii(checkJson(results)) + "\n" : checkLines(results);
-    std::fputs(text.c_str(), stdout);
-    return std::fflush(stdout) == 0 && allHold(results) ? exitClean : exitFailed;
+    writeOutput(options.json ? toAscii(checkJson(results)) + "\n" : checkLines(results));
+    return allHold(results) ? exitClean : exitFailed;
 }
 
 } // namespace

@@ -10,7 +10,6 @@
 
 #include <CLI/CLI.hpp>
 #include <fmt/format.h>
-#include <unistd.h>
 
 #include "RecordFile.h"
 #include "Report/Page.h"
@@ -38,11 +37,10 @@ Recording readRecording(const std::string& path) {
 constexpr const char* standardOutput = "-";
 
 void writePage(const std::string& path, const std::string& page) {
-    const bool isFile = path != standardOutput;
-    const auto file = isFile ? std::make_unique<RecordFile>(path) : nullptr;
-    if (!writeAll(isFile ? file->descriptor() : STDOUT_FILENO, page)) {
-        throw std::runtime_error(fmt::format(
-            "cannot write {}: {}", isFile ? path : "the standard output", std::strerror(errno)));
+    if (path == standardOutput) {
+        writeOutput(page);
+    } else if (const RecordFile file(path); !writeAll(file.descriptor(), page)) {
+        throw std::runtime_error(fmt::format("cannot write {}: {}", path, std::strerror(errno)));
     }
 }
 

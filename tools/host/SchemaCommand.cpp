@@ -13,6 +13,7 @@
 #include "SchemaTable.h"
 #include "Text.h"
 #include "UsageError.h"
+#include "WriteAll.h"
 
 namespace vantelhost {
 
@@ -36,9 +37,8 @@ int showSchema(const SchemaOptions& options) {
         return exitFailed;
     }
     try {
-        const std::string shownText = options.raw ? text : schemaTable(parseSchema(text));
-        std::fputs(shownText.c_str(), stdout);
-        return std::fflush(stdout) == 0 ? exitClean : exitFailed;
+        writeOutput(options.raw ? text : schemaTable(parseSchema(text)));
+        return exitClean;
     } catch (const SchemaError& error) {
         fmt::print(stderr, "vantel-host: {}\n", onOneLine(error.what()));
         return exitFailed;

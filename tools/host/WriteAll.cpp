@@ -2,7 +2,10 @@
 
 #include <cerrno>
 #include <cstddef>
+#include <cstring>
+#include <stdexcept>
 
+#include <fmt/format.h>
 #include <unistd.h>
 
 namespace vantelhost {
@@ -17,6 +20,13 @@ bool writeAll(int descriptor, std::string_view text) {
         }
     }
     return true;
+}
+
+void writeOutput(std::string_view text) {
+    if (!writeAll(STDOUT_FILENO, text)) {
+        throw std::runtime_error(
+            fmt::format("cannot write the standard output: {}", std::strerror(errno)));
+    }
 }
 
 } // namespace vantelhost

@@ -9,4 +9,8 @@ namespace vantelhost {
 /// @return false when that failed; errno says why.
 bool writeAll(int descriptor, std::string_view text);
 
+/// Writes the whole text to the standard output, at once.
+/// @throws std::runtime_error when that failed, which says why
+void writeOutput(std::string_view text);
+
 } // namespace vantelhost

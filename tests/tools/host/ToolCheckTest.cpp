@@ -174,6 +174,18 @@ TEST_F(ToolCheckTest, AMistakeOnTheCommandLineIsNoCheck) {
     EXPECT_THAT(result.output, IsEmpty());
 }
 
+TEST_F(ToolCheckTest, AnOutputThatIsLostIsTold) {
+    for (const std::string options : {"", " --json"}) {
+        Child child({"/bin/sh", "-c",
+                     "exec \"$0\" check --library \"$1\" --no-interfaces >/dev/full" + options,
+                     HOST_TOOL, FAKE_PLUGIN},
+                    {schema("[global]\n")});
+        EXPECT_EQ(child.wait(), 1);
+        EXPECT_EQ(child.errors(),
+                  "vantel-host: cannot write the standard output: No space left on device\n");
+    }
+}
+
 TEST_F(ToolCheckTest, TheHelpNamesWhatCannotBeSeen) {
     const auto result = check({"--help"});
     EXPECT_EQ(result.status, 0);

@@ -46,6 +46,16 @@ TEST(SchemaCommand, ShowsTheRawTextUnchanged) {
     EXPECT_EQ(result.output, " { \"odd\" : 1 }\n");
 }
 
+TEST(SchemaCommand, AnOutputThatIsLostIsTold) {
+    for (const std::string options : {"", " --json"}) {
+        Child child({"/bin/sh", "-c", "exec \"$0\" schema --library \"$1\" >/dev/full" + options,
+                     HOST_TOOL, FAKE_PLUGIN});
+        EXPECT_EQ(child.wait(), 1);
+        EXPECT_EQ(child.errors(),
+                  "vantel-host: cannot write the standard output: No space left on device\n");
+    }
+}
+
 TEST(SchemaCommand, FailsWithThePlugIn) {
     const auto result = schema({"--library", FAKE_PLUGIN}, {"FAKE_SCHEMA=fails"});
     EXPECT_EQ(result.status, 1);
