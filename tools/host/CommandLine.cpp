@@ -58,7 +58,7 @@ int execute(const std::vector<Subcommand>& subcommands, int argc, const char* co
     }
     CLI::App app("A host for the boundary clock plug-in.", "vantel-host");
     app.set_version_flag("--version", "vantel-host " VANTEL_HOST_VERSION);
-    app.require_subcommand(1);
+    app.require_subcommand(0, 1);
     std::vector<std::pair<CLI::App*, std::function<int()>>> actions;
     for (const auto& subcommand : subcommands) {
         auto* command = app.add_subcommand(subcommand.name, subcommand.description);
@@ -76,7 +76,7 @@ int execute(const std::vector<Subcommand>& subcommands, int argc, const char* co
             return action();
         }
     }
-    return exitUsage;
+    return refuse(complaintAbout(subcommands, nullptr));
 }
 
 } // namespace vantelhost

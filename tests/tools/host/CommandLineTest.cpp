@@ -147,6 +147,16 @@ TEST(CommandLine, AMistakeIsToldWithWhatThereIs) {
               "them\n");
 }
 
+TEST(CommandLine, AMistakeInFrontOfTheCommandIsToldAlike) {
+    for (const auto& words : std::vector<Arguments>{{"--frob"}, {"--frob", "run"}}) {
+        EXPECT_EQ(read(words), 2);
+        EXPECT_EQ(errors, "vantel-host: there is no option \"--frob\"; --help behind a command "
+                          "lists them\n");
+    }
+    EXPECT_EQ(read({"--"}), 2);
+    EXPECT_EQ(errors, "vantel-host: a command is missing; the commands are: run, other\n");
+}
+
 TEST(CommandLine, HelpIsNoMistake) {
     for (const auto& words :
          std::vector<Arguments>{{"--help"}, {"run", "--help"}, {"other", "--help"}}) {
