@@ -26,13 +26,13 @@ bool isAllowed(const std::string& path, int mode) {
     return ::faccessat(AT_FDCWD, path.c_str(), mode, AT_EACCESS) == 0;
 }
 
-Finding checkFolderOf(const std::string& file) {
+Finding checkFolderOf(const std::string& file, const char* otherMend) {
     const std::string folder = folderOf(file);
     struct stat state {};
     if (::stat(folder.c_str(), &state) != 0) {
         const int error = errno;
         return bad(fmt::format("{}: {}", folder, std::strerror(error)),
-                   error == ENOENT ? "mkdir -p " + folder : "");
+                   error == ENOENT ? "mkdir -p " + folder + otherMend : "");
     }
     if (!S_ISDIR(state.st_mode)) {
         return bad(folder + ": is not a folder", "");

@@ -11,6 +11,7 @@ namespace vantelhost {
 bool isAllowed(const std::string& path, int mode);
 
 /// The folder of a file is there, and files can be made in it.
-Finding checkFolderOf(const std::string& file);
+/// @param otherMend follows the mend of a missing folder
+Finding checkFolderOf(const std::string& file, const char* otherMend = "");
 
 } // namespace vantelhost

@@ -53,7 +53,7 @@ Finding checkConfigFile(const Subject& subject) {
     }
     struct stat state {};
     if (::stat(path->c_str(), &state) != 0) {
-        return checkFolderOf(*path);
+        return checkFolderOf(*path, "; \"vantel-host run\" makes it by itself");
     }
     if (!S_ISREG(state.st_mode)) {
         return bad(*path + ": is not a file", "choose another path: --set configFile=...");

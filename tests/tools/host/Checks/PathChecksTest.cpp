@@ -33,7 +33,8 @@ TEST_F(CheckTest, AConfigFileThatIsThereIsGoodAndStays) {
 TEST_F(CheckTest, AConfigFileInAMissingFolderFails) {
     set("configFile", folder.path("a/b/c.conf"));
     EXPECT_THAT(checkConfigFile(subject), says(Verdict::fail, "a/b: No such file or directory",
-                                               "mkdir -p " + folder.path("a/b")));
+                                               "mkdir -p " + folder.path("a/b") +
+                                                   "; \"vantel-host run\" makes it by itself"));
 }
 
 TEST_F(CheckTest, AConfigFileBelowAFileFails) {
@@ -75,6 +76,7 @@ TEST_F(CheckTest, SocketsInAMissingFolderFail) {
     set("udsAddress", folder.path("none/uds"));
     subject.socketPrefix = folder.path("none/own.");
     EXPECT_THAT(checkUdsFolder(subject), says(Verdict::fail, "none: No such file"));
+    EXPECT_EQ(checkUdsFolder(subject).mend, "mkdir -p " + folder.path("none"));
     EXPECT_THAT(checkOwnSocket(subject), says(Verdict::fail, "none: No such file"));
 }
 
