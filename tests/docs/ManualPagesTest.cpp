@@ -94,6 +94,7 @@ TEST(ManualPagesTest, HostsCommandsAreAllInItsSynopsis) {
         shown.insert((*found)[1]);
     }
     EXPECT_EQ(shown, commands());
+    EXPECT_NE(text.find("\n.B vantel-host --version\n"), std::string::npos);
 }
 
 TEST(ManualPagesTest, SimulatorsOptionsAreThoseOfItsHelp) {
