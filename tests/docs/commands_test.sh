@@ -23,6 +23,7 @@ make_place() {
   done
   ln -s "$build" "$place/build/release"
   ln -s "$build" "$place/build/demo"
+  ln -s "$build" "$place/build/package"
   ln -s "$build/tools/host/vantel-host" "$place/programs"
   # The demo would build again what is there.
   # shellcheck disable=SC2016
