@@ -94,6 +94,33 @@ protected:
     const fs::path folder = projectFolder / "tools" / tool.name;
 };
 
+/// Whether a mangled name is of the plug-in's own code. Without regular expressions: a tool has
+/// tens of thousands of names.
+bool isOfThePlugIn(const std::string& name) {
+    for (const char* inside : {"11zekelVantel", "6zesdbg", "zesdbg_VarLine"}) {
+        if (name.find(inside) != std::string::npos) {
+            return true;
+        }
+    }
+    const std::string errors = "5zeerr";
+    for (auto at = name.find(errors); at != std::string::npos; at = name.find(errors, at + 1)) {
+        // The status is a type of the interface.
+        if (name.compare(at + errors.size(), 7, "6Status") != 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+TEST(ToolBoundary, NamesOfThePlugInAreTold) {
+    EXPECT_TRUE(isOfThePlugIn("_ZN11zekelVantel10tMsgBuffer5clearEv"));
+    EXPECT_TRUE(isOfThePlugIn("_ZN14zesdbg_VarLine6appendE"));
+    EXPECT_TRUE(isOfThePlugIn("_ZN6zesdbg8settingsE"));
+    EXPECT_TRUE(isOfThePlugIn("_ZN5zeerr7setCodeERNS_6StatusEi"));
+    EXPECT_FALSE(isOfThePlugIn("_ZN10vantelhost10HostStatusC1EPN5zeerr6StatusE"));
+    EXPECT_FALSE(isOfThePlugIn("main"));
+}
+
 TEST_P(ToolBoundaryTest, OnlyTheInterfacesHeadersAreIncluded) {
     EXPECT_EQ(foreignHeaders(folder), tool.headers);
 }
@@ -110,12 +137,10 @@ TEST_P(ToolBoundaryTest, NothingOfThePlugInIsCompiledIn) {
 }
 
 TEST_P(ToolBoundaryTest, ProgramHoldsNothingOfThePlugIn) {
-    // The status is a type of the interface.
-    static const std::regex inside("11zekelVantel|6zesdbg|5zeerr(?!6Status)");
     const auto symbols = ElfFile(tool.program).symbols(SHT_SYMTAB);
     EXPECT_GE(symbols.size(), 100U);
     for (const auto& symbol : symbols) {
-        EXPECT_FALSE(std::regex_search(symbol.name, inside)) << symbol.name;
+        EXPECT_FALSE(isOfThePlugIn(symbol.name)) << symbol.name;
     }
 }
 
