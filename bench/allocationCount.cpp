@@ -128,7 +128,10 @@ void measure(const std::vector<std::uint16_t>& ports) {
 
 int main(int argc, char** argv) {
     std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
-    Program program("Prints how often a poll takes memory from the heap.");
-    program.option("--ports", ports, "numbers of ports");
-    return program.run(argc, argv, [&] { measure(ports); });
+    Program program;
+    Options options =
+        program.add("allocation_count", "Prints how often a poll takes memory from the heap.",
+                    [&] { measure(ports); });
+    options.add("--ports", ports, "numbers of ports");
+    return program.run(argc, argv);
 }

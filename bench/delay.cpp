@@ -13,6 +13,7 @@
 #include <fmt/format.h>
 
 #include "Host.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
@@ -117,13 +118,17 @@ void measureAll(const std::string& daemon, const std::vector<std::uint16_t>& rat
 
 } // namespace
 
-int main(int argc, char** argv) {
-    std::string daemon = "simptp4l";
-    std::vector<std::uint16_t> rates = {1, 8, 16};
-    int seconds = 60;
-    Program program("Prints how late time pairs are, and how many Syncs become one.");
-    program.option("--daemon", daemon, {"simptp4l", "ptp4l"}, "who measures");
-    program.option("--rates", rates, "Syncs a second; with ptp4l, that of the scene");
-    program.option("--seconds", seconds, "for each rate");
-    return program.run(argc, argv, [&] { measureAll(daemon, rates, seconds); });
+void addDelay(Program& program) {
+    struct Setting {
+        std::string daemon = "simptp4l";
+        std::vector<std::uint16_t> rates = {1, 8, 16};
+        int seconds = 60;
+    };
+    const auto setting = std::make_shared<Setting>();
+    Options options =
+        program.add("delay", "Prints how late time pairs are, and how many Syncs become one.",
+                    [setting] { measureAll(setting->daemon, setting->rates, setting->seconds); });
+    options.add("--daemon", setting->daemon, {"simptp4l", "ptp4l"}, "who measures");
+    options.add("--rates", setting->rates, "Syncs a second; with ptp4l, that of the scene");
+    options.add("--seconds", setting->seconds, "for each rate");
 }

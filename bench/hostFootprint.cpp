@@ -5,6 +5,7 @@
 #include <stdexcept>
 
 #include "Child.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
@@ -57,9 +58,10 @@ void measure(int rounds) {
 
 } // namespace
 
-int main(int argc, char** argv) {
-    int rounds = 9;
-    Program program("Prints what a host pays for the plug-in in load time and memory.");
-    program.option("--rounds", rounds, "fresh processes");
-    return program.run(argc, argv, [&] { measure(rounds); });
+void addHostFootprint(Program& program) {
+    const auto rounds = std::make_shared<int>(9);
+    Options options = program.add(
+        "host_footprint", "Prints what a host pays for the plug-in in load time and memory.",
+        [rounds] { measure(*rounds); });
+    options.add("--rounds", *rounds, "fresh processes");
 }

@@ -8,6 +8,7 @@
 #include <vantel_bc/zekeltr.h>
 
 #include "Clocks.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
@@ -79,9 +80,10 @@ void compare(int rounds) {
 
 } // namespace
 
-int main(int argc, char** argv) {
-    int rounds = 25;
-    Program program("Prints what zekeltr_initialize costs beside one parse of its text.");
-    program.option("--rounds", rounds, "turns of each");
-    return program.run(argc, argv, [&] { compare(rounds); });
+void addInitializeCost(Program& program) {
+    const auto rounds = std::make_shared<int>(25);
+    Options options = program.add(
+        "initialize_cost", "Prints what zekeltr_initialize costs beside one parse of its text.",
+        [rounds] { compare(*rounds); });
+    options.add("--rounds", *rounds, "turns of each");
 }

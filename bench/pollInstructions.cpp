@@ -2,11 +2,13 @@
 // program again with --run.
 
 #include <cstdlib>
+#include <filesystem>
 #include <stdexcept>
 
 #include "Child.h"
 #include "Daemons.h"
 #include "FetchClient.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Statistics.h"
@@ -26,11 +28,12 @@ void runPolls(std::uint16_t ports, int polls) {
     }
 }
 
-double countInstructions(const std::string& self, std::uint16_t ports, int polls) {
+double countInstructions(std::uint16_t ports, int polls) {
+    const std::string self = std::filesystem::read_symlink("/proc/self/exe");
     Child callgrind({"/usr/bin/valgrind", "--tool=callgrind", "--callgrind-out-file=/dev/null",
                      "--log-fd=1", "--toggle-collect=zekelVantel::tGetDataFromPtp4l::fetch(*)",
-                     self, "--run", "--ports", std::to_string(ports), "--polls",
-                     std::to_string(polls)});
+                     self, "poll_instructions", "--run", "--ports", std::to_string(ports),
+                     "--polls", std::to_string(polls)});
     std::string output;
     for (std::string piece = callgrind.read(); !piece.empty(); piece = callgrind.read()) {
         output += piece;
@@ -48,17 +51,17 @@ double countInstructions(const std::string& self, std::uint16_t ports, int polls
 }
 
 /// The first poll, which also opens the socket, does not count.
-double instructionsPerPoll(const std::string& self, std::uint16_t ports) {
-    return (countInstructions(self, ports, countedPolls + 1) - countInstructions(self, ports, 1)) /
+double instructionsPerPoll(std::uint16_t ports) {
+    return (countInstructions(ports, countedPolls + 1) - countInstructions(ports, 1)) /
            countedPolls;
 }
 
-void printAll(const std::string& self, const std::vector<std::uint16_t>& portCounts) {
+void printAll(const std::vector<std::uint16_t>& portCounts) {
     std::vector<double> x;
     std::vector<double> y;
     for (const std::uint16_t ports : portCounts) {
         x.push_back(ports);
-        y.push_back(instructionsPerPoll(self, ports));
+        y.push_back(instructionsPerPoll(ports));
         print({"instructions per poll", std::to_string(ports), y.back(), ""});
     }
     if (x.size() > 2) {
@@ -69,19 +72,23 @@ void printAll(const std::string& self, const std::vector<std::uint16_t>& portCou
 
 } // namespace
 
-int main(int argc, char** argv) {
-    std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
-    int polls = 1;
-    bool isInside = false;
-    Program program("Prints how many instructions a poll takes, counted by callgrind.");
-    program.option("--ports", ports, "numbers of ports");
-    program.option("--polls", polls, "with --run: how many");
-    program.flag("--run", isInside, "only poll, to be counted");
-    return program.run(argc, argv, [&] {
-        if (isInside) {
-            runPolls(ports.at(0), polls);
-        } else {
-            printAll(argv[0], ports);
-        }
-    });
+void addPollInstructions(Program& program) {
+    struct Setting {
+        std::vector<std::uint16_t> ports = {1, 2, 8, 32, 64};
+        int polls = 1;
+        bool isInside = false;
+    };
+    const auto setting = std::make_shared<Setting>();
+    Options options =
+        program.add("poll_instructions",
+                    "Prints how many instructions a poll takes, counted by callgrind.", [setting] {
+                        if (setting->isInside) {
+                            runPolls(setting->ports.at(0), setting->polls);
+                        } else {
+                            printAll(setting->ports);
+                        }
+                    });
+    options.add("--ports", setting->ports, "numbers of ports");
+    options.add("--polls", setting->polls, "with --run: how many");
+    options.addFlag("--run", setting->isInside, "only poll, to be counted");
 }

@@ -5,6 +5,7 @@
 #include "BareClient.h"
 #include "Daemons.h"
 #include "FetchClient.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Race.h"
 #include "Row.h"
@@ -61,14 +62,18 @@ void compare(int rounds, int answers) {
 
 } // namespace
 
-int main(int argc, char** argv) {
-    int rounds = 101;
-    int answers = 1000;
-    Program program("Prints how far the cost of a poll is from a straight line over the ports.");
-    program.option("--rounds", rounds, "turns of each client");
-    program.option("--answers", answers, "in one round, about");
-    return program.run(argc, argv, [&] {
-        useOneProcessor();
-        compare(rounds, answers);
-    });
+void addPollLine(Program& program) {
+    struct Lengths {
+        int rounds = 101;
+        int answers = 1000;
+    };
+    const auto lengths = std::make_shared<Lengths>();
+    Options options = program.add(
+        "poll_line", "Prints how far the cost of a poll is from a straight line over the ports.",
+        [lengths] {
+            useOneProcessor();
+            compare(lengths->rounds, lengths->answers);
+        });
+    options.add("--rounds", lengths->rounds, "turns of each client");
+    options.add("--answers", lengths->answers, "in one round, about");
 }

@@ -7,6 +7,7 @@
 
 #include "Clocks.h"
 #include "Host.h"
+#include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
@@ -57,9 +58,9 @@ void measure(int rounds) {
 
 } // namespace
 
-int main(int argc, char** argv) {
-    int rounds = 9;
-    Program program("Prints how long a host waits for a session.");
-    program.option("--rounds", rounds, "sessions");
-    return program.run(argc, argv, [&] { measure(rounds); });
+void addSessionTimes(Program& program) {
+    const auto rounds = std::make_shared<int>(9);
+    Options options = program.add("session_times", "Prints how long a host waits for a session.",
+                                  [rounds] { measure(*rounds); });
+    options.add("--rounds", *rounds, "sessions");
 }

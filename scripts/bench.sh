@@ -82,32 +82,32 @@ measure_size() { # name, library, strip, limit
 
 measure_all() {
   local bench=$build/bench count rate
-  measure "$bench/poll_cost" --daemon stub --ports "$ports" --rounds "$rounds" --answers "$answers"
-  measure "$bench/poll_line" --rounds "$rounds" --answers "$answers"
-  measure "$bench/poll_cost" --daemon simptp4l --ports "$ports" --rounds "$rounds" \
+  measure "$bench/measure" poll_cost --daemon stub --ports "$ports" --rounds "$rounds" --answers "$answers"
+  measure "$bench/measure" poll_line --rounds "$rounds" --answers "$answers"
+  measure "$bench/measure" poll_cost --daemon simptp4l --ports "$ports" --rounds "$rounds" \
     --answers "$answers"
   for count in "${real_ports[@]}"; do
-    measure_scene --ports "$count" -- "$bench/poll_cost" --daemon ptp4l --ports "$count" \
+    measure_scene --ports "$count" -- "$bench/measure" poll_cost --daemon ptp4l --ports "$count" \
       --rounds "$rounds" --answers "$answers"
   done
   if [[ -x /usr/bin/valgrind ]]; then
-    measure "$bench/poll_instructions" --ports "$ports"
+    measure "$bench/measure" poll_instructions --ports "$ports"
   else
     skipped+=("instructions: there is no /usr/bin/valgrind")
   fi
-  measure "$bench/allocation_count" --ports "$ports"
-  measure "$bench/initialize_cost" --rounds "$rounds"
-  measure "$bench/session_times" --rounds "$sessions"
-  measure "$bench/host_footprint" --rounds "$sessions"
+  measure "$bench/count_allocations" allocation_count --ports "$ports"
+  measure "$bench/measure" initialize_cost --rounds "$rounds"
+  measure "$bench/measure" session_times --rounds "$sessions"
+  measure "$bench/measure" host_footprint --rounds "$sessions"
   measure_size "$(dpkg --print-architecture)" "$build/source/libvantel_bc.so" strip 204800
   if [[ -n $armhf_library ]]; then
     measure_size armhf "$armhf_library" arm-linux-gnueabihf-strip 163840
   else
     skipped+=("size on armhf: nothing was built for it; scripts/setup.sh armhf installs what that needs")
   fi
-  measure "$bench/delay" --daemon simptp4l --rates "$(IFS=, && echo "${!log_syncs[*]}")" --seconds "$seconds"
+  measure "$bench/measure" delay --daemon simptp4l --rates "$(IFS=, && echo "${!log_syncs[*]}")" --seconds "$seconds"
   for rate in "${!log_syncs[@]}"; do
-    measure_scene --log-sync "${log_syncs[rate]}" -- "$bench/delay" --daemon ptp4l --rates "$rate" \
+    measure_scene --log-sync "${log_syncs[rate]}" -- "$bench/measure" delay --daemon ptp4l --rates "$rate" \
       --seconds "$seconds"
   done
 }

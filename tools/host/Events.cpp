@@ -24,26 +24,18 @@ const char* kindOf(const double* quality) {
     return std::memcmp(quality, unusable.data(), sizeof(unusable)) == 0 ? "unusable" : "other";
 }
 
-/// A member as people read it: strings bare, a missing member as "?".
-std::string member(const Json& object, const char* key) {
-    const auto found = object.find(key);
-    if (found == object.end()) {
-        return "?";
-    }
-    return found->is_string() ? found->get<std::string>() : shown(*found);
-}
-
 std::string portSummary(const std::string& name, const Json& port) {
-    return fmt::format("; {} {} on {}", name, member(port, "portState"), member(port, "interface"));
+    return fmt::format("; {} {} on {}", name, shownMember(port, "portState"),
+                       shownMember(port, "interface"));
 }
 
 /// The text of a status, as people read it.
 std::string statusSummary(const Json& object) {
-    std::string summary = fmt::format("{} at {}:{}", member(object, "error_constant"),
-                                      member(object, "file"), member(object, "line"));
+    std::string summary = fmt::format("{} at {}:{}", shownMember(object, "error_constant"),
+                                      shownMember(object, "file"), shownMember(object, "line"));
     for (const char* key : {"additionalInfo", "std_exception_what", "zesync_debug"}) {
         if (object.contains(key)) {
-            summary += ": " + member(object, key);
+            summary += ": " + shownMember(object, key);
         }
     }
     return summary;
@@ -113,9 +105,9 @@ Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offse
 }
 
 Event metadataEvent(const Json& metadata) {
-    std::string text =
-        fmt::format("grandmaster {} class {} {}", member(metadata, "gmClockId"),
-                    member(metadata, "gmClockClass"), member(metadata, "gmClockAccuracy"));
+    std::string text = fmt::format("grandmaster {} class {} {}", shownMember(metadata, "gmClockId"),
+                                   shownMember(metadata, "gmClockClass"),
+                                   shownMember(metadata, "gmClockAccuracy"));
     std::string ports;
     for (const auto& [key, value] : metadata.items()) {
         if (value.is_object()) {

@@ -18,7 +18,7 @@ namespace {
 
 constexpr char standardInput[] = "the standard input";
 
-[[noreturn]] void refuse(const std::string& name) {
+[[noreturn]] void refuseToRead(const std::string& name) {
     throw UsageError(fmt::format("cannot read {}: {}", name, std::strerror(errno)));
 }
 
@@ -26,7 +26,7 @@ std::string readAll(std::istream& stream, const std::string& name) {
     try {
         return std::string(std::istreambuf_iterator<char>(stream), {});
     } catch (const std::ios_base::failure&) { // a folder, for example
-        refuse(name);
+        refuseToRead(name);
     }
 }
 
@@ -64,7 +64,7 @@ std::optional<std::string> readConfig(const SettingsOptions& options) {
     }
     std::ifstream file(name, std::ios::binary);
     if (!file) {
-        refuse(name);
+        refuseToRead(name);
     }
     return readAll(file, name);
 }

@@ -39,6 +39,14 @@ std::string shown(const Json& value) {
     return text;
 }
 
+std::string shownMember(const Json& object, const char* key) {
+    const auto found = object.find(key);
+    if (found == object.end()) {
+        return "?";
+    }
+    return found->is_string() ? found->get<std::string>() : shown(*found);
+}
+
 bool isUtf8(const std::string& text) {
     try {
         static_cast<void>(Json(text).dump());

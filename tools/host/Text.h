@@ -17,6 +17,9 @@ std::string toAscii(const Json& value);
 /// The value for a message: JSON text, cut when long.
 std::string shown(const Json& value);
 
+/// A member as people read it: strings bare, a missing member as "?".
+std::string shownMember(const Json& object, const char* key);
+
 /// Whether JSON text can carry these octets.
 bool isUtf8(const std::string& text);
 

@@ -77,14 +77,6 @@ std::string shownDuration(double seconds) {
     return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
 }
 
-std::string member(const Json& object, const char* key) {
-    const auto found = object.find(key);
-    if (found == object.end()) {
-        return "?";
-    }
-    return found->is_string() ? found->get<std::string>() : shown(*found);
-}
-
 std::string qualityText(const ViewState& state, double now) {
     if (state.quality.empty()) {
         return "none yet";
@@ -98,8 +90,8 @@ std::string clockText(const Json& metadata, const char* identity, const char* cl
     if (metadata.empty()) {
         return "none yet";
     }
-    return fmt::format("{}, class {}, {}", member(metadata, identity), member(metadata, clockClass),
-                       member(metadata, accuracy));
+    return fmt::format("{}, class {}, {}", shownMember(metadata, identity),
+                       shownMember(metadata, clockClass), shownMember(metadata, accuracy));
 }
 
 std::string offsetText(const ViewState& state, double now) {
@@ -143,8 +135,8 @@ Lines portTexts(const Json& metadata) {
     Lines texts;
     for (const auto& [name, port] : metadata.items()) {
         if (port.is_object()) {
-            texts.push_back(fmt::format("{:<7} {:<17} {}", name, member(port, "portState"),
-                                        member(port, "interface")));
+            texts.push_back(fmt::format("{:<7} {:<17} {}", name, shownMember(port, "portState"),
+                                        shownMember(port, "interface")));
         }
     }
     return texts;

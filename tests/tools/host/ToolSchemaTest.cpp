@@ -9,8 +9,8 @@ using vantelhost::Json;
 
 namespace {
 
-Result schema(const std::vector<std::string>& options,
-              const std::vector<std::string>& environment = {}) {
+Result printedSchema(const std::vector<std::string>& options,
+                     const std::vector<std::string>& environment = {}) {
     std::vector<std::string> words{HOST_TOOL, "schema"};
     words.insert(words.end(), options.begin(), options.end());
     Child child(words, environment);
@@ -33,7 +33,7 @@ TEST(SchemaTable, HasALineForEachParameterUnderAHeading) {
 }
 
 TEST(SchemaCommand, ShowsThePlugInsParameters) {
-    const auto result = schema({"--library", FAKE_PLUGIN});
+    const auto result = printedSchema({"--library", FAKE_PLUGIN});
     EXPECT_EQ(result.status, 0);
     EXPECT_THAT(result.output, HasSubstr("wide     int     0 to 4294967295  4294967295  no\n"));
     EXPECT_EQ(result.errors, "");
@@ -41,7 +41,7 @@ TEST(SchemaCommand, ShowsThePlugInsParameters) {
 
 TEST(SchemaCommand, ShowsTheRawTextUnchanged) {
     const auto result =
-        schema({"--library", FAKE_PLUGIN, "--json"}, {"FAKE_SCHEMA= { \"odd\" : 1 }\n"});
+        printedSchema({"--library", FAKE_PLUGIN, "--json"}, {"FAKE_SCHEMA= { \"odd\" : 1 }\n"});
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.output, " { \"odd\" : 1 }\n");
 }
@@ -57,18 +57,18 @@ TEST(SchemaCommand, AnOutputThatIsLostIsTold) {
 }
 
 TEST(SchemaCommand, FailsWithThePlugIn) {
-    const auto result = schema({"--library", FAKE_PLUGIN}, {"FAKE_SCHEMA=fails"});
+    const auto result = printedSchema({"--library", FAKE_PLUGIN}, {"FAKE_SCHEMA=fails"});
     EXPECT_EQ(result.status, 1);
     EXPECT_THAT(result.errors, HasSubstr("code -52000, zeoskerr_memoryFull at fake:2"));
 }
 
 TEST(SchemaCommand, FailsOnASchemaThatMakesNoSense) {
-    const auto result = schema({"--library", FAKE_PLUGIN}, {"FAKE_SCHEMA={\"a\":3}"});
+    const auto result = printedSchema({"--library", FAKE_PLUGIN}, {"FAKE_SCHEMA={\"a\":3}"});
     EXPECT_EQ(result.status, 1);
     EXPECT_THAT(result.errors, HasSubstr("the schema of \"a\": not an object"));
 }
 
 TEST(SchemaCommand, RefusesALibraryThatIsNoPlugIn) {
-    EXPECT_EQ(schema({"--library", "/nowhere/none.so"}).status, 2);
-    EXPECT_EQ(schema({"--library", FAKE_PLUGIN_VERSION3}).status, 2);
+    EXPECT_EQ(printedSchema({"--library", "/nowhere/none.so"}).status, 2);
+    EXPECT_EQ(printedSchema({"--library", FAKE_PLUGIN_VERSION3}).status, 2);
 }

@@ -22,7 +22,7 @@ void PrintTo(const Change& change, std::ostream* out) {
     *out << change.name;
 }
 
-std::string nameOf(const testing::TestParamInfo<Change>& change) {
+std::string nameOfField(const testing::TestParamInfo<Change>& change) {
     return change.param.name;
 }
 
@@ -148,9 +148,9 @@ const Change fieldsThatDoNot[] = {
 };
 
 INSTANTIATE_TEST_SUITE_P(EachField, PtpMetaDataSeesTest, testing::ValuesIn(fieldsThatCount),
-                         nameOf);
+                         nameOfField);
 INSTANTIATE_TEST_SUITE_P(EachField, PtpMetaDataIgnoresTest, testing::ValuesIn(fieldsThatDoNot),
-                         nameOf);
+                         nameOfField);
 
 TEST(PtpMetaDataEqualityTest, FreshObjectsAreEqual) {
     EXPECT_TRUE(tPtp4lMetaData() == tPtp4lMetaData());

@@ -1,0 +1,13 @@
+/// @file
+#pragma once
+
+class Program;
+
+// Each adds one measurement to a program.
+void addDelay(Program& program);
+void addHostFootprint(Program& program);
+void addInitializeCost(Program& program);
+void addPollCost(Program& program);
+void addPollInstructions(Program& program);
+void addPollLine(Program& program);
+void addSessionTimes(Program& program);
