@@ -26,12 +26,15 @@ test_jobs=$((jobs * 4)) # most tests wait most of the time
 log=build/$preset/ctest.log
 
 # Lists the tests that did not run, each with its reason: the text behind GoogleTest's
-# "file:line: Skipped", else the last line that the test printed.
+# "file:line: Skipped", else the last line that the test printed. First those of ctest, then those of
+# GoogleTest that share a process with others.
 list_skipped() {
   awk '
     FNR == 1 { ++file }
-    file == 1 && sub(/^[0-9]+\/[0-9]+ Testing: /, "") { name = $0; text = announced = done = "" }
-    file == 1 && /^<end of output>$/ { reason[name] = text; inside = 0 }
+    file == 1 && sub(/^[0-9]+\/[0-9]+ Testing: /, "") { test = $0; text = announced = done = "" }
+    file == 1 && /^\[ RUN      \] / { part = $4; text = announced = done = "" }
+    file == 1 && /^\[  SKIPPED \] .*\([0-9]+ ms\)$/ { parts[++count] = part; reason[part] = text }
+    file == 1 && /^<end of output>$/ { reason[test] = text; inside = 0 }
     inside && !done && /./ { text = $0 }
     inside && announced { done = 1 }
     inside && /: Skipped$/ { announced = 1 }
@@ -42,8 +45,15 @@ list_skipped() {
       sub(/^[ \t]*[0-9]+ - /, "")
       sub(/ \([A-Za-z ]+\)$/, "")
       print "skipped: " $0 ": " (reason[$0] ? reason[$0] : "disabled")
+      told[$0] = 1
     }
     file == 2 && /^The following tests did not run:$/ { listed = 1 }
+
+    END {
+      for (i = 1; i <= count; ++i) {
+        if (!(parts[i] in told)) print "skipped: " parts[i] ": " reason[parts[i]]
+      }
+    }
   ' "build/$preset/Testing/Temporary/LastTest.log" "$log"
 }
 
