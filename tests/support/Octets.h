@@ -89,11 +89,9 @@ Object readFrom(const Octets& datagram) {
 }
 
 /// How many octets of a datagram an object reads.
-template <typename Object>
-std::size_t octetsConsumed(const Octets& datagram) {
+inline std::size_t octetsConsumed(zekelVantel::iMsgSerializable& object, const Octets& datagram) {
     zekelVantel::tMsgBuffer buffer = received(datagram);
     zeerr::LocalStatus status;
-    Object object;
     object.deserialize(buffer, status);
     EXPECT_EQ(status.code, 0);
     std::size_t left = 0;
@@ -103,50 +101,10 @@ std::size_t octetsConsumed(const Octets& datagram) {
     return datagram.size() - left;
 }
 
-/// An object that was read from `before` keeps all of it when `next` is cut, wherever that is.
-template <typename Object>
-void expectAllOrNothing(const Octets& before, const Octets& next) {
-    for (std::size_t length = 0; length < next.size(); ++length) {
-        auto object = readFrom<Object>(before);
-        EXPECT_EQ(readInto(object, first(length, next)), endOfData) << length;
-        EXPECT_EQ(serialized(object), before) << length;
-    }
-    auto object = readFrom<Object>(before);
-    EXPECT_EQ(readInto(object, next), 0);
-    EXPECT_EQ(serialized(object), next);
-}
-
-/// An object reads nothing into a status that holds an error, and everything beside a warning.
-template <typename Object>
-void expectOnlyAnErrorStopsReading(const Octets& before, const Octets& next) {
-    for (const std::int32_t code : {-1, 1}) {
-        auto object = readFrom<Object>(before);
-        zekelVantel::tMsgBuffer buffer = received(next);
-        zeerr::LocalStatus status;
-        status.code = code;
-        object.deserialize(buffer, status);
-        EXPECT_EQ(status.code, code);
-        EXPECT_EQ(serialized(object), code < 0 ? before : next) << code;
-    }
-}
-
-/// An object that does not fit into the buffer any more ends in end-of-data.
-template <typename Object>
-void expectNoRoomIsEndOfData(const Octets& wire) {
-    const auto object = readFrom<Object>(wire);
-    zekelVantel::tMsgBuffer buffer;
-    zeerr::LocalStatus status;
-    buffer.setLength(1501U - static_cast<std::uint32_t>(wire.size()), status);
-    object.serialize(buffer, status);
-    EXPECT_EQ(status.code, endOfData);
-    EXPECT_EQ(buffer.getLength(), 1500U);
-}
-
 /// An object that was read from `before` takes over, when `next` is cut, every field that was there
 /// whole, and keeps the others. `ends` says where each field ends.
-template <typename Object>
-void expectEachFieldAsItIsRead(const Octets& before, const Octets& next,
-                               const std::vector<std::size_t>& ends) {
+inline void expectEachFieldAsItIsRead(zekelVantel::iMsgSerializable& object, const Octets& before,
+                                      const Octets& next, const std::vector<std::size_t>& ends) {
     for (std::size_t length = 0; length < next.size(); ++length) {
         Octets expected = before;
         for (std::size_t field = 0; field < ends.size() && ends[field] <= length; ++field) {
@@ -154,7 +112,7 @@ void expectEachFieldAsItIsRead(const Octets& before, const Octets& next,
                 expected[at] = next[at];
             }
         }
-        auto object = readFrom<Object>(before);
+        EXPECT_EQ(readInto(object, before), 0);
         EXPECT_EQ(readInto(object, first(length, next)), endOfData) << length;
         EXPECT_EQ(serialized(object), expected) << length;
     }

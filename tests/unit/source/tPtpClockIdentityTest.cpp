@@ -36,22 +36,4 @@ TEST(PtpClockIdentityTest, OctetsAreReadAsTheyStand) {
     EXPECT_EQ(serialized(identity), octets("00 1B 19 FF FE 81 92 A3"));
 }
 
-TEST(PtpClockIdentityTest, ReadsEightOctetsAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpClockIdentity>(Octets(11, 0x42)), 8U);
-}
-
-TEST(PtpClockIdentityTest, IdentityCutAnywhereChangesNothing) {
-    expectAllOrNothing<tPtpClockIdentity>(octets("01 02 03 04 05 06 07 08"),
-                                          octets("F1 F2 F3 F4 F5 F6 F7 F8"));
-}
-
-TEST(PtpClockIdentityTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpClockIdentity>(octets("01 02 03 04 05 06 07 08"),
-                                                     octets("F1 F2 F3 F4 F5 F6 F7 F8"));
-}
-
-TEST(PtpClockIdentityTest, NoRoomIsEndOfData) {
-    expectNoRoomIsEndOfData<tPtpClockIdentity>(octets("01 02 03 04 05 06 07 08"));
-}
-
 } // namespace

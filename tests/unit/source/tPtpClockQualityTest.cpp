@@ -6,10 +6,7 @@
 
 using zekelVantel::tPtpClockQuality;
 
-namespace tPtpClockQualityTest {
-
-const Octets before = octets("01 02 03 04");
-const Octets next = octets("F1 F2 F3 F4");
+namespace {
 
 TEST(PtpClockQualityTest, IsZeroByDefault) {
     const tPtpClockQuality quality;
@@ -28,20 +25,4 @@ TEST(PtpClockQualityTest, FieldsAreReadInWireOrder) {
     EXPECT_EQ(serialized(quality), octets("F8 21 B36A"));
 }
 
-TEST(PtpClockQualityTest, ReadsFourOctetsAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpClockQuality>(Octets(7, 0x42)), 4U);
-}
-
-TEST(PtpClockQualityTest, QualityCutAnywhereChangesNothing) {
-    expectAllOrNothing<tPtpClockQuality>(before, next);
-}
-
-TEST(PtpClockQualityTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpClockQuality>(before, next);
-}
-
-TEST(PtpClockQualityTest, NoRoomIsEndOfData) {
-    expectNoRoomIsEndOfData<tPtpClockQuality>(next);
-}
-
-} // namespace tPtpClockQualityTest
+} // namespace

@@ -101,27 +101,10 @@ TEST(PtpMgmtMsgTest, AnswerOfTheRealDaemonIsRead) {
     EXPECT_EQ(message.actionField(), 2U);
 }
 
-TEST(PtpMgmtMsgTest, MessageCutAnywhereKeepsWhatWasReadBefore) {
-    expectEachFieldAsItIsRead<tPtpMgmtMsg>(
-        before, next, {1, 2, 4, 5, 6, 8, 16, 20, 30, 32, 33, 34, 44, 45, 46, 47, 48});
-}
-
 TEST(PtpMgmtMsgTest, SizeOfTheHeaderIsNotTheSizeOfTheMessage) {
     const tPtpMgmtMsg message;
     const tPtpMsgHeader& base = message;
     EXPECT_EQ(base.size(), 48U);
-}
-
-TEST(PtpMgmtMsgTest, ReadsItsSizeAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpMgmtMsg>(Octets(60, 0x42)), 48U);
-}
-
-TEST(PtpMgmtMsgTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpMgmtMsg>(before, next);
-}
-
-TEST(PtpMgmtMsgTest, NoRoomIsEndOfData) {
-    expectNoRoomIsEndOfData<tPtpMgmtMsg>(next);
 }
 
 } // namespace tPtpMgmtMsgTest

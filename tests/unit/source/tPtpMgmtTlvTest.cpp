@@ -26,17 +26,4 @@ TEST(PtpMgmtTlvTest, FieldsAreReadInWireOrder) {
     EXPECT_EQ(serialized(tlv), octets("A1B2 C3D4 E5F6"));
 }
 
-TEST(PtpMgmtTlvTest, HeadCutAnywhereKeepsWhatWasReadBefore) {
-    expectEachFieldAsItIsRead<tPtpMgmtTlv>(octets("0102 0304 0506"), octets("F1F2 F3F4 F5F6"),
-                                           {2, 4, 6});
-}
-
-TEST(PtpMgmtTlvTest, ReadsItsSizeAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpMgmtTlv>(Octets(9, 0x42)), 6U);
-}
-
-TEST(PtpMgmtTlvTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpMgmtTlv>(octets("0102 0304 0506"), octets("F1F2 F3F4 F5F6"));
-}
-
 } // namespace

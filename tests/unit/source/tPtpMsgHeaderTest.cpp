@@ -111,21 +111,4 @@ TEST(PtpMsgHeaderTest, EachSetterChangesItsFieldAlone) {
     EXPECT_EQ(behind(1, serialized(header)), octets("0E") + behind(2, before));
 }
 
-TEST(PtpMsgHeaderTest, HeaderCutAnywhereKeepsWhatWasReadBefore) {
-    expectEachFieldAsItIsRead<tPtpMsgHeader>(before, next,
-                                             {1, 2, 4, 5, 6, 8, 16, 20, 30, 32, 33, 34});
-}
-
-TEST(PtpMsgHeaderTest, ReadsItsSizeAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpMsgHeader>(Octets(40, 0x42)), 34U);
-}
-
-TEST(PtpMsgHeaderTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpMsgHeader>(before, next);
-}
-
-TEST(PtpMsgHeaderTest, NoRoomIsEndOfData) {
-    expectNoRoomIsEndOfData<tPtpMsgHeader>(next);
-}
-
 } // namespace tPtpMsgHeaderTest

@@ -7,10 +7,7 @@
 using zekelVantel::tPtpClockIdentity;
 using zekelVantel::tPtpPortIdentity;
 
-namespace tPtpPortIdentityTest {
-
-const Octets before = octets("01 02 03 04 05 06 07 08 09 0A");
-const Octets next = octets("F1 F2 F3 F4 F5 F6 F7 F8 F9 FA");
+namespace {
 
 TEST(PtpPortIdentityTest, IsZeroByDefault) {
     const tPtpPortIdentity identity;
@@ -32,20 +29,4 @@ TEST(PtpPortIdentityTest, FieldsAreReadInWireOrder) {
     EXPECT_EQ(serialized(identity), octets("001B19FFFE8192A3 8142"));
 }
 
-TEST(PtpPortIdentityTest, ReadsTenOctetsAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpPortIdentity>(Octets(13, 0x42)), 10U);
-}
-
-TEST(PtpPortIdentityTest, IdentityCutAnywhereChangesNothing) {
-    expectAllOrNothing<tPtpPortIdentity>(before, next);
-}
-
-TEST(PtpPortIdentityTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpPortIdentity>(before, next);
-}
-
-TEST(PtpPortIdentityTest, NoRoomIsEndOfData) {
-    expectNoRoomIsEndOfData<tPtpPortIdentity>(next);
-}
-
-} // namespace tPtpPortIdentityTest
+} // namespace

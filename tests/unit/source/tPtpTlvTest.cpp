@@ -24,16 +24,4 @@ TEST(PtpTlvTest, FieldsAreReadInWireOrder) {
     EXPECT_EQ(serialized(tlv), octets("A1B2 C3D4"));
 }
 
-TEST(PtpTlvTest, HeadCutAnywhereKeepsWhatWasReadBefore) {
-    expectEachFieldAsItIsRead<tPtpTlv>(octets("0102 0304"), octets("F1F2 F3F4"), {2, 4});
-}
-
-TEST(PtpTlvTest, ReadsItsSizeAndNoMore) {
-    EXPECT_EQ(octetsConsumed<tPtpTlv>(Octets(9, 0x42)), 4U);
-}
-
-TEST(PtpTlvTest, OnlyAnErrorStopsReading) {
-    expectOnlyAnErrorStopsReading<tPtpTlv>(octets("0102 0304"), octets("F1F2 F3F4"));
-}
-
 } // namespace
