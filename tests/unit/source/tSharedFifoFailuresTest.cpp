@@ -33,6 +33,12 @@ protected:
         return fifo.read(text, sizeof(text), status);
     }
 
+    void expectError(std::int32_t code, const std::string& constant, int line,
+                     const std::string& info) {
+        EXPECT_EQ(status.code, code);
+        EXPECT_EQ(textOf(status), errorText(constant, "tSharedFifo", line, info));
+    }
+
     const zesdbg::Settings defaults = zesdbg::settings;
     TemporaryFolder folder;
     zeerr::LocalStatus status;
@@ -40,20 +46,17 @@ protected:
 
 TEST_F(SharedFifoFailuresTest, OwnerThatCannotCreateTheFifoGetsAnOsFault) {
     const tSharedFifo fifo("./missing/fifo", true, status);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_osFault", "tSharedFifo", 35,
-                                        "Failed creating shared FIFO: ./missing/fifo, errno: 2 "
-                                        "(No such file or directory)"));
+    expectError(
+        -52008, "zeoskerr_osFault", 35,
+        "Failed creating shared FIFO: ./missing/fifo, errno: 2 (No such file or directory)");
 }
 
 TEST_F(SharedFifoFailuresTest, OwnerCannotReplaceAFolder) {
     std::filesystem::create_directory("fifo");
     {
         const tSharedFifo fifo("./fifo", true, status);
-        EXPECT_EQ(status.code, -52008);
-        EXPECT_EQ(textOf(status),
-                  errorText("zeoskerr_osFault", "tSharedFifo", 35,
-                            "Failed creating shared FIFO: ./fifo, errno: 17 (File exists)"));
+        expectError(-52008, "zeoskerr_osFault", 35,
+                    "Failed creating shared FIFO: ./fifo, errno: 17 (File exists)");
     }
     EXPECT_TRUE(std::filesystem::is_directory("fifo"));
 }
@@ -62,10 +65,8 @@ TEST_F(SharedFifoFailuresTest, NonOwnerWithoutAFifoGetsResourceNotFoundOnItsFirs
     tSharedFifo fifo("./fifo", false, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(read(fifo), -1);
-    EXPECT_EQ(status.code, -52006);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_resourceNotFound", "tSharedFifo", 139,
-                                        "Failed opening shared FIFO: ./fifo, errno: 2 "
-                                        "(No such file or directory)"));
+    expectError(-52006, "zeoskerr_resourceNotFound", 139,
+                "Failed opening shared FIFO: ./fifo, errno: 2 (No such file or directory)");
     EXPECT_FALSE(fifo.isOpen());
 }
 
@@ -83,10 +84,8 @@ TEST_F(SharedFifoFailuresTest, OpeningThatFailsOtherwiseIsAnOsFault) {
     writeFile("file", "");
     tSharedFifo fifo("./file/fifo", false, status);
     fifo.open(status);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status),
-              errorText("zeoskerr_osFault", "tSharedFifo", 143,
-                        "Failed opening shared FIFO: ./file/fifo, errno: 20 (Not a directory)"));
+    expectError(-52008, "zeoskerr_osFault", 143,
+                "Failed opening shared FIFO: ./file/fifo, errno: 20 (Not a directory)");
     EXPECT_FALSE(fifo.isOpen());
 }
 
@@ -95,20 +94,16 @@ TEST_F(SharedFifoFailuresTest, OwnerThatFindsAFolderInItsPlaceCannotOpen) {
     unlink("fifo");
     std::filesystem::create_directory("fifo");
     EXPECT_EQ(read(fifo), -1);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_osFault", "tSharedFifo", 143,
-                                        "Failed opening shared FIFO: ./fifo, errno: 21 "
-                                        "(Is a directory)"));
+    expectError(-52008, "zeoskerr_osFault", 143,
+                "Failed opening shared FIFO: ./fifo, errno: 21 (Is a directory)");
 }
 
 TEST_F(SharedFifoFailuresTest, FolderAtThePathCanBeOpenedButNotRead) {
     std::filesystem::create_directory("fifo");
     tSharedFifo fifo("./fifo", false, status);
     EXPECT_EQ(read(fifo), -1);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_osFault", "tSharedFifo", 86,
-                                        "Failed reading from shared FIFO: ./fifo, errno: 21 "
-                                        "(Is a directory)"));
+    expectError(-52008, "zeoskerr_osFault", 86,
+                "Failed reading from shared FIFO: ./fifo, errno: 21 (Is a directory)");
     EXPECT_TRUE(fifo.isOpen());
 }
 
@@ -203,10 +198,8 @@ TEST_F(SharedFifoFailuresTest, NonOwnersEndIsReadOnly) {
     ASSERT_EQ(mkfifo("fifo", 0600), 0);
     tSharedFifo fifo("./fifo", false, status);
     EXPECT_EQ(fifo.write("12345678", 8, status), -1);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_osFault", "tSharedFifo", 112,
-                                        "Failed writing to shared FIFO: ./fifo, errno: 9 "
-                                        "(Bad file descriptor)"));
+    expectError(-52008, "zeoskerr_osFault", 112,
+                "Failed writing to shared FIFO: ./fifo, errno: 9 (Bad file descriptor)");
     EXPECT_TRUE(fifo.isOpen());
 }
 
@@ -217,10 +210,9 @@ TEST_F(SharedFifoFailuresTest, FullFifoIsAnOsFaultAndStaysOpen) {
     ASSERT_EQ(fifo.write(text.data(), text.size(), status), static_cast<ssize_t>(text.size()));
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(fifo.write("12345678", 8, status), -1);
-    EXPECT_EQ(status.code, -52008);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_osFault", "tSharedFifo", 112,
-                                        "Failed writing to shared FIFO: ./fifo, errno: 11 "
-                                        "(Resource temporarily unavailable)"));
+    expectError(
+        -52008, "zeoskerr_osFault", 112,
+        "Failed writing to shared FIFO: ./fifo, errno: 11 (Resource temporarily unavailable)");
     EXPECT_TRUE(fifo.isOpen());
 }
 
@@ -228,10 +220,8 @@ TEST_F(SharedFifoFailuresTest, WriteThatCannotOpenFailsLikeARead) {
     tSharedFifo fifo("./fifo", true, status);
     unlink("fifo");
     EXPECT_EQ(fifo.write("12345678", 8, status), -1);
-    EXPECT_EQ(status.code, -52006);
-    EXPECT_EQ(textOf(status), errorText("zeoskerr_resourceNotFound", "tSharedFifo", 139,
-                                        "Failed opening shared FIFO: ./fifo, errno: 2 "
-                                        "(No such file or directory)"));
+    expectError(-52006, "zeoskerr_resourceNotFound", 139,
+                "Failed opening shared FIFO: ./fifo, errno: 2 (No such file or directory)");
     EXPECT_FALSE(fifo.isOpen());
 }
 
