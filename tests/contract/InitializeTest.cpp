@@ -195,7 +195,8 @@ const Failure failures[] = {
      nullptr},
 };
 
-INSTANTIATE_TEST_SUITE_P(Failures, InitializeFailureTest, testing::ValuesIn(failures));
+INSTANTIATE_TEST_SUITE_P(Failures, InitializeFailureTest, testing::ValuesIn(failures),
+                         [](const auto& failure) { return failure.param.name; });
 
 TEST_F(InitializeTest, WrongTypeNamesTheKeyAndQuotesTheConfiguration) {
     HostStatus status;

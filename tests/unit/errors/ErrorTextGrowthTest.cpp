@@ -140,6 +140,7 @@ TEST_P(TextLosingResizeTest, NothingIsWrittenOutOfBounds) {
 INSTANTIATE_TEST_SUITE_P(Operations, TextLosingResizeTest,
                          testing::Values(Operation{"garbage", &garbageResize},
                                          Operation{"zeros", &zeroingResize},
-                                         Operation{"anew", &anewResize}));
+                                         Operation{"anew", &anewResize}),
+                         [](const auto& row) { return row.param.name; });
 
 } // namespace

@@ -126,7 +126,8 @@ TEST_P(ExceptionConversionTest, SurvivesAnOperationThatLosesTheText) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Exceptions, ExceptionConversionTest, testing::ValuesIn(conversions));
+INSTANTIATE_TEST_SUITE_P(Exceptions, ExceptionConversionTest, testing::ValuesIn(conversions),
+                         [](const auto& row) { return row.param.name; });
 
 TEST(ExceptionConversionTest, MovesTheTextOfAnOwnException) {
     zeerr::LocalStatus status;
