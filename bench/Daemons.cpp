@@ -1,11 +1,10 @@
 #include "Daemons.h"
 
-#include <chrono>
 #include <filesystem>
 #include <stdexcept>
-#include <thread>
 
-#include "Child.h"
+#include "support/Child.h"
+#include "support/Processes.h"
 #include "support/StubDaemon.h"
 #include "support/TemporaryFolder.h"
 #include "system/BoundaryClock.h"
@@ -24,15 +23,11 @@ private:
 class Simulator : public Daemon {
 public:
     explicit Simulator(std::uint16_t ports) : child_(start(ports)) {
-        const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-        while (!std::filesystem::exists("simulator.sock")) {
-            if (std::chrono::steady_clock::now() > deadline) {
-                throw std::runtime_error("the simulated daemon does not start");
-            }
-            std::this_thread::sleep_for(std::chrono::milliseconds(2));
+        if (!waitUntil([this] { return std::filesystem::exists(socket()); })) {
+            throw std::runtime_error("the simulated daemon does not start");
         }
     }
-    std::string socket() const override { return "simulator.sock"; }
+    std::string socket() const final { return "simulator.sock"; }
 
 private:
     static std::vector<std::string> start(std::uint16_t ports) {

@@ -1,6 +1,5 @@
 #include "PmcClients.h"
 
-#include <algorithm>
 #include <array>
 #include <stdexcept>
 
@@ -30,23 +29,12 @@ std::vector<std::string> commandLine(const std::string& daemon, const std::strin
     return {pmcProgram, "-u", "-b", "0", "-i", own, "-s", daemon};
 }
 
-/// Reads until that many answers are printed.
-void readAnswers(const Child& child, int expected) {
-    const std::string mark = " RESPONSE MANAGEMENT ";
-    std::string unread;
-    for (int answer = 0; answer < expected; ++answer) {
-        auto place = unread.find(mark);
-        while (place == std::string::npos) {
-            const std::string piece = child.read();
-            if (piece.empty()) {
-                throw std::runtime_error("an answer is missing in what pmc prints");
-            }
-            unread.erase(0, unread.size() - std::min(unread.size(), mark.size()));
-            unread += piece;
-            place = unread.find(mark);
-        }
-        unread.erase(0, place + mark.size());
+/// Reads until that many answers more are printed.
+void readAnswers(Child& child, int expected) {
+    if (!child.waitForOutput(" RESPONSE MANAGEMENT ", expected)) {
+        throw std::runtime_error("an answer is missing in what pmc prints: " + child.errors());
     }
+    child.forgetOutput();
 }
 
 } // namespace
@@ -71,5 +59,6 @@ void PmcPerPoll::poll() {
     }
     Child child(arguments);
     readAnswers(child, 3 + 3 * ports_);
-    cpuSeconds_ += child.waitForEnd();
+    child.wait();
+    cpuSeconds_ += child.cpuSeconds();
 }

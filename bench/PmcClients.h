@@ -4,8 +4,8 @@
 
 #include <cstdint>
 
-#include "Child.h"
 #include "Client.h"
+#include "support/Child.h"
 
 /// One process of pmc for all polls. It gets the next command when all answers to the one before
 /// are printed.

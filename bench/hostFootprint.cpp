@@ -4,12 +4,12 @@
 #include <sstream>
 #include <stdexcept>
 
-#include "Child.h"
 #include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
 #include "Statistics.h"
+#include "support/Child.h"
 #include "support/TemporaryFolder.h"
 
 namespace {
@@ -20,13 +20,14 @@ struct Footprints {
     std::vector<double> writtenKib;
 
     void add(const std::string& program, const std::string& configuration) {
-        const Child child({program, VANTEL_BC_TEST_LIBRARY, configuration});
-        std::istringstream line(child.read());
+        Child child({program, VANTEL_BC_TEST_LIBRARY, configuration});
+        child.wait();
+        std::istringstream line(child.output());
         double load = 0;
         double resident = 0;
         double written = 0;
         if (!(line >> load >> resident >> written)) {
-            throw std::runtime_error("no session in " + program);
+            throw std::runtime_error("no session in " + program + ": " + child.errors());
         }
         loadNanoseconds.push_back(load);
         residentKib.push_back(resident);

@@ -1,17 +1,18 @@
 // How many instructions a poll takes outside the kernel, counted by callgrind, which runs this
 // program again with --run.
 
+#include <chrono>
 #include <cstdlib>
 #include <filesystem>
 #include <stdexcept>
 
-#include "Child.h"
 #include "Daemons.h"
 #include "FetchClient.h"
 #include "Measurements.h"
 #include "Program.h"
 #include "Row.h"
 #include "Statistics.h"
+#include "support/Child.h"
 #include "support/TemporaryFolder.h"
 
 namespace {
@@ -34,18 +35,15 @@ double countInstructions(std::uint16_t ports, int polls) {
                      "--log-fd=1", "--toggle-collect=zekelVantel::tGetDataFromPtp4l::fetch(*)",
                      self, "poll_instructions", "--run", "--ports", std::to_string(ports),
                      "--polls", std::to_string(polls)});
-    std::string output;
-    for (std::string piece = callgrind.read(); !piece.empty(); piece = callgrind.read()) {
-        output += piece;
-    }
-    callgrind.waitForEnd();
+    callgrind.wait(std::chrono::minutes(1));
+    const std::string& output = callgrind.output();
     const std::string label = "Collected : ";
     const auto position = output.find(label);
     const double count = position == std::string::npos
                              ? 0
                              : std::strtod(output.c_str() + position + label.size(), nullptr);
     if (count <= 0) {
-        throw std::runtime_error("valgrind counts nothing:\n" + output);
+        throw std::runtime_error("valgrind counts nothing:\n" + output + callgrind.errors());
     }
     return count;
 }

@@ -1,38 +1,22 @@
 /// @file
 #pragma once
 
-#include <chrono>
 #include <fstream>
-#include <functional>
 #include <string>
-#include <thread>
 #include <vector>
 
 #include <csignal>
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 
-#include "support/TemporaryFolder.h"
-
-/// Polls a condition. @return false after the deadline.
-inline bool eventually(const std::function<bool()>& condition,
-                       std::chrono::milliseconds deadline = std::chrono::seconds(20)) {
-    const auto end = std::chrono::steady_clock::now() + deadline;
-    while (!condition()) {
-        if (std::chrono::steady_clock::now() > end) {
-            return false;
-        }
-        std::this_thread::sleep_for(std::chrono::milliseconds(2));
-    }
-    return true;
-}
+#include "support/Processes.h"
 
 /// What the program of childProgram.cpp wrote about itself: lines "name=value".
 class ChildReport {
 public:
     /// Waits for the file.
     explicit ChildReport(const std::string& file) {
-        EXPECT_TRUE(eventually([&] { return std::ifstream(file).good(); })) << file;
+        EXPECT_TRUE(waitUntil([&] { return std::ifstream(file).good(); })) << file;
         std::ifstream report(file);
         for (std::string line; std::getline(report, line);) {
             lines_.push_back(line);

@@ -5,7 +5,7 @@
 #include <memory>
 
 std::string outputOf(const std::string& command) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), &pclose);
+    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "re"), &pclose);
     std::string output;
     std::array<char, 4096> piece{};
     while (pipe && std::fgets(piece.data(), piece.size(), pipe.get()) != nullptr) {

@@ -6,6 +6,7 @@
 
 #include <sys/types.h>
 
+#include "support/Child.h"
 #include "system/ManagementClient.h"
 
 /// linuxptp's ptp4l as a boundary clock on the interfaces that scripts/testbed.sh provides, and
@@ -21,7 +22,7 @@ public:
     /// Whether this process runs in scripts/testbed.sh.
     static bool isProvided();
 
-    std::size_t ports() const { return ports_; }
+    std::size_t ports() const;
     std::string socket() const { return folder_ + "/boundary.uds"; }
     std::string path(const std::string& name) const { return folder_ + "/" + name; }
 
@@ -29,13 +30,12 @@ public:
     std::vector<Report> ask(const std::string& dataSet) const;
 
 private:
-    void start();
-    void waitUntilFollowing();
-    std::string log() const;
+    /// Writes the configuration. @return what runs the daemon with it.
+    std::vector<std::string> command() const;
+    bool isFollowing() const;
 
     std::string folder_;
-    std::size_t ports_ = 0;
-    pid_t daemon_ = -1;
+    Child daemon_;
 };
 
 /// No Syncs come while this object lives.

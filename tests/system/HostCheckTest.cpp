@@ -4,8 +4,8 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
+#include "support/Child.h"
 #include "system/Scene.h"
-#include "tools/host/Child.h"
 
 using nlohmann::json;
 using testing::ElementsAre;

@@ -10,9 +10,9 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "support/Child.h"
 #include "support/TemporaryFolder.h"
 #include "system/Scene.h"
-#include "tools/host/Child.h"
 
 namespace {
 

@@ -1,26 +1,8 @@
 #include "system/ManagementClient.h"
 
-#include <cstdio>
-#include <memory>
 #include <sstream>
 
-namespace {
-
-std::string outputOf(const std::string& command) {
-    struct Closer {
-        void operator()(std::FILE* pipe) const { pclose(pipe); }
-    };
-    const std::unique_ptr<std::FILE, Closer> pipe(popen(command.c_str(), "re"));
-    std::string output;
-    char piece[4096];
-    for (std::size_t size = 1; pipe && size > 0;) {
-        size = std::fread(piece, 1, sizeof(piece), pipe.get());
-        output.append(piece, size);
-    }
-    return output;
-}
-
-} // namespace
+#include "support/CommandOutput.h"
 
 std::vector<Report> askDaemon(const std::string& socket, const std::string& dataSet) {
     std::istringstream lines(

@@ -8,7 +8,7 @@
 #include <sstream>
 #include <stdexcept>
 
-#include "Child.h"
+#include "support/Child.h"
 
 using vantelhost::Json;
 
@@ -73,7 +73,8 @@ Words ToolTest::command(const Words& options) const {
 }
 
 Result ToolTest::run(const Words& options, const std::string& input) const {
-    Child child(command(options), {}, input);
+    Child child(command(options));
+    child.write(input);
     const int status = child.wait();
     return {status, child.output(), child.errors()};
 }

@@ -4,8 +4,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "Child.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::AllOf;
 using testing::HasSubstr;

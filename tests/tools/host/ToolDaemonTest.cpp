@@ -6,9 +6,9 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
-#include "Child.h"
 #include "Terminal.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::HasSubstr;
 using testing::Not;
@@ -61,9 +61,9 @@ protected:
 
 TEST_F(ToolDaemonTest, CtrlCIsACleanEndThoughTheDaemonHearsItToo) {
     for (const auto& options : {Words{}, Words{"--plain"}}) {
-        Terminal terminal(run(options), {"TERM=xterm"});
-        ASSERT_TRUE(terminal.waitFor("Port1"));
-        terminal.type("\x03");
+        Terminal terminal(run(options));
+        ASSERT_TRUE(terminal.waitForOutput("Port1"));
+        terminal.write("\x03");
         EXPECT_EQ(terminal.wait(), 0);
         EXPECT_THAT(terminal.output(), Not(HasSubstr(died)));
         EXPECT_THAT(terminal.output(), HasSubstr(" 0 errors, offset "));

@@ -1,7 +1,7 @@
 // What goes wrong on the plug-in's side.
 
-#include "Child.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::Contains;
 using testing::ElementsAre;

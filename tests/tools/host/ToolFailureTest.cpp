@@ -2,9 +2,9 @@
 
 #include <csignal>
 
-#include "Child.h"
 #include "Terminal.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::ElementsAre;
 using testing::HasSubstr;
@@ -68,11 +68,10 @@ TEST_F(ToolFailureTest, ADaemonThatLivesIsNotTold) {
 }
 
 TEST_F(ToolFailureTest, WhatADaemonSaysLeavesTheLiveViewAlone) {
-    Terminal terminal(command({"--interface", "eth0", "--set",
-                               "child=echo spoilt >&2; echo last words >&2; exit 1"}),
-                      {"TERM=xterm"});
-    ASSERT_TRUE(terminal.waitFor("last words", 2));
-    terminal.type("\x03");
+    Terminal terminal(command(
+        {"--interface", "eth0", "--set", "child=echo spoilt >&2; echo last words >&2; exit 1"}));
+    ASSERT_TRUE(terminal.waitForOutput("last words", 2));
+    terminal.write("\x03");
     EXPECT_EQ(terminal.wait(), 1);
     EXPECT_THAT(terminal.output(), Not(HasSubstr("spoilt\r\n")));
     EXPECT_THAT(terminal.output(), HasSubstr(" cause        ptp4l, process "));

@@ -5,8 +5,8 @@
 
 #include <sys/stat.h>
 
-#include "Child.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::HasSubstr;
 using vantelhost::Json;

@@ -7,8 +7,8 @@
 #include <regex>
 #include <sstream>
 
-#include "Child.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::AllOf;
 using testing::ContainsRegex;
@@ -230,7 +230,7 @@ TEST_F(ToolReportDrawingTest, ABrowserShowsAllOfIt) {
     pageOf(wholeRecord());
     Child child({browser, "--headless", "--no-sandbox", "--disable-gpu",
                  "--user-data-dir=" + folder.path("browser"), "--dump-dom", "file://" + page});
-    ASSERT_EQ(child.wait(), 0) << child.errors();
+    ASSERT_EQ(child.wait(std::chrono::minutes(1)), 0) << child.errors();
     EXPECT_EQ(count(child.output(), "<section>"), 11U);
     EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 14U);
     EXPECT_EQ(count(child.output(), "</svg>"), 14U);

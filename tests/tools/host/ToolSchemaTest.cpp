@@ -1,8 +1,8 @@
 // The command "schema".
 
-#include "Child.h"
 #include "SchemaTable.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::HasSubstr;
 using vantelhost::Json;

@@ -2,8 +2,8 @@
 
 #include <csignal>
 
-#include "Child.h"
 #include "Tool.h"
+#include "support/Child.h"
 
 using testing::Contains;
 using testing::HasSubstr;

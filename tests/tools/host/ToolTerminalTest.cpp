@@ -56,10 +56,10 @@ void expectRestored(const std::string& output) {
 } // namespace
 
 TEST_F(ToolTerminalTest, PicturesReplaceEachOtherInPlace) {
-    Terminal terminal(live("quality metadata pairs"), {"TERM=xterm"});
-    ASSERT_TRUE(terminal.waitFor("ports         Port1"));
+    Terminal terminal(live("quality metadata pairs"));
+    ASSERT_TRUE(terminal.waitForOutput("ports         Port1"));
     const auto drawn = static_cast<int>(pictures(terminal.output()).size());
-    ASSERT_TRUE(terminal.waitFor(rest, drawn + 2));
+    ASSERT_TRUE(terminal.waitForOutput(rest, drawn + 2));
     const std::string output = terminal.output();
     const auto begin = output.find(opened);
     ASSERT_NE(begin, std::string::npos);
@@ -75,14 +75,14 @@ TEST_F(ToolTerminalTest, PicturesReplaceEachOtherInPlace) {
 }
 
 TEST_F(ToolTerminalTest, TimeGoesByWithoutEvents) {
-    Terminal terminal(live(""), {"TERM=xterm"});
-    EXPECT_TRUE(terminal.waitFor("running, up 0:00:01"));
+    Terminal terminal(live(""));
+    EXPECT_TRUE(terminal.waitForOutput("running, up 0:00:01"));
 }
 
 TEST_F(ToolTerminalTest, CtrlCRestoresTheScreenAndLeavesTheLastPicture) {
-    Terminal terminal(live("quality pairs"), {"TERM=xterm"});
-    ASSERT_TRUE(terminal.waitFor("running"));
-    terminal.type(interrupt);
+    Terminal terminal(live("quality pairs"));
+    ASSERT_TRUE(terminal.waitForOutput("running"));
+    terminal.write(interrupt);
     EXPECT_EQ(terminal.wait(), 0);
     expectRestored(terminal.output());
     const auto left = terminal.output().substr(terminal.output().find(closed) + closed.size());
@@ -94,8 +94,8 @@ TEST_F(ToolTerminalTest, CtrlCRestoresTheScreenAndLeavesTheLastPicture) {
 
 TEST_F(ToolTerminalTest, EverySignalThatStopsRestoresTheScreen) {
     for (const int number : {SIGTERM, SIGHUP, SIGQUIT}) {
-        Terminal terminal(live(""), {"TERM=xterm"});
-        ASSERT_TRUE(terminal.waitFor("running"));
+        Terminal terminal(live(""));
+        ASSERT_TRUE(terminal.waitForOutput("running"));
         terminal.signal(number);
         EXPECT_EQ(terminal.wait(), 0);
         expectRestored(terminal.output());
@@ -103,7 +103,7 @@ TEST_F(ToolTerminalTest, EverySignalThatStopsRestoresTheScreen) {
 }
 
 TEST_F(ToolTerminalTest, AStartThatFailsRestoresTheScreenAndLeavesTheError) {
-    Terminal terminal(live("start-fails"), {"TERM=xterm"});
+    Terminal terminal(live("start-fails"));
     EXPECT_EQ(terminal.wait(), 1);
     expectRestored(terminal.output());
     const auto left = terminal.output().substr(terminal.output().find(closed));
@@ -112,12 +112,12 @@ TEST_F(ToolTerminalTest, AStartThatFailsRestoresTheScreenAndLeavesTheError) {
 }
 
 TEST_F(ToolTerminalTest, ANewSizeIsKeptAtOnce) {
-    Terminal terminal(live("quality metadata pairs"), {"TERM=xterm"});
-    ASSERT_TRUE(terminal.waitFor("running"));
+    Terminal terminal(live("quality metadata pairs"));
+    ASSERT_TRUE(terminal.waitForOutput("running"));
     terminal.resize(5, 30);
     for (int tries = 0; tries < 20; ++tries) {
-        terminal.forget();
-        ASSERT_TRUE(terminal.waitFor(rest, 2));
+        terminal.forgetOutput();
+        ASSERT_TRUE(terminal.waitForOutput(rest, 2));
         const auto last = pictures(terminal.output()).back();
         if (last.size() == 5) {
             break;
@@ -129,7 +129,7 @@ TEST_F(ToolTerminalTest, ANewSizeIsKeptAtOnce) {
 }
 
 TEST_F(ToolTerminalTest, MistakesLeaveTheScreenAlone) {
-    Terminal terminal(command({"--set", "count=1000"}), {"TERM=xterm"});
+    Terminal terminal(command({"--set", "count=1000"}));
     EXPECT_EQ(terminal.wait(), 2);
     EXPECT_THAT(terminal.output(), Not(HasSubstr("\x1b")));
 }
@@ -142,7 +142,7 @@ TEST_F(ToolTerminalTest, LinesAreForPlainJsonAndDumbTerminals) {
     for (const auto& row : {Row{{"--plain"}, "xterm"}, Row{{"--json"}, "xterm"}, Row{{}, "dumb"}}) {
         Words words = live("quality pairs", row.options);
         words.insert(words.end(), {"--seconds", "0"});
-        Terminal terminal(words, {"TERM=" + row.kind});
+        Terminal terminal(words, row.kind);
         EXPECT_EQ(terminal.wait(), 0);
         EXPECT_THAT(terminal.output(), Not(HasSubstr("\x1b")));
         EXPECT_THAT(terminal.output(), HasSubstr("summary"));

@@ -3,6 +3,8 @@
 
 #include <gtest/gtest.h>
 
+#include "support/Processes.h"
+
 namespace {
 
 /// With two ports, and everything that varies pinned.
@@ -131,7 +133,7 @@ TEST_F(Simptp4l, StrictFollowUpInfoDropsWhatIsNotOfIeee8021As) {
     start("follow-up-info strict\n", "follow_up_info 1\n");
     ASSERT_TRUE(client->send(requests::timeStatus()));
     EXPECT_TRUE(
-        eventually([&] { return daemon->log().find("not of IEEE 802.1AS") != std::string::npos; }));
+        waitUntil([&] { return daemon->log().find("not of IEEE 802.1AS") != std::string::npos; }));
     EXPECT_TRUE(client->isQuiet());
     start("follow-up-info strict\n", "follow_up_info 1\ntransportSpecific 0x1\n");
     EXPECT_EQ(client->ask("1d" + requests::timeStatus().substr(2)).substr(0, 8), "1d020068");

@@ -5,6 +5,8 @@
 #include <ctime>
 #include <gtest/gtest.h>
 
+#include "support/Processes.h"
+
 namespace {
 
 std::int64_t numberAt(const std::string& hex, std::size_t at) {
@@ -49,14 +51,14 @@ TEST(Simptp4lClock, AdvancesByWholeIntervals) {
     const Session session("sync-interval 0.01\nclock monotonic\n");
     const std::int64_t first = ingressOf(session.status());
     std::int64_t next = first;
-    ASSERT_TRUE(eventually([&] { return (next = ingressOf(session.status())) != first; }));
+    ASSERT_TRUE(waitUntil([&] { return (next = ingressOf(session.status())) != first; }));
     EXPECT_GT(next, first);
     EXPECT_EQ((next - first) % 10000000, 0);
 }
 
 TEST(Simptp4lClock, DriftsWithTime) {
     const Session session("sync-interval 0.005\noffset 1000\ndrift-ppb 1000000\n");
-    EXPECT_TRUE(eventually([&] { return offsetOf(session.status()) > 101000; }));
+    EXPECT_TRUE(waitUntil([&] { return offsetOf(session.status()) > 101000; }));
 }
 
 TEST(Simptp4lClock, JitterIsTheSameForTheSameSeed) {
@@ -86,7 +88,7 @@ TEST(Simptp4lClock, LosesTheGrandmasterAsPtp4lDoes) {
 
 TEST(Simptp4lClock, ListensUntilAGrandmasterAppears) {
     const Session session("gm-after 0.2\n");
-    EXPECT_TRUE(eventually([&] { return hasGrandmaster(session.status()); }));
+    EXPECT_TRUE(waitUntil([&] { return hasGrandmaster(session.status()); }));
     const Session never("gm absent\n");
     EXPECT_FALSE(hasGrandmaster(never.status()));
     EXPECT_EQ(never.client.ask(requests::portDataSet()).substr(2 * 64, 2), "04");
@@ -104,7 +106,7 @@ TEST(Simptp4lClock, StepsOffsetAndIngressTimeTogether) {
 
 TEST(Simptp4lClock, TimedLinesActWithoutARequest) {
     const Session session("at 0.1 do gm off\n");
-    EXPECT_TRUE(eventually([&] { return !hasGrandmaster(session.status()); }));
+    EXPECT_TRUE(waitUntil([&] { return !hasGrandmaster(session.status()); }));
 }
 
 } // namespace

@@ -1,41 +1,14 @@
 #include "Daemon.h"
 
-#include <cerrno>
-#include <chrono>
-#include <csignal>
 #include <cstdlib>
-#include <fcntl.h>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <stdexcept>
-#include <sys/prctl.h>
-#include <sys/stat.h>
-#include <sys/wait.h>
-#include <thread>
-#include <unistd.h>
+
+#include "support/Processes.h"
 
 namespace {
-
-pid_t start(const std::vector<std::string>& command, const std::string& outputPath) {
-    std::vector<char*> argv;
-    for (const std::string& word : command) {
-        argv.push_back(const_cast<char*>(word.c_str()));
-    }
-    argv.push_back(nullptr);
-    char* environment[] = {nullptr};
-    const pid_t parent = getpid();
-    const pid_t pid = fork();
-    if (pid != 0) {
-        return pid;
-    }
-    prctl(PR_SET_PDEATHSIG, SIGKILL);
-    const int output = open(outputPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
-    if (getppid() == parent && dup2(output, 1) == 1 && dup2(output, 2) == 2) {
-        execve(argv[0], argv.data(), environment);
-    }
-    _exit(127);
-}
 
 /// Writes configuration and script.
 /// @return the command that runs the simulator with them
@@ -54,17 +27,6 @@ std::vector<std::string> prepare(const Folder& folder, const std::string& script
 
 } // namespace
 
-bool eventually(const std::function<bool()>& condition) {
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-    while (!condition()) {
-        if (std::chrono::steady_clock::now() > deadline) {
-            return false;
-        }
-        std::this_thread::sleep_for(std::chrono::milliseconds(2));
-    }
-    return true;
-}
-
 std::string readFile(const std::string& path) {
     std::ifstream file(path);
     std::ostringstream text;
@@ -72,41 +34,12 @@ std::string readFile(const std::string& path) {
     return text.str();
 }
 
-Child::Child(const std::vector<std::string>& command, const std::string& outputPath)
-    : outputPath_(outputPath), pid_(start(command, outputPath)) {
-    if (pid_ < 0) {
-        throw std::runtime_error("fork");
-    }
-}
-
-Child::~Child() {
-    if (isRunning()) {
-        kill(pid_, SIGKILL);
-        waitpid(pid_, nullptr, 0);
-    }
-}
-
-void Child::signal(int number) const {
-    if (!reaped_) {
-        kill(pid_, number);
-    }
-}
-
-bool Child::isRunning() {
-    if (!reaped_) {
-        reaped_ = waitpid(pid_, &status_, WNOHANG) == pid_;
-    }
-    return !reaped_;
-}
-
-Finished Child::finish() {
-    if (!eventually([this] { return !isRunning(); })) {
-        kill(pid_, SIGKILL);
-        waitpid(pid_, &status_, 0);
-        reaped_ = true;
-    }
-    const int status = WIFEXITED(status_) ? WEXITSTATUS(status_) : -WTERMSIG(status_);
-    return {status, readFile(outputPath_)};
+Finished run(const std::vector<std::string>& arguments) {
+    std::vector<std::string> command{SIMPTP4L_PATH};
+    command.insert(command.end(), arguments.begin(), arguments.end());
+    Child child(command);
+    const int status = child.wait();
+    return {status, child.output(), child.errors()};
 }
 
 Folder::Folder() {
@@ -128,12 +61,12 @@ void Folder::write(const std::string& name, const std::string& text) const {
 
 Daemon::Daemon(const std::string& script, const std::vector<std::string>& interfaces,
                const std::string& config)
-    : process(prepare(folder, script, interfaces, config), folder.path("output")) {}
+    : process(prepare(folder, script, interfaces, config), {"-i"}) {}
 
 bool Daemon::isBound() const {
     return log().find("\"bound\"") != std::string::npos;
 }
 
 bool Daemon::waitUntilBound() const {
-    return eventually([this] { return isBound(); });
+    return waitUntil([this] { return isBound(); });
 }

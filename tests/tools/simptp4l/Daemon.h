@@ -2,46 +2,23 @@
 /// The simulator as a child process, in a temporary folder of its own.
 #pragma once
 
-#include <functional>
 #include <string>
-#include <sys/types.h>
 #include <vector>
 
-/// What a finished program left behind.
+#include "support/Child.h"
+
+/// What a program that has ended left behind.
 struct Finished {
-    int status = -1; ///< exit status; minus the signal's number when a signal ended it
+    int status; ///< as Child::wait() has it
     std::string output;
+    std::string errors;
 };
 
-/// Calls `condition` until it holds.
-/// @return false when it does not within ten seconds
-bool eventually(const std::function<bool()>& condition);
+/// Runs the simulator to its end.
+Finished run(const std::vector<std::string>& arguments);
 
 /// The whole file; empty when there is none.
 std::string readFile(const std::string& path);
-
-/// A child process that is killed with its owner.
-class Child {
-public:
-    /// Standard output and error go to `outputPath`. The environment is empty.
-    Child(const std::vector<std::string>& command, const std::string& outputPath);
-    ~Child();
-    Child(const Child&) = delete;
-    Child& operator=(const Child&) = delete;
-
-    pid_t pid() const { return pid_; }
-    void signal(int number) const;
-    bool isRunning();
-
-    /// Waits up to ten seconds, then kills.
-    Finished finish();
-
-private:
-    std::string outputPath_;
-    pid_t pid_;
-    int status_ = 0;
-    bool reaped_ = false;
-};
 
 /// A temporary folder with a configuration and a script; removed with all it holds.
 class Folder {
@@ -58,7 +35,7 @@ private:
     std::string path_;
 };
 
-/// The simulator, running with `script` beside its configuration.
+/// The simulator, running with `script` beside its configuration, in an empty environment.
 class Daemon {
 public:
     explicit Daemon(const std::string& script = {}, const std::vector<std::string>& interfaces = {},

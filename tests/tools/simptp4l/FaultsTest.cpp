@@ -4,6 +4,8 @@
 #include <chrono>
 #include <gtest/gtest.h>
 
+#include "support/Processes.h"
+
 namespace {
 
 using Ports = std::vector<std::string>;
@@ -146,7 +148,7 @@ TEST_F(Simptp4lFault, FloodOfAClientThatDoesNotReadIsDroppedAndLogged) {
     ASSERT_TRUE(client->send(requests::timeStatus()));
     const Client other(daemon->folder.path("other"), daemon->socketPath());
     EXPECT_EQ(other.ask(requests::parentDataSet()).size(), 2 * 86U);
-    EXPECT_TRUE(eventually([&] { return daemon->log().find("\"dropped\"") != std::string::npos; }));
+    EXPECT_TRUE(waitUntil([&] { return daemon->log().find("\"dropped\"") != std::string::npos; }));
 }
 
 TEST_F(Simptp4lFault, LateAnswersComeBeforeTheNextOnes) {
@@ -159,7 +161,7 @@ TEST_F(Simptp4lFault, LateAnswersComeBeforeTheNextOnes) {
 TEST_F(Simptp4lFault, LateAnswersReachAnAddressThatWasBoundAnew) {
     start("on TIME_STATUS_NP times 1 do late\n");
     ASSERT_TRUE(client->send(requests::timeStatus("0001")));
-    ASSERT_TRUE(eventually([&] { return daemon->log().find("\"request\"") != std::string::npos; }));
+    ASSERT_TRUE(waitUntil([&] { return daemon->log().find("\"request\"") != std::string::npos; }));
     client.reset();
     const Client next(daemon->folder.path("me"), daemon->socketPath());
     EXPECT_EQ(next.ask(requests::parentDataSet()).substr(60, 4), "0001");
@@ -177,14 +179,14 @@ TEST_F(Simptp4lFault, StopReadingLeavesRequestsInTheSocket) {
 TEST_F(Simptp4lFault, UnbindRemovesTheSocketFileAndRebindBringsItBack) {
     start("on PARENT_DATA_SET do unbind\nat 0.5 do rebind\n");
     EXPECT_EQ(client->ask(requests::parentDataSet()).size(), 2 * 86U);
-    EXPECT_TRUE(eventually([&] { return client->send(requests::timeStatus()); }));
+    EXPECT_TRUE(waitUntil([&] { return client->send(requests::timeStatus()); }));
     EXPECT_EQ(client->receive().size(), 2 * 104U);
 }
 
 TEST_F(Simptp4lFault, ExitEndsWithoutAnAnswer) {
     start("on PARENT_DATA_SET do exit 42\n");
     ASSERT_TRUE(client->send(requests::parentDataSet()));
-    EXPECT_EQ(daemon->process.finish().status, 42);
+    EXPECT_EQ(daemon->process.wait(), 42);
     EXPECT_TRUE(client->isQuiet());
     EXPECT_FALSE(client->send(requests::timeStatus()));
 }

@@ -25,11 +25,10 @@ protected:
     }
 
     std::string get(const std::string& dataSet) const {
-        return Child({pmcPath(), "-u", "-b", "0", "-i", daemon.folder.path("pmc"), "-s",
-                      daemon.socketPath(), "GET " + dataSet},
-                     daemon.folder.path("pmc.output"))
-            .finish()
-            .output;
+        Child pmc({pmcPath(), "-u", "-b", "0", "-i", daemon.folder.path("pmc"), "-s",
+                   daemon.socketPath(), "GET " + dataSet});
+        EXPECT_EQ(pmc.wait(), 0) << pmc.errors();
+        return pmc.output();
     }
 
     Daemon daemon{

@@ -7,16 +7,12 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include "support/Processes.h"
+
 namespace {
 
 bool contains(const std::string& text, const std::string& part) {
     return text.find(part) != std::string::npos;
-}
-
-Finished runToEnd(const std::vector<std::string>& arguments, const Folder& folder) {
-    std::vector<std::string> command{SIMPTP4L_PATH};
-    command.insert(command.end(), arguments.begin(), arguments.end());
-    return Child(command, folder.path("output")).finish();
 }
 
 TEST(Simptp4lProcess, EndsOnSigtermAndSigintAndRemovesTheSocket) {
@@ -25,7 +21,7 @@ TEST(Simptp4lProcess, EndsOnSigtermAndSigintAndRemovesTheSocket) {
         ASSERT_TRUE(daemon.waitUntilBound());
         EXPECT_TRUE(std::filesystem::is_socket(daemon.socketPath()));
         daemon.process.signal(number);
-        EXPECT_EQ(daemon.process.finish().status, 0);
+        EXPECT_EQ(daemon.process.wait(), 0);
         EXPECT_FALSE(std::filesystem::exists(daemon.socketPath()));
         EXPECT_TRUE(contains(daemon.log(), number == SIGTERM ? "SIGTERM" : "SIGINT"));
         EXPECT_TRUE(contains(daemon.log(), R"({"event":"exit","status":0})"));
@@ -36,22 +32,21 @@ TEST(Simptp4lProcess, IgnoresASignalAsTold) {
     Daemon daemon("ignore SIGTERM\n");
     ASSERT_TRUE(daemon.waitUntilBound());
     daemon.process.signal(SIGTERM);
-    ASSERT_TRUE(eventually([&] { return contains(daemon.log(), "\"ignored\":true"); }));
+    ASSERT_TRUE(waitUntil([&] { return contains(daemon.log(), "\"ignored\":true"); }));
     EXPECT_TRUE(daemon.process.isRunning());
     daemon.process.signal(SIGKILL);
-    EXPECT_EQ(daemon.process.finish().status, -SIGKILL);
+    EXPECT_EQ(daemon.process.wait(), 1000 + SIGKILL);
 }
 
 TEST(Simptp4lProcess, ReplacesAStaleSocketFile) {
     Daemon first;
     ASSERT_TRUE(first.waitUntilBound());
     first.process.signal(SIGKILL);
-    first.process.finish();
+    first.process.wait();
     ASSERT_TRUE(std::filesystem::exists(first.socketPath()));
-    const Child second({SIMPTP4L_PATH, "-f", first.folder.path("config")},
-                       first.folder.path("output"));
+    const Child second({SIMPTP4L_PATH, "-f", first.folder.path("config")});
     const Client client(first.folder.path("me"), first.socketPath());
-    EXPECT_TRUE(eventually([&] { return client.send(requests::timeStatus()); }));
+    EXPECT_TRUE(waitUntil([&] { return client.send(requests::timeStatus()); }));
     EXPECT_EQ(client.receive().size(), 2 * 104U);
 }
 
@@ -86,14 +81,14 @@ TEST(Simptp4lProcess, LogsRequestsAndAnswers) {
     ASSERT_TRUE(daemon.waitUntilBound());
     const Client client(daemon.folder.path("me"), daemon.socketPath());
     const std::string answer = client.ask(requests::timeStatus());
-    ASSERT_TRUE(eventually([&] { return contains(daemon.log(), answer); }));
+    ASSERT_TRUE(waitUntil([&] { return contains(daemon.log(), answer); }));
     EXPECT_TRUE(contains(daemon.log(), "\"octets\":\"" + requests::timeStatus() + "\",\"from\":\"" +
                                            daemon.folder.path("me") + "\""));
 }
 
 TEST(Simptp4lProcess, ExitsAtOnceAsTold) {
     Daemon daemon("exit-at-once 3\n");
-    EXPECT_EQ(daemon.process.finish().status, 3);
+    EXPECT_EQ(daemon.process.wait(), 3);
     EXPECT_TRUE(contains(daemon.log(), R"("event":"start")"));
     EXPECT_FALSE(daemon.isBound());
 }
@@ -108,45 +103,42 @@ TEST(Simptp4lProcess, BindsLateAsTold) {
 
 TEST(Simptp4lProcess, EndsOnASignalBeforeItIsBound) {
     Daemon daemon("start-delay 1000\n");
-    ASSERT_TRUE(eventually([&] { return contains(daemon.log(), R"("event":"start")"); }));
+    ASSERT_TRUE(waitUntil([&] { return contains(daemon.log(), R"("event":"start")"); }));
     // The signal may come before the handler: then it ends the process by itself.
     daemon.process.signal(SIGTERM);
-    const int status = daemon.process.finish().status;
-    EXPECT_TRUE(status == 0 || status == -SIGTERM) << status;
+    const int status = daemon.process.wait();
+    EXPECT_TRUE(status == 0 || status == 1000 + SIGTERM) << status;
 }
 
 TEST(Simptp4lProcess, AcceptsOtherOptionsOfPtp4l) {
     const Folder folder;
     folder.write("config", "[global]\n");
     const Finished finished =
-        runToEnd({"-A", "-2Smq", "-s", "-l", "7", "-p/dev/ptp0", "-ieth0", "-f",
-                  folder.path("config"), "--summary_interval=3", "--clock_servo", "pi", "--check"},
-                 folder);
-    EXPECT_EQ(finished.status, 0) << finished.output;
+        run({"-A", "-2Smq", "-s", "-l", "7", "-p/dev/ptp0", "-ieth0", "-f", folder.path("config"),
+             "--summary_interval=3", "--clock_servo", "pi", "--check"});
+    EXPECT_EQ(finished.status, 0) << finished.errors;
 }
 
 TEST(Simptp4lProcess, RefusesWhatItCannotRead) {
     const Folder folder;
     folder.write("bad", "[global]\n# comment\npriority1 900\n[eth0]\npriority2 x\n");
-    EXPECT_EQ(runToEnd({"-Z"}, folder).status, 1);
-    EXPECT_EQ(runToEnd({"-f"}, folder).status, 1);
-    EXPECT_EQ(runToEnd({"-f", folder.path("missing")}, folder).status, 1);
-    const Finished finished = runToEnd({"-f", folder.path("bad")}, folder);
+    EXPECT_EQ(run({"-Z"}).status, 1);
+    EXPECT_EQ(run({"-f"}).status, 1);
+    EXPECT_EQ(run({"-f", folder.path("missing")}).status, 1);
+    const Finished finished = run({"-f", folder.path("bad")});
     EXPECT_EQ(finished.status, 1);
-    EXPECT_EQ(finished.output, "simptp4l: " + folder.path("bad") + ":3: bad value for priority1\n");
+    EXPECT_EQ(finished.errors, "simptp4l: " + folder.path("bad") + ":3: bad value for priority1\n");
 }
 
 TEST(Simptp4lProcess, ReportsASocketThatCannotBeBound) {
     Daemon daemon({}, {}, "uds_address /nonexistent/folder/ptp4l\n");
-    const Finished finished = daemon.process.finish();
-    EXPECT_EQ(finished.status, 1);
-    EXPECT_TRUE(contains(finished.output, "/nonexistent/folder/ptp4l: cannot bind"));
+    EXPECT_EQ(daemon.process.wait(), 1);
+    EXPECT_TRUE(contains(daemon.process.errors(), "/nonexistent/folder/ptp4l: cannot bind"));
     EXPECT_TRUE(contains(daemon.log(), R"({"event":"exit","status":1})"));
 }
 
 TEST(Simptp4lProcess, ShowsHelp) {
-    const Folder folder;
-    const Finished finished = runToEnd({"--help"}, folder);
+    const Finished finished = run({"--help"});
     EXPECT_EQ(finished.status, 0);
     EXPECT_TRUE(contains(finished.output, "--script FILE"));
 }

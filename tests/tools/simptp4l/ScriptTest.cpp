@@ -5,18 +5,19 @@
 #include <filesystem>
 #include <gtest/gtest.h>
 
+#include "support/Processes.h"
+
 namespace {
 
-Finished check(const std::string& script, const Folder& folder) {
-    return Child({SIMPTP4L_PATH, "--script", script, "--check"}, folder.path("output")).finish();
+Finished check(const std::string& script) {
+    return run({"--script", script, "--check"});
 }
 
 TEST(Simptp4lScript, EveryExampleParses) {
-    const Folder folder;
     unsigned count = 0;
     for (const auto& entry : std::filesystem::directory_iterator(SIMPTP4L_EXAMPLES)) {
-        const Finished finished = check(entry.path(), folder);
-        EXPECT_EQ(finished.status, 0) << entry.path() << ": " << finished.output;
+        const Finished finished = check(entry.path());
+        EXPECT_EQ(finished.status, 0) << entry.path() << ": " << finished.errors;
         ++count;
     }
     EXPECT_GE(count, 27U);
@@ -27,30 +28,29 @@ TEST(Simptp4lScript, EveryExampleRuns) {
         const std::string name = entry.path().stem();
         Daemon daemon(readFile(entry.path()), {"eth0", "eth1"});
         const auto isBound = [&] { return std::filesystem::exists(daemon.socketPath()); };
-        EXPECT_TRUE(eventually([&] { return isBound() || !daemon.process.isRunning(); })) << name;
+        EXPECT_TRUE(waitUntil([&] { return isBound() || !daemon.process.isRunning(); })) << name;
         if (isBound()) {
             const Client client(daemon.folder.path("me"), daemon.socketPath());
             EXPECT_TRUE(client.send(requests::timeStatus())) << name;
             daemon.process.signal(name == "ignore-sigterm" ? SIGINT : SIGTERM);
         }
-        EXPECT_EQ(daemon.process.finish().status, name == "exit-at-once" ? 3 : 0) << name;
+        EXPECT_EQ(daemon.process.wait(), name == "exit-at-once" ? 3 : 0) << name;
     }
 }
 
 TEST(Simptp4lScript, CommentsAndBlankLinesSayNothing) {
     const Folder folder;
     folder.write("script", "\n# text\n   \n\t# text\noffset 5 # text\nseed 0xFF#\n");
-    EXPECT_EQ(check(folder.path("script"), folder).output,
+    EXPECT_EQ(check(folder.path("script")).errors,
               "simptp4l: " + folder.path("script") + ":6: bad seed: 0xFF#\n");
 }
 
 TEST(Simptp4lScript, EveryErrorIsReportedInOneRun) {
     Daemon daemon("offset\noffset 5\nports -1\n");
-    const Finished finished = daemon.process.finish();
     const std::string path = daemon.folder.path("config.sim");
-    EXPECT_EQ(finished.status, 2);
-    EXPECT_EQ(finished.output, "simptp4l: " + path + ":2: missing offset\nsimptp4l: " + path +
-                                   ":4: bad number of ports: -1\n");
+    EXPECT_EQ(daemon.process.wait(), 2);
+    EXPECT_EQ(daemon.process.errors(), "simptp4l: " + path + ":2: missing offset\nsimptp4l: " +
+                                           path + ":4: bad number of ports: -1\n");
     EXPECT_NE(daemon.log().find(R"({"event":"error","text":")" + path + ":4: bad number of ports"),
               std::string::npos);
     EXPECT_NE(daemon.log().find(R"({"event":"exit","status":2})"), std::string::npos);
@@ -59,11 +59,8 @@ TEST(Simptp4lScript, EveryErrorIsReportedInOneRun) {
 TEST(Simptp4lScript, AMissingScriptIsAnErrorOnlyWhenItWasNamed) {
     const Folder folder;
     folder.write("config", "[global]\n");
-    EXPECT_EQ(check(folder.path("missing"), folder).status, 2);
-    EXPECT_EQ(Child({SIMPTP4L_PATH, "-f", folder.path("config"), "--check"}, folder.path("output"))
-                  .finish()
-                  .status,
-              0);
+    EXPECT_EQ(check(folder.path("missing")).status, 2);
+    EXPECT_EQ(run({"-f", folder.path("config"), "--check"}).status, 0);
 }
 
 struct BadLine {
@@ -76,9 +73,9 @@ class Simptp4lBadLine : public testing::TestWithParam<BadLine> {};
 TEST_P(Simptp4lBadLine, IsReportedWithItsNumber) {
     const Folder folder;
     folder.write("script", std::string("# first\n\n") + GetParam().line + "\nports 2\n");
-    const Finished finished = check(folder.path("script"), folder);
+    const Finished finished = check(folder.path("script"));
     EXPECT_EQ(finished.status, 2);
-    EXPECT_EQ(finished.output,
+    EXPECT_EQ(finished.errors,
               "simptp4l: " + folder.path("script") + ":3: " + GetParam().text + "\n");
 }
 

@@ -186,7 +186,7 @@ TEST_F(PtpProcessSystemCallsTest, TerminateSendsOneSigtermAndTheSecondTimeNothin
 TEST_F(PtpProcessSystemCallsTest, ReapedChildIsNeverSignalled) {
     writeFile("child.cfg", "exit 0");
     process.spawn(VANTEL_CHILD_PROGRAM, "./child.cfg", {});
-    EXPECT_TRUE(eventually([&] { return process.hasDied(); }));
+    EXPECT_TRUE(waitUntil([&] { return process.hasDied(); }));
     process.terminate();
     EXPECT_THAT(kills, IsEmpty());
     EXPECT_THAT(log.lines(), IsEmpty());

@@ -46,7 +46,7 @@ protected:
     }
 
     bool hasDiedSoon() {
-        return eventually([&] { return process.hasDied(); });
+        return waitUntil([&] { return process.hasDied(); });
     }
 
     /// Whether nothing is left of the child, not even its status.
