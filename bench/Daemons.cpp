@@ -3,9 +3,9 @@
 #include <filesystem>
 #include <stdexcept>
 
+#include "StubDaemon.h"
 #include "support/Child.h"
 #include "support/Processes.h"
-#include "support/StubDaemon.h"
 #include "support/TemporaryFolder.h"
 #include "system/BoundaryClock.h"
 

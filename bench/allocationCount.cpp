@@ -12,7 +12,7 @@
 #include "Program.h"
 #include "Row.h"
 #include "Session.h"
-#include "support/StubDaemon.h"
+#include "StubDaemon.h"
 #include "support/TemporaryFolder.h"
 #include "tPtp4lDefaultDataSetMgmtTlv.h"
 #include "tPtp4lParentDataSetMgmtTlv.h"

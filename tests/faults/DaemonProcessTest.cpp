@@ -112,8 +112,8 @@ TEST_F(DaemonProcessTest, ThatSomebodyElseRestartsIsHeardAgain) {
     expectDeathIsReported();
     std::filesystem::remove("ptp4l.sock");
     helpers.threads = 1;
-    answers = std::make_unique<HandDrivenDaemon>(
-        "ptp4l.sock", std::vector<HandDrivenDaemon::Measurement>{{5, 1000, 1}});
+    answers = std::make_unique<FakePtp4l>("ptp4l.sock",
+                                          std::vector<FakePtp4l::Measurement>{{5, 1000, 1}});
     const auto hasNewPair = [](const RecordingHost::Call& call) { return call.localTime == 1000; };
     ASSERT_TRUE(host.waitFor(
         [=](const Calls& calls) { return std::any_of(calls.begin(), calls.end(), hasNewPair); }));

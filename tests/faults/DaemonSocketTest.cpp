@@ -62,8 +62,8 @@ TEST_F(DaemonSocketTest, ReplacedByOneThatNobodyReadsIsSilence) {
 
 // As it is by ptp4l, in whose place the test answers: both meet.
 TEST_F(DaemonSocketTest, AboveALengthOf107IsCut) {
-    answers = std::make_unique<HandDrivenDaemon>(
-        std::string(107, 's'), std::vector<HandDrivenDaemon::Measurement>{{5, 1000, 1}});
+    answers = std::make_unique<FakePtp4l>(std::string(107, 's'),
+                                          std::vector<FakePtp4l::Measurement>{{5, 1000, 1}});
     helpers.threads = 1;
     beginAt(std::string(200, 's'), "start-delay 1000000\n");
     ASSERT_TRUE(waitForCalls(Function::getTime, 2));

@@ -24,7 +24,7 @@ protected:
 
     /// A new measurement with each poll.
     void beginMeasuring() {
-        std::vector<HandDrivenDaemon::Measurement> polls;
+        std::vector<FakePtp4l::Measurement> polls;
         for (std::uint64_t ingressTime = 1000; ingressTime <= 100000; ingressTime += 1000) {
             polls.push_back({0, ingressTime, 1});
         }

@@ -20,7 +20,7 @@ protected:
 
     /// A new measurement with each poll: 1000, 2000, ...
     void beginMeasuring() {
-        std::vector<HandDrivenDaemon::Measurement> polls(100);
+        std::vector<FakePtp4l::Measurement> polls(100);
         for (std::size_t poll = 0; poll < polls.size(); ++poll) {
             polls[poll].ingressTime = 1000 * (poll + 1);
         }

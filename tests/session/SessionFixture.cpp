@@ -100,8 +100,8 @@ void SessionTest::begin(const std::string& script, const std::string& interfaces
     });
 }
 
-void SessionTest::beginMeasured(std::vector<HandDrivenDaemon::Measurement> polls) {
-    answers = std::make_unique<HandDrivenDaemon>(udsAddress, std::move(polls));
+void SessionTest::beginMeasured(std::vector<FakePtp4l::Measurement> polls) {
+    answers = std::make_unique<FakePtp4l>(udsAddress, std::move(polls));
     begin("start-delay 1000000\n");
 }
 

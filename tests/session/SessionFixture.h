@@ -12,7 +12,7 @@
 
 #include "contract/PluginFixture.h"
 #include "support/EpochFifo.h"
-#include "support/HandDrivenDaemon.h"
+#include "support/FakePtp4l.h"
 #include "support/Processes.h"
 #include "support/RecordingHost.h"
 #include "support/SimulatedDaemon.h"
@@ -83,7 +83,7 @@ protected:
     void begin(const std::string& script, const std::string& interfaces = "[]");
 
     /// Initialises and starts the session with measurements of the test, poll by poll.
-    void beginMeasured(std::vector<HandDrivenDaemon::Measurement> polls);
+    void beginMeasured(std::vector<FakePtp4l::Measurement> polls);
 
     /// Waits until a function has been called so often. @return false after the deadline.
     bool waitForCalls(Function function, std::size_t count);
@@ -114,6 +114,6 @@ protected:
     // There is one, but for tests that take it away. What a reaction of the host uses must outlive
     // the session.
     std::optional<EpochFifo> fifo;
-    std::unique_ptr<HandDrivenDaemon> answers;
+    std::unique_ptr<FakePtp4l> answers;
     Session session;
 };

@@ -1,12 +1,17 @@
 #include "support/FakePtp4l.h"
 
+#include <algorithm>
 #include <filesystem>
+#include <memory>
 #include <utility>
 
 namespace {
 
 constexpr std::uint64_t clockIdentity = 0xAABBCCFFFEDDEEFF;
 constexpr std::uint64_t grandmasterIdentity = 0x001B21FFFE0A0B0C;
+
+/// Of a message up to the data: 34 + 14 + 6 octets.
+constexpr unsigned headSize = 54;
 
 class Writer {
 public:
@@ -42,7 +47,7 @@ std::vector<std::uint8_t> response(const FakePtp4l::Request& request, unsigned p
                                    const Writer& data) {
     const auto size = static_cast<unsigned>(data.octets().size());
     Writer message;
-    message.u8(0x0D).u8(0x02).u16(54 + size).u16(0).u16(0).u64(0).u32(0);
+    message.u8(0x0D).u8(0x02).u16(headSize + size).u16(0).u16(0).u64(0).u32(0);
     message.u64(clockIdentity).u16(port).u16(request.sequenceId()).u8(0x04).u8(0x7F);
     message.u64(0).u16(1).u8(0).u8(0).u8(0x02).u8(0);
     message.u16(0x0001).u16(2 + size).u16(request.managementId());
@@ -96,14 +101,44 @@ Writer perPort(const FakePtp4l::Request& request, unsigned number) {
     }
 }
 
+/// Fills the data of an answer: octets, and zeros behind them.
+void setData(Octets& answer, const Writer& data) {
+    const std::size_t size = answer.size();
+    answer.resize(headSize);
+    answer.insert(answer.end(), data.octets().begin(), data.octets().end());
+    answer.resize(size);
+}
+
+FakePtp4l::Script measured(std::vector<FakePtp4l::Measurement> polls) {
+    return [polls = std::move(polls), next = std::make_shared<std::size_t>(0)](
+               const FakePtp4l::Request& request, FakePtp4l::Answers& answers) {
+        Writer data;
+        if (request.managementId() == FakePtp4l::timeStatusNp) {
+            const auto& poll = polls.at(*next);
+            data.u64(poll.masterOffset).u64(poll.ingressTime);
+            data.u64(0).u64(0).u32(0).u16(0); // rates, time base and phase change
+            data.u32(poll.gmPresent);
+            *next = std::min(*next + 1, polls.size() - 1);
+        }
+        for (Octets& answer : answers) {
+            setData(answer, data);
+        }
+    };
+}
+
 } // namespace
 
 std::uint16_t FakePtp4l::Request::at(std::size_t index) const {
     return static_cast<std::uint16_t>(octets.at(index) << 8 | octets.at(index + 1));
 }
 
-FakePtp4l::FakePtp4l(const std::string& path, std::uint16_t ports)
-    : path_(path), socket_(path), ports_(ports), thread_([this] { run(); }) {}
+FakePtp4l::FakePtp4l(const std::string& path, std::uint16_t ports, Script script)
+    : path_(path), socket_(path), ports_(ports), script_(std::move(script)), thread_([this] {
+          run();
+      }) {}
+
+FakePtp4l::FakePtp4l(const std::string& path, std::vector<Measurement> polls)
+    : FakePtp4l(path, 0, measured(std::move(polls))) {}
 
 FakePtp4l::~FakePtp4l() {
     stopped_ = true;

@@ -13,7 +13,8 @@
 #include "support/DatagramSocket.h"
 
 /// Plays ptp4l's management socket, on a thread and with an encoder of its own. It knows the clock
-/// AA:BB:CC:FF:FE:DD:EE:FF with some ports, port 1 of which follows a grandmaster.
+/// AA:BB:CC:FF:FE:DD:EE:FF with some ports, port 1 of which follows a grandmaster; or a clock
+/// without ports whose data sets are all zero, with measurements that a test chooses.
 class FakePtp4l {
 public:
     enum ManagementId : std::uint16_t {
@@ -40,7 +41,17 @@ public:
     /// Told of every request before it is answered, on the daemon's thread. May change the answers.
     using Script = std::function<void(const Request& request, Answers& answers)>;
 
-    explicit FakePtp4l(const std::string& path, std::uint16_t ports = 1);
+    /// What TIME_STATUS_NP shows.
+    struct Measurement {
+        std::uint64_t masterOffset = 0; ///< as the 64 bits on the wire
+        std::uint64_t ingressTime = 0;
+        std::uint32_t gmPresent = 0;
+    };
+
+    explicit FakePtp4l(const std::string& path, std::uint16_t ports = 1, Script script = {});
+
+    /// @param polls the first poll gets the first measurement, and so on; the last one stays.
+    FakePtp4l(const std::string& path, std::vector<Measurement> polls);
     ~FakePtp4l();
     FakePtp4l(const FakePtp4l&) = delete;
     FakePtp4l& operator=(const FakePtp4l&) = delete;
@@ -70,8 +81,8 @@ private:
     mutable std::mutex mutex_;
     mutable std::condition_variable settled_;
     std::vector<Request> requests_;
-    Script script_;
     std::uint16_t ports_;
+    Script script_;
     unsigned marks_ = 0; ///< empty datagrams received
     std::atomic<bool> stopped_{false};
     std::thread thread_;

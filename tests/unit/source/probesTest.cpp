@@ -11,8 +11,8 @@
 
 #include "errors/Trace.h"
 #include "paths.h"
+#include "support/FakePtp4l.h"
 #include "support/RecordingHost.h"
-#include "support/StubDaemon.h"
 #include "support/TemporaryFolder.h"
 #include "tHost.h"
 #include "tPtp4lPortDataSetNpMgmtTlv.h"
@@ -128,7 +128,7 @@ protected:
 };
 
 TEST_F(ExchangeProbeTest, SingleAndPortsTellOfOneStartAndOneEnd) {
-    const StubDaemon daemon("remote", 3);
+    const FakePtp4l daemon("remote", 3);
     tPtp4lTimeStatusMgmtTlv timeStatus;
     node.getSingle(interface, remote, timeStatus, status);
     std::vector<tPortDataSetNp> answers;
@@ -172,7 +172,7 @@ protected:
     SessionProbesTest() {
         zesdbg::settings.threshold = 256;
         set("udsAddress", "\"remote\"");
-        recorder.setTime(0x1122334455667788 + 50000000);
+        recorder.setTime(0x1797AB0123456789 + 50000000);
     }
 
     /// Runs it for one pass. @return what is traced from the first sleep to the second. The
@@ -193,7 +193,7 @@ protected:
     Traces traces;
     RecordingHost recorder;
     void* slot = nullptr;
-    const StubDaemon daemon{"remote", 1};
+    const FakePtp4l daemon{"remote", 1};
 };
 
 TEST_F(SessionProbesTest, PassTellsAllThatItDoes) {

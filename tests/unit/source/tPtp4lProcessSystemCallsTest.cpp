@@ -16,6 +16,7 @@
 #include "errors/Exception.h"
 #include "support/ChildProgram.h"
 #include "support/SyslogCapture.h"
+#include "support/TemporaryFolder.h"
 
 using testing::ElementsAre;
 using testing::IsEmpty;

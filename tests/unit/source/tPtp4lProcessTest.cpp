@@ -13,6 +13,7 @@
 
 #include "support/ChildProgram.h"
 #include "support/Descriptors.h"
+#include "support/TemporaryFolder.h"
 #include "tSharedFifo.h"
 #include "tUdsMsgInterface.h"
 

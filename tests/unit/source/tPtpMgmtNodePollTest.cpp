@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "support/StubDaemon.h"
+#include "support/FakePtp4l.h"
 #include "support/TemporaryFolder.h"
 #include "tPtp4lDefaultDataSetMgmtTlv.h"
 #include "tPtp4lParentDataSetMgmtTlv.h"
@@ -30,7 +30,7 @@ protected:
     }
 
     TemporaryFolder folder;
-    StubDaemon daemon{"remote", GetParam()};
+    FakePtp4l daemon{"remote", GetParam()};
     const tUdsMsgAddress remote{"remote"};
     tUdsMsgInterface interface;
     tPtpMgmtNode node{tPtpPortIdentity(tPtpClockIdentity(), 1), 0};
@@ -46,7 +46,7 @@ TEST_P(PtpMgmtNodePollTest, ClockIsAskedAndAnswers) {
     node.getSingle(interface, remote, defaults, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(timeStatus.masterOffset(), -42);
-    EXPECT_EQ(parent.grandmasterPriority1(), 10);
+    EXPECT_EQ(parent.grandmasterPriority1(), 128);
     EXPECT_EQ(defaults.numberPorts(), GetParam());
 }
 
@@ -57,9 +57,9 @@ TEST_P(PtpMgmtNodePollTest, EveryPortIsAskedAndAnswersInItsTurn) {
     ASSERT_EQ(status.code, 0);
     for (unsigned port = 1; port <= GetParam(); ++port) {
         EXPECT_EQ(dataSets[port - 1].portIdentity.portNumber(), port);
-        EXPECT_EQ(dataSetsNp[port - 1].neighborPropDelayThresh, 20000000U + port);
+        EXPECT_EQ(dataSetsNp[port - 1].neighborPropDelayThresh, 799 + port);
         EXPECT_EQ(properties[port - 1].portIdentity.portNumber(), port);
-        EXPECT_EQ(properties[port - 1].interface.text(), "bc" + std::to_string(port - 1));
+        EXPECT_EQ(properties[port - 1].interface.text(), "swp" + std::to_string(port));
     }
 }
 
