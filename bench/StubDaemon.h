@@ -21,7 +21,6 @@ public:
 private:
     void run() const;
 
-    std::string path_;
     std::map<std::uint16_t, std::vector<Octets>> answers_;
     DatagramSocket socket_;
     std::thread thread_;

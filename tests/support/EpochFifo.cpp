@@ -7,7 +7,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-EpochFifo::EpochFifo() : descriptor_(-1) {
+EpochFifo::EpochFifo() {
     if (mkfifo(path, 0600) == 0) {
         descriptor_ = open(path, O_RDWR | O_NONBLOCK | O_CLOEXEC);
     }

@@ -22,5 +22,5 @@ public:
     int queued() const;
 
 private:
-    int descriptor_;
+    int descriptor_ = -1;
 };

@@ -10,7 +10,7 @@
 
 namespace {
 
-std::atomic<RecordingHost*> current{nullptr};
+std::atomic<RecordingHost*> currentHost{nullptr};
 
 RecordingHost::Call entry(RecordingHost::Function function, void** context,
                           const zeerr_Status* status) {
@@ -24,9 +24,9 @@ RecordingHost::Call entry(RecordingHost::Function function, void** context,
     return call;
 }
 
-void record(RecordingHost::Call call, std::uint64_t* time, zeerr_Status* status) {
-    if (RecordingHost* const host = current.load()) {
-        host->record(std::move(call), time, status);
+void record(const RecordingHost::Call& call, std::uint64_t* time, zeerr_Status* status) {
+    if (RecordingHost* const host = currentHost.load()) {
+        host->record(call, time, status);
     }
 }
 
@@ -39,7 +39,7 @@ extern "C" {
     const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::getTime, context, status);
     call.timeOnEntry = *time;
-    record(std::move(call), time, status);
+    record(call, time, status);
 }
 
 [[gnu::visibility("default")]] void zekel_adjustTime(void** context, std::uint64_t referenceTime,
@@ -49,7 +49,7 @@ extern "C" {
     RecordingHost::Call call = entry(RecordingHost::Function::adjustTime, context, status);
     call.referenceTime = referenceTime;
     call.localTime = localTime;
-    record(std::move(call), nullptr, status);
+    record(call, nullptr, status);
 }
 
 [[gnu::visibility("default")]] void zekel_setTRQuality(void** context, const double* quality,
@@ -58,7 +58,7 @@ extern "C" {
     RecordingHost::Call call = entry(RecordingHost::Function::setTRQuality, context, status);
     std::copy_n(quality, ZEKEL_QUALITY_LENGTH, call.quality.begin());
     call.text = reason;
-    record(std::move(call), nullptr, status);
+    record(call, nullptr, status);
 }
 
 [[gnu::visibility("default")]] void zekel_updateMetaData(void** context, const char* metadataJson,
@@ -66,20 +66,20 @@ extern "C" {
     const OwnAllocations own;
     RecordingHost::Call call = entry(RecordingHost::Function::updateMetaData, context, status);
     call.text = metadataJson;
-    record(std::move(call), nullptr, status);
+    record(call, nullptr, status);
 }
 
 } // extern "C"
 
 RecordingHost::RecordingHost() {
     RecordingHost* none = nullptr;
-    if (!current.compare_exchange_strong(none, this)) {
+    if (!currentHost.compare_exchange_strong(none, this)) {
         throw std::logic_error("there is a host already");
     }
 }
 
 RecordingHost::~RecordingHost() {
-    current = nullptr;
+    currentHost = nullptr;
 }
 
 void RecordingHost::onCall(Reaction reaction) {
@@ -111,7 +111,7 @@ bool RecordingHost::waitFor(const std::function<bool(const std::vector<Call>&)>&
     return changed_.wait_for(lock, deadline, [&] { return condition(calls_); });
 }
 
-void RecordingHost::record(Call call, std::uint64_t* time, zeerr_Status* status) {
+void RecordingHost::record(const Call& call, std::uint64_t* time, zeerr_Status* status) {
     Reaction reaction;
     {
         const std::lock_guard<std::mutex> lock(mutex_);

@@ -54,7 +54,7 @@ public:
                  std::chrono::milliseconds deadline = std::chrono::seconds(20)) const;
 
     /// For the functions themselves.
-    void record(Call call, std::uint64_t* time, zeerr_Status* status);
+    void record(const Call& call, std::uint64_t* time, zeerr_Status* status);
 
 private:
     mutable std::mutex mutex_;

@@ -13,13 +13,13 @@
 
 namespace {
 
-std::atomic<SyslogCapture*> current{nullptr};
+std::atomic<SyslogCapture*> currentLog{nullptr};
 
 [[gnu::format(printf, 2, 0)]] void capture(int priority, const char* format, va_list arguments) {
     const OwnAllocations own;
     char text[8192];
     std::vsnprintf(text, sizeof(text), format, arguments);
-    if (SyslogCapture* const log = current.load()) {
+    if (SyslogCapture* const log = currentLog.load()) {
         log->add(priority, text);
     }
 }
@@ -29,21 +29,22 @@ std::atomic<SyslogCapture*> current{nullptr};
 // These stand before the C library's own; the checked one is what _FORTIFY_SOURCE calls.
 extern "C" {
 
-[[gnu::visibility("default"), gnu::format(printf, 2, 3)]] void syslog(int priority,
-                                                                      const char* format, ...) {
+[[gnu::visibility("default"), gnu::format(printf, 2, 3)]] void syslog(int pri, const char* fmt,
+                                                                      ...) {
     std::va_list arguments;
-    va_start(arguments, format);
-    capture(priority, format, arguments);
+    va_start(arguments, fmt);
+    capture(pri, fmt, arguments);
     va_end(arguments);
 }
 
-void __syslog_chk(int priority, int flag, const char* format, ...);
+// NOLINTNEXTLINE: a name of the C library
+void __syslog_chk(int pri, int flag, const char* fmt, ...);
 
-[[gnu::visibility("default"), gnu::format(printf, 3, 4)]] void
-__syslog_chk(int priority, int /*flag*/, const char* format, ...) {
+[[gnu::visibility("default"), gnu::format(printf, 3, 4)]] void __syslog_chk(int pri, int /*flag*/,
+                                                                            const char* fmt, ...) {
     std::va_list arguments;
-    va_start(arguments, format);
-    capture(priority, format, arguments);
+    va_start(arguments, fmt);
+    capture(pri, fmt, arguments);
     va_end(arguments);
 }
 
@@ -51,13 +52,13 @@ __syslog_chk(int priority, int /*flag*/, const char* format, ...) {
 
 SyslogCapture::SyslogCapture() {
     SyslogCapture* none = nullptr;
-    if (!current.compare_exchange_strong(none, this)) {
+    if (!currentLog.compare_exchange_strong(none, this)) {
         throw std::logic_error("the system log is captured already");
     }
 }
 
 SyslogCapture::~SyslogCapture() {
-    current = nullptr;
+    currentLog = nullptr;
 }
 
 std::vector<SyslogCapture::Line> SyslogCapture::lines() const {

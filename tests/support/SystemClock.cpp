@@ -20,13 +20,12 @@ long askSystem(clockid_t clock, timespec* time) {
 
 } // namespace
 
-extern "C" [[gnu::visibility("default")]] int clock_gettime(clockid_t clock,
-                                                            timespec* time) noexcept {
-    if (clock != CLOCK_REALTIME || !realtime) {
-        return static_cast<int>(askSystem(clock, time));
+extern "C" [[gnu::visibility("default")]] int clock_gettime(clockid_t id, timespec* tp) noexcept {
+    if (id != CLOCK_REALTIME || !realtime) {
+        return static_cast<int>(askSystem(id, tp));
     }
-    time->tv_sec = *realtime / 1000000000;
-    time->tv_nsec = static_cast<decltype(time->tv_nsec)>(*realtime % 1000000000);
+    tp->tv_sec = *realtime / 1000000000;
+    tp->tv_nsec = static_cast<decltype(tp->tv_nsec)>(*realtime % 1000000000);
     return 0;
 }
 
