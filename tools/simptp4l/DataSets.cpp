@@ -3,8 +3,6 @@
 namespace simptp4l {
 namespace {
 
-constexpr int listeningState = 4;
-
 /// Octets before the part that lengthField counts.
 constexpr std::size_t tlvHead = 4;
 

@@ -10,6 +10,9 @@
 
 namespace simptp4l {
 
+/// A portState.
+constexpr int listeningState = 4;
+
 /// Everything that a data set of one port may show; of the clock when port is 0.
 struct View {
     std::uint64_t clockIdentity = 0;

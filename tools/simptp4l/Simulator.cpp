@@ -13,7 +13,6 @@
 namespace simptp4l {
 namespace {
 
-constexpr int listeningState = 4;
 constexpr int masterState = 6;
 constexpr int uncalibratedState = 8;
 constexpr std::int64_t second = 1000000000;
