@@ -11,6 +11,7 @@
 #include <unistd.h>
 
 #include "SockSample.h"
+#include "Text.h"
 #include "UsageError.h"
 
 namespace vantelhost {
@@ -41,9 +42,8 @@ Event ChronyClock::state() const {
     if (error_ < 0) {
         return chronyEvent(sent_, failed_, "there was none");
     }
-    return chronyEvent(
-        sent_, failed_,
-        error_ == 0 ? "" : fmt::format("{}: {}", path_, std::system_category().message(error_)));
+    return chronyEvent(sent_, failed_,
+                       error_ == 0 ? "" : fmt::format("{}: {}", path_, errorText(error_)));
 }
 
 /// To the path each time: chronyd may come later, and makes a new socket when it is restarted.

@@ -1,7 +1,6 @@
 #include "EpochFifo.h"
 
 #include <cerrno>
-#include <cstring>
 #include <system_error>
 #include <utility>
 
@@ -10,6 +9,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "Text.h"
 #include "UsageError.h"
 
 namespace vantelhost {
@@ -17,8 +17,7 @@ namespace vantelhost {
 namespace {
 
 [[noreturn]] void refuse(const char* what, const std::string& path, int number) {
-    throw UsageError(
-        fmt::format("cannot {} the epoch FIFO {}: {}", what, path, std::strerror(number)));
+    throw UsageError(fmt::format("cannot {} the epoch FIFO {}: {}", what, path, errorText(number)));
 }
 
 [[noreturn]] void refuseNoFifo(const std::string& path) {
@@ -27,8 +26,8 @@ namespace {
 
 } // namespace
 
-EpochFifo::EpochFifo(std::string path, Absent absent) : path_(std::move(path)) {
-    created_ = absent == Absent::create && create();
+EpochFifo::EpochFifo(std::string path, Absent absent)
+    : path_(std::move(path)), created_(absent == Absent::create && create()) {
     try {
         descriptor_ = open();
     } catch (...) {

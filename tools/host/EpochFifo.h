@@ -33,7 +33,7 @@ private:
     void remove() const;
 
     std::string path_;
-    bool created_ = false;
+    bool created_;
     int descriptor_ = -1;
 };
 

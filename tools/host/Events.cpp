@@ -1,7 +1,7 @@
 #include "Events.h"
 
+#include <algorithm>
 #include <array>
-#include <cstring>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -18,10 +18,10 @@ using Quality = std::array<double, ZEKEL_QUALITY_LENGTH>;
 const char* kindOf(const double* quality) {
     constexpr Quality usable = ZEKEL_QUALITY_USABLE;
     constexpr Quality unusable = ZEKEL_QUALITY_UNUSABLE;
-    if (std::memcmp(quality, usable.data(), sizeof(usable)) == 0) {
+    if (std::equal(usable.begin(), usable.end(), quality)) {
         return "usable";
     }
-    return std::memcmp(quality, unusable.data(), sizeof(unusable)) == 0 ? "unusable" : "other";
+    return std::equal(unusable.begin(), unusable.end(), quality) ? "unusable" : "other";
 }
 
 std::string portSummary(const std::string& name, const Json& port) {

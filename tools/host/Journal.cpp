@@ -2,8 +2,9 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <system_error>
 #include <utility>
+
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -152,7 +153,7 @@ std::optional<Event> Journal::give(Output& output, const Event& event, const Mom
     if (output.lost || output.take(event, moment)) {
         return std::nullopt;
     }
-    const std::string reason = std::system_category().message(errno);
+    const std::string reason = errorText(errno);
     output.lost = true;
     output.onLost(reason);
     return failureEvent(output.name, reason);

@@ -1,7 +1,6 @@
 #include "RecordFile.h"
 
 #include <cerrno>
-#include <cstring>
 
 #include <fcntl.h>
 #include <fmt/format.h>
@@ -9,6 +8,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "Text.h"
 #include "UsageError.h"
 
 namespace vantelhost {
@@ -25,7 +25,7 @@ bool isSomebodyElses(int descriptor) {
            errno == EWOULDBLOCK;
 }
 
-[[noreturn]] void refuse(const std::string& path, const char* problem) {
+[[noreturn]] void refuse(const std::string& path, const std::string& problem) {
     throw UsageError(fmt::format("cannot write {}: {}", path, problem));
 }
 
@@ -34,7 +34,7 @@ bool isSomebodyElses(int descriptor) {
 RecordFile::RecordFile(const std::string& path)
     : path_(path), descriptor_(::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644)) {
     if (descriptor_ < 0) {
-        refuse(path, std::strerror(errno));
+        refuse(path, errorText(errno));
     }
     if (isSomebodyElses(descriptor_)) {
         ::close(descriptor_);
@@ -44,7 +44,7 @@ RecordFile::RecordFile(const std::string& path)
 
 void RecordFile::begin() const {
     if (isRegular(descriptor_) && ::ftruncate(descriptor_, 0) != 0) {
-        refuse(path_, std::strerror(errno));
+        refuse(path_, errorText(errno));
     }
 }
 

@@ -1,7 +1,6 @@
 #include "ReportCommand.h"
 
 #include <cerrno>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <memory>
@@ -14,6 +13,7 @@
 #include "RecordFile.h"
 #include "Report/Page.h"
 #include "Report/RecordingReader.h"
+#include "Text.h"
 #include "UsageError.h"
 #include "WriteAll.h"
 
@@ -29,7 +29,7 @@ struct ReportOptions {
 Recording readRecording(const std::string& path) {
     std::ifstream file(path, std::ios::binary);
     if (!file) {
-        throw UsageError(fmt::format("cannot read {}: {}", path, std::strerror(errno)));
+        throw UsageError(fmt::format("cannot read {}: {}", path, errorText(errno)));
     }
     return RecordingReader::read(file, path);
 }
@@ -40,7 +40,7 @@ void writePage(const std::string& path, const std::string& page) {
     if (path == standardOutput) {
         writeOutput(page);
     } else if (const RecordFile file(path); !writeAll(file.descriptor(), page)) {
-        throw std::runtime_error(fmt::format("cannot write {}: {}", path, std::strerror(errno)));
+        throw std::runtime_error(fmt::format("cannot write {}: {}", path, errorText(errno)));
     }
 }
 

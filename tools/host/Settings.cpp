@@ -128,7 +128,9 @@ private:
     void checkInterfaces() {
         const bool given = given_.contains(interfaceKey);
         const Json value = given ? given_[interfaceKey] : Json::array();
-        const auto isName = [](const Json& each) { return each.is_string() && each != ""; };
+        const auto isName = [](const Json& each) {
+            return each.is_string() && !each.get_ref<const std::string&>().empty();
+        };
         if (!given && user_.interfacesRequired) {
             error(interfaceKey, "is missing: name at least one, as with --interface eth0");
         } else if (!value.is_array() || !std::all_of(value.begin(), value.end(), isName)) {

@@ -1,7 +1,6 @@
 #include "SettingsOptions.h"
 
 #include <cerrno>
-#include <cstring>
 #include <fstream>
 #include <iostream>
 #include <iterator>
@@ -10,6 +9,7 @@
 #include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
+#include "Text.h"
 #include "UsageError.h"
 
 namespace vantelhost {
@@ -19,12 +19,12 @@ namespace {
 constexpr char standardInput[] = "the standard input";
 
 [[noreturn]] void refuseToRead(const std::string& name) {
-    throw UsageError(fmt::format("cannot read {}: {}", name, std::strerror(errno)));
+    throw UsageError(fmt::format("cannot read {}: {}", name, errorText(errno)));
 }
 
 std::string readAll(std::istream& stream, const std::string& name) {
     try {
-        return std::string(std::istreambuf_iterator<char>(stream), {});
+        return {std::istreambuf_iterator<char>(stream), {}};
     } catch (const std::ios_base::failure&) { // a folder, for example
         refuseToRead(name);
     }

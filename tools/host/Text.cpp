@@ -1,5 +1,7 @@
 #include "Text.h"
 
+#include <system_error>
+
 #include <fmt/format.h>
 
 namespace vantelhost {
@@ -26,6 +28,10 @@ std::string onOneLine(std::string_view text) {
     return line;
 }
 
+std::string errorText(int number) {
+    return std::generic_category().message(number);
+}
+
 std::string toAscii(const Json& value) {
     return value.dump(-1, ' ', true, Json::error_handler_t::replace);
 }
@@ -34,7 +40,8 @@ std::string shown(const Json& value) {
     constexpr std::size_t longest = 60;
     std::string text = toAscii(value);
     if (text.size() > longest) {
-        text.replace(longest, std::string::npos, "...");
+        text.resize(longest);
+        text += "...";
     }
     return text;
 }

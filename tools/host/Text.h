@@ -11,6 +11,9 @@ namespace vantelhost {
 /// The text on one line: control characters become \xNN.
 std::string onOneLine(std::string_view text);
 
+/// What the system calls an error of this number of errno.
+std::string errorText(int number);
+
 /// The value as JSON text in ASCII; what is not UTF-8 is replaced.
 std::string toAscii(const Json& value);
 

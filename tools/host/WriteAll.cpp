@@ -2,11 +2,12 @@
 
 #include <cerrno>
 #include <cstddef>
-#include <cstring>
 #include <stdexcept>
 
 #include <fmt/format.h>
 #include <unistd.h>
+
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -25,7 +26,7 @@ bool writeAll(int descriptor, std::string_view text) {
 void writeOutput(std::string_view text) {
     if (!writeAll(STDOUT_FILENO, text)) {
         throw std::runtime_error(
-            fmt::format("cannot write the standard output: {}", std::strerror(errno)));
+            fmt::format("cannot write the standard output: {}", errorText(errno)));
     }
 }
 

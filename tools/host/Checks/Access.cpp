@@ -1,12 +1,13 @@
 #include "Checks/Access.h"
 
 #include <cerrno>
-#include <cstring>
 
 #include <fcntl.h>
 #include <fmt/format.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -31,14 +32,14 @@ Finding checkFolderOf(const std::string& file, const char* otherMend) {
     struct stat state {};
     if (::stat(folder.c_str(), &state) != 0) {
         const int error = errno;
-        return bad(fmt::format("{}: {}", folder, std::strerror(error)),
+        return bad(fmt::format("{}: {}", folder, errorText(error)),
                    error == ENOENT ? "mkdir -p " + folder + otherMend : "");
     }
     if (!S_ISDIR(state.st_mode)) {
         return bad(folder + ": is not a folder", "");
     }
     if (!isAllowed(folder, W_OK | X_OK)) {
-        return bad(fmt::format("{}: {}", folder, std::strerror(errno)),
+        return bad(fmt::format("{}: {}", folder, errorText(errno)),
                    "run the host as a user who may write there");
     }
     return good(folder + " is writable");

@@ -1,7 +1,6 @@
 #include "Checks/DaemonChecks.h"
 
 #include <cerrno>
-#include <cstring>
 #include <fstream>
 #include <iterator>
 
@@ -14,6 +13,7 @@
 #include "Checks/DaemonMessages.h"
 #include "Checks/Processes.h"
 #include "Checks/TimedProgram.h"
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -71,7 +71,7 @@ Finding checkDaemon(const Subject& subject) {
     }
     struct stat state {};
     if (::stat(path.c_str(), &state) != 0) {
-        const std::string problem = fmt::format("{}: {}", path, std::strerror(errno));
+        const std::string problem = fmt::format("{}: {}", path, errorText(errno));
         return bad(problem, mendOfMissing(subject));
     }
     return S_ISREG(state.st_mode)
@@ -134,7 +134,7 @@ Finding checkConfigurationWithin(const Subject& subject, std::chrono::millisecon
     }
     const auto end = runTimed({subject.daemon, "-f", *subject.rendered, "-m", "-q"}, longest);
     if (end.error != 0) {
-        return bad(fmt::format("{}: {}", subject.daemon, std::strerror(end.error)),
+        return bad(fmt::format("{}: {}", subject.daemon, errorText(end.error)),
                    "put ptp4l, or a link to it, there");
     }
     if (end.timedOut) {

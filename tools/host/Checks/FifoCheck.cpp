@@ -1,13 +1,13 @@
 #include "Checks/FifoCheck.h"
 
 #include <cerrno>
-#include <cstring>
 
 #include <fmt/format.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include "Checks/Access.h"
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -15,13 +15,13 @@ namespace {
 
 Finding checkAbsent(const Subject& subject, int error) {
     if (error != ENOENT) {
-        return bad(fmt::format("{}: {}", subject.fifo, std::strerror(error)), "");
+        return bad(fmt::format("{}: {}", subject.fifo, errorText(error)), "");
     }
     if (subject.createFifo) {
         const Finding folder = checkFolderOf(subject.fifo);
         return folder.verdict == Verdict::ok ? good(subject.fifo + ", will be created") : folder;
     }
-    return bad(fmt::format("{}: {}", subject.fifo, std::strerror(error)),
+    return bad(fmt::format("{}: {}", subject.fifo, errorText(error)),
                fmt::format("mkfifo -m 600 {}, at each boot, by its writer; or run with "
                            "--create-fifo",
                            subject.fifo));
@@ -51,7 +51,7 @@ Finding checkFifo(const Subject& subject) {
         return bad(path + ": is not a FIFO", fmt::format("remove it, then mkfifo -m 600 {}", path));
     }
     if (!isAllowed(path, R_OK)) {
-        return bad(fmt::format("{}: {}", path, std::strerror(errno)),
+        return bad(fmt::format("{}: {}", path, errorText(errno)),
                    "give the host's user the right to read it");
     }
     const std::string problem = strangers(state);

@@ -1,7 +1,6 @@
 #include "Checks/InterfaceChecks.h"
 
 #include <cerrno>
-#include <cstring>
 #include <map>
 #include <vector>
 
@@ -13,6 +12,7 @@
 #include "Checks/Access.h"
 #include "Checks/DaemonChecks.h"
 #include "Checks/InterfaceRequest.h"
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -54,14 +54,14 @@ Finding checkSoftware(const TimeStamping& timeStamping, const std::string& missi
 
 } // namespace
 
-Finding checkInterface(const Subject&, const std::string& interface) {
+Finding checkInterface(const Subject& /*subject*/, const std::string& interface) {
     if (!isThere(interface)) {
-        return bad(std::strerror(errno), "\"ip link\" shows the interfaces that there are");
+        return bad(errorText(errno), "\"ip link\" shows the interfaces that there are");
     }
     InterfaceRequest request(interface);
     const int error = request.ask(SIOCGIFFLAGS);
     if (error != 0) {
-        return doubtful(fmt::format("there; its state: {}", std::strerror(error)), "");
+        return doubtful(fmt::format("there; its state: {}", errorText(error)), "");
     }
     const auto flags = static_cast<unsigned>(request.get().ifr_flags);
     if ((flags & IFF_UP) == 0) {
@@ -84,7 +84,7 @@ Finding checkTimeStamping(const Subject& subject, const std::string& interface) 
                     "let {} be a script that calls ptp4l with -S: time stamps in software",
                     interface, subject.daemon);
     if (timeStamping.error != 0) {
-        return {software ? Verdict::warn : Verdict::fail, std::strerror(timeStamping.error), mend};
+        return {software ? Verdict::warn : Verdict::fail, errorText(timeStamping.error), mend};
     }
     const std::string missing =
         missingForHardware(timeStamping, setting(subject, "networkTransport").value_or(""));
@@ -105,7 +105,7 @@ Finding checkClockDevice(const Subject& subject, const std::string& interface) {
         const int error = errno;
         return doubtful(fmt::format("{}: {}; ptp4l does not open it here, a host that steers the "
                                     "clock does",
-                                    path, std::strerror(error)),
+                                    path, errorText(error)),
                         error == ENOENT ? "for such a host let udev make it, or pass it into the "
                                           "container"
                                         : "for such a host give its user the right to read and "

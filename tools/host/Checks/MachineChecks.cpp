@@ -33,7 +33,7 @@ std::map<std::string, std::string> fieldsOf(const std::string& path) {
 }
 
 std::string attributeOf(const std::string& file) {
-    std::array<char, 64> octets;
+    std::array<char, 64> octets{};
     const ssize_t size =
         ::getxattr(file.c_str(), "security.capability", octets.data(), octets.size());
     return size < 0 ? "" : std::string(octets.data(), static_cast<std::size_t>(size));

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <cstring>
 
 #include <fmt/format.h>
 #include <sys/stat.h>
@@ -10,6 +9,7 @@
 
 #include "Checks/Access.h"
 #include "Checks/SocketUse.h"
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -59,7 +59,7 @@ Finding checkConfigFile(const Subject& subject) {
         return bad(*path + ": is not a file", "choose another path: --set configFile=...");
     }
     if (!isAllowed(*path, W_OK | R_OK)) {
-        return bad(fmt::format("{}: {}", *path, std::strerror(errno)),
+        return bad(fmt::format("{}: {}", *path, errorText(errno)),
                    "give the host's user the right to write it");
     }
     return good(*path + ", will be replaced");
@@ -106,7 +106,7 @@ Finding checkUdsInUse(const Subject& subject) {
     case ENOTDIR:
         return checkLeftover(path);
     default:
-        return doubtful(fmt::format("{}: {}", path, std::strerror(error)), "");
+        return doubtful(fmt::format("{}: {}", path, errorText(error)), "");
     }
 }
 

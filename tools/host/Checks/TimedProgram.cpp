@@ -47,7 +47,7 @@ public:
     /// What has come so far.
     void drainTo(std::string& text) {
         constexpr std::size_t most = 65536;
-        std::array<char, 4096> buffer;
+        std::array<char, 4096> buffer{};
         for (;;) {
             const ssize_t count = ::read(reading_, buffer.data(), buffer.size());
             if (count > 0 && text.size() < most) {
@@ -78,6 +78,7 @@ private:
 /// @return 0, or errno.
 int spawn(const std::vector<std::string>& command, int output, pid_t& pid) {
     std::vector<char*> arguments;
+    arguments.reserve(command.size() + 1);
     for (const auto& word : command) {
         arguments.push_back(const_cast<char*>(word.c_str()));
     }

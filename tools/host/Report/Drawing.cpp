@@ -51,7 +51,7 @@ std::string inPage(std::string svg, const std::string& name, const std::string& 
     replaceAll(svg, "id='", "id='" + name + "-");
     replaceAll(svg, "href='#", "href='#" + name + "-");
     replaceAll(svg, "\"gnuplot_canvas\"", "\"" + name + "\"");
-    svg.insert(std::string_view("<svg").size(), fmt::format(" role=\"img\" class=\"{}\"", kind));
+    svg.insert(std::string_view("<svg").size(), fmt::format(R"( role="img" class="{}")", kind));
     svg.insert(svg.find('>') + 1, "<title>" + escaped(title) + "</title>");
     return svg;
 }

@@ -3,7 +3,6 @@
 #include <array>
 #include <cerrno>
 #include <cstdio>
-#include <cstring>
 #include <memory>
 #include <stdexcept>
 
@@ -11,6 +10,8 @@
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
+
+#include "Text.h"
 
 namespace vantelhost {
 
@@ -29,7 +30,7 @@ TemporaryFile temporaryFile(const std::string& content = {}) {
     TemporaryFile file(std::tmpfile());
     if (!file || std::fwrite(content.data(), 1, content.size(), file.get()) != content.size() ||
         std::fflush(file.get()) != 0) {
-        throw std::runtime_error(fmt::format("a temporary file: {}", std::strerror(errno)));
+        throw std::runtime_error(fmt::format("a temporary file: {}", errorText(errno)));
     }
     std::rewind(file.get());
     return file;
@@ -64,7 +65,7 @@ pid_t spawn(std::FILE* input, std::FILE* output, std::FILE* errors) {
         throw std::runtime_error(missing);
     }
     if (failure != 0) {
-        throw std::runtime_error(fmt::format("gnuplot: {}", std::strerror(failure)));
+        throw std::runtime_error(fmt::format("gnuplot: {}", errorText(failure)));
     }
     return pid;
 }

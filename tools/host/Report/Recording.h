@@ -15,20 +15,20 @@ namespace vantelhost {
 
 /// A time pair. Seconds are those since the host's start, here and below.
 struct Pair {
-    double seconds;
-    std::uint64_t ingress; ///< of the Sync: nanoseconds modulo 2^64, without the epoch offset
-    std::int64_t offset;   ///< local minus reference, nanoseconds
-    std::int64_t delay;    ///< from the ingress to the call in the host's clock, nanoseconds
+    double seconds = 0;
+    std::uint64_t ingress = 0; ///< of the Sync: nanoseconds modulo 2^64, without the epoch offset
+    std::int64_t offset = 0;   ///< local minus reference, nanoseconds
+    std::int64_t delay = 0;    ///< from the ingress to the call in the host's clock, nanoseconds
 };
 
 struct QualityChange {
-    double seconds;
+    double seconds = 0;
     std::string quality;
     std::string reason;
 };
 
 struct PortChange {
-    double seconds;
+    double seconds = 0;
     std::string port;
     std::string state; ///< empty: the port is not there any more
 };
@@ -41,7 +41,7 @@ struct ChronyCount {
 
 /// An error, a warning or a refused call; ptp4l's end; the cause of a run in vain, and its mend.
 struct Problem {
-    double seconds;
+    double seconds = 0;
     std::string kind;
     std::string text;
 };
@@ -94,8 +94,8 @@ struct Recording {
     std::size_t epochOffsets = 0; ///< how often one was written
     std::int64_t epochOffset = 0; ///< the last one, nanoseconds
     std::optional<ChronyCount> chrony;
-    Json configuration; ///< an object, or null
-    Json metadata;      ///< the last valid one: an object, or null
+    Json configuration = Json::value_t::null; ///< an object, or null
+    Json metadata = Json::value_t::null;      ///< the last valid one: an object, or null
 };
 
 } // namespace vantelhost

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
-#include <cstring>
 #include <deque>
 #include <stdexcept>
 #include <string_view>
@@ -13,6 +12,7 @@
 
 #include "Events.h"
 #include "Report/JsonText.h"
+#include "Text.h"
 #include "UsageError.h"
 
 namespace vantelhost {
@@ -87,7 +87,7 @@ Recording RecordingReader::read(std::istream& stream, const std::string& name) {
         ++recording.lines;
     }
     if (stream.bad()) {
-        throw UsageError(fmt::format("cannot read {}: {}", name, std::strerror(errno)));
+        throw UsageError(fmt::format("cannot read {}: {}", name, errorText(errno)));
     }
     if (!stream.eof()) {
         throw UsageError(
