@@ -1,13 +1,18 @@
 #!/usr/bin/env bash
-# Installs what is missing, builds one preset (default: release) and runs all its tests, or those that
-# options of ctest choose. The last line is the count of ctest, which counts skipped tests as passed: they
-# are listed above. The exit status is 77 when all were skipped.
-#   scripts/check.sh [PRESET [OPTION]...]
+# Installs what is missing, builds one preset (default: release), or one target of it, and runs all its
+# tests, or those that options of ctest choose. The last line is the count of ctest, which counts skipped
+# tests as passed: they are listed above. The exit status is 77 when all were skipped.
+#   scripts/check.sh [PRESET [--target NAME] [OPTION]...]
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
 preset=${1:-release}
+target=all
 options=("${@:2}")
+if [[ ${2-} == --target ]]; then
+  target=${3:?--target needs a name}
+  options=("${@:4}")
+fi
 case $preset in
   --help)
     sed -n '2,/^set /s/^# \{0,1\}//p' "$0"
@@ -59,7 +64,7 @@ list_skipped() {
 
 scripts/setup.sh "${groups[@]}"
 cmake --preset "$preset"
-cmake --build --preset "$preset" -j "$jobs"
+cmake --build --preset "$preset" -j "$jobs" --target "$target"
 
 status=0
 ctest --preset "$preset" -j "$test_jobs" "${options[@]}" | tee "$log" || status=$?
