@@ -18,7 +18,7 @@ Octets requestFor(std::uint16_t managementId) {
 
 } // namespace
 
-StubDaemon::StubDaemon(const std::string& path, std::uint16_t ports) : path_(path), socket_(path) {
+StubDaemon::StubDaemon(const std::string& path, std::uint16_t ports) : socket_(path) {
     for (const std::uint16_t managementId :
          {FakePtp4l::timeStatusNp, FakePtp4l::parentDataSet, FakePtp4l::defaultDataSet,
           FakePtp4l::portDataSet, FakePtp4l::portDataSetNp, FakePtp4l::portPropertiesNp}) {
@@ -28,7 +28,7 @@ StubDaemon::StubDaemon(const std::string& path, std::uint16_t ports) : path_(pat
 }
 
 StubDaemon::~StubDaemon() {
-    DatagramSocket().sendTo(path_, {});
+    shutdown(socket_.descriptor(), SHUT_RDWR);
     thread_.join();
 }
 
