@@ -27,7 +27,11 @@ case $preset in
   *) groups=(tests) ;;
 esac
 jobs=$(nproc)
-test_jobs=$((jobs * 4)) # most tests wait most of the time
+# Most tests wait most of the time; less so in an emulator, or with a sanitizer.
+case $preset in
+  armhf | asan | tsan) test_jobs=$((jobs * 4)) ;;
+  *) test_jobs=$((jobs * 8)) ;;
+esac
 log=build/$preset/ctest.log
 
 # Lists the tests that did not run, each with its reason: the text behind GoogleTest's

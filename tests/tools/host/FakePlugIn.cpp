@@ -21,6 +21,8 @@
 #include <vantel_bc/zekel.h>
 #include <vantel_bc/zekeltr.h>
 
+#include "FakePlugIn.h"
+
 #define EXPORT __attribute__((visibility("default")))
 
 namespace {
@@ -260,10 +262,6 @@ Session* sessionIn(void** slot) {
 
 extern "C" {
 
-EXPORT std::uint32_t zekeltr_getAPIVersion() {
-    return FAKE_API_VERSION;
-}
-
 EXPORT void zekeltr_getName(char* name) {
     std::memcpy(name, "Fake time referen", ZEKELTR_NAME_SIZE);
 }
@@ -308,12 +306,6 @@ EXPORT void zekeltr_start(void** slot, zeerr_Status* status) {
     session->play();
 }
 
-#ifndef FAKE_WITHOUT_STOP
-EXPORT void zekeltr_stop(void** slot) {
-    sessionIn(slot)->stop();
-}
-#endif
-
 EXPORT void zekeltr_finalize(void** slot) {
     if (*slot != nullptr) {
         sessionIn(slot)->record("finalise");
@@ -322,3 +314,7 @@ EXPORT void zekeltr_finalize(void** slot) {
 }
 
 } // extern "C"
+
+void stopFake(void** slot) {
+    sessionIn(slot)->stop();
+}
