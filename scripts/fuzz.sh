@@ -2,7 +2,8 @@
 # Fuzzes each target for a time (default: 60 seconds), as many at once as there are processors. Reports
 # executions and findings, and how much of the code under test the inputs reach.
 #   scripts/fuzz.sh [--minimise] [SECONDS [TARGET]...]
-# --minimise adds to fuzz/corpus what reaches more than the inputs there that have a name, and no more.
+# --minimise leaves in fuzz/corpus the inputs that have a name, and of the others, and of those found, what
+# reaches code that no other does. With 0 seconds it does only that.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 # Targets may work in a folder of their own.
@@ -16,7 +17,7 @@ if [[ ${1-} == --minimise ]]; then
 fi
 seconds=${1:-60}
 targets=("${@:2}")
-if ! [[ $seconds =~ ^[1-9][0-9]*$ ]]; then
+if ! [[ $seconds =~ ^(0|[1-9][0-9]*)$ ]] || [[ $seconds == 0 && $minimise == no ]]; then
   sed -n 's/^#   /usage: /p' "$0" >&2
   exit 2
 fi
@@ -69,11 +70,12 @@ report_coverage() {
 minimise_corpus() { # target
   local target=$1 corpus=$corpora/$1 merged=$work/merged/$1
   rm -rf "$merged"
-  mkdir -p "$merged"
+  mkdir -p "$merged" "$work/corpus/$target"
   # Those that have a name stay, whatever they reach.
   find "$corpus" -type f -regextype posix-extended ! -regex '.*/[0-9a-f]{40}' \
     -exec cp -t "$merged" {} +
-  build/fuzz/fuzz/"$target" -merge=1 "$merged" "$corpus" "$work/corpus/$target" \
+  # How often code is reached does not matter.
+  build/fuzz/fuzz/"$target" -merge=1 -use_counters=0 "$merged" "$corpus" "$work/corpus/$target" \
     >"$work/$target-merge.log" 2>&1
   rm -rf "$corpus"
   mv "$merged" "$corpus"
@@ -85,20 +87,22 @@ cmake --preset fuzz >/dev/null
 cmake --build --preset fuzz -j "$(nproc)" --target "${targets[@]}" -- --quiet
 
 failed=0
-for target in "${targets[@]}"; do
-  while [[ $(jobs -rp | wc -l) -ge $(nproc) ]]; do
-    wait -n
-  done
-  fuzz "$target" &
-done
-wait
-report
-if [[ $failed -eq 0 ]]; then
-  report_coverage
-  if [[ $minimise == yes ]]; then
-    for target in "${targets[@]}"; do
-      minimise_corpus "$target"
+if [[ $seconds -gt 0 ]]; then
+  for target in "${targets[@]}"; do
+    while [[ $(jobs -rp | wc -l) -ge $(nproc) ]]; do
+      wait -n
     done
+    fuzz "$target" &
+  done
+  wait
+  report
+  if [[ $failed -eq 0 ]]; then
+    report_coverage
   fi
+fi
+if [[ $failed -eq 0 && $minimise == yes ]]; then
+  for target in "${targets[@]}"; do
+    minimise_corpus "$target"
+  done
 fi
 exit "$failed"
