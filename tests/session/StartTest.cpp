@@ -111,19 +111,30 @@ protected:
         return pairs;
     }
 
-    /// Starts the session again, in a thread that never ends. The second worker is held in its
-    /// first poll: both use one socket, and would take each other's answers.
+    /// Starts the session again, in a thread that never ends. The second worker is held behind its
+    /// first poll, and the first one until then: both use one socket, and would take each other's
+    /// answers.
     /// @return whether there is a second worker.
     bool startAgain(std::thread::id first) {
-        auto held = std::make_shared<std::atomic<bool>>(false);
-        host.onCall([first, held](const RecordingHost::Call& call, zeerr_Status&) {
-            if (call.function == Function::getTime && call.thread != first) {
-                *held = true;
+        auto firstIsHeld = std::make_shared<std::atomic<bool>>(false);
+        auto secondIsHeld = std::make_shared<std::atomic<bool>>(false);
+        host.onCall([=](const RecordingHost::Call& call, zeerr_Status&) {
+            if (call.function != Function::getTime) {
+                return;
+            }
+            if (call.thread == first) {
+                *firstIsHeld = true;
+                waitUntil([&] { return secondIsHeld->load(); });
+            } else {
+                *secondIsHeld = true;
                 pause();
             }
         });
+        if (!waitUntil([&] { return firstIsHeld->load(); })) {
+            return false;
+        }
         std::thread([this] { session.start(); }).detach();
-        return waitUntil([&] { return held->load(); });
+        return waitUntil([&] { return secondIsHeld->load(); });
     }
 
     /// In a process of its own, which it ends.

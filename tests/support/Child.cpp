@@ -36,7 +36,7 @@ struct Pipe {
 
 /// Closes the descriptor at the end of the data.
 void append(Descriptor& descriptor, std::string& text) {
-    std::array<char, 65536> buffer;
+    std::array<char, 4096> buffer{};
     const ssize_t count = read(descriptor.get(), buffer.data(), buffer.size());
     if (count > 0) {
         text.append(buffer.data(), static_cast<std::size_t>(count));
@@ -61,14 +61,12 @@ Child::Child(const Words& command, const Words& environment) {
     Pipe input;
     Pipe output;
     Pipe errors;
-    start(command, environment, [&] {
-        dup2(input.reading.get(), STDIN_FILENO);
-        dup2(output.writing.get(), STDOUT_FILENO);
-        dup2(errors.writing.get(), STDERR_FILENO);
-    });
-    input_ = std::move(input.writing);
-    output_ = std::move(output.reading);
-    errors_ = std::move(errors.reading);
+    start(command, environment,
+          {std::move(input.writing), std::move(output.reading), std::move(errors.reading)}, [&] {
+              dup2(input.reading.get(), STDIN_FILENO);
+              dup2(output.writing.get(), STDOUT_FILENO);
+              dup2(errors.writing.get(), STDERR_FILENO);
+          });
 }
 
 Child::~Child() {
@@ -78,8 +76,9 @@ Child::~Child() {
     }
 }
 
-void Child::start(const Words& command, const Words& environment,
+void Child::start(const Words& command, const Words& environment, Streams streams,
                   const std::function<void()>& connect) {
+    streams_ = std::move(streams);
     Words words = environment;
     if (!words.empty()) {
         words.insert(words.begin(), "/usr/bin/env");
@@ -128,7 +127,8 @@ double Child::cpuSeconds() const {
 }
 
 void Child::write(const std::string& text) const {
-    require(::write(input_.get(), text.data(), text.size()) == static_cast<ssize_t>(text.size()),
+    require(::write(streams_.input.get(), text.data(), text.size()) ==
+                static_cast<ssize_t>(text.size()),
             "writing to a child");
 }
 
@@ -140,7 +140,7 @@ bool Child::waitForOutput(const std::string& text, int count) {
         if (found != std::string::npos) {
             start = found + text.size();
             --count;
-        } else if (!output_.isOpen() || !read(end)) {
+        } else if (!streams_.output.isOpen() || !read(end)) {
             return false;
         }
     }
@@ -149,7 +149,7 @@ bool Child::waitForOutput(const std::string& text, int count) {
 
 int Child::wait(std::chrono::seconds patience) {
     const auto end = Clock::now() + patience;
-    input_.close();
+    streams_.input.close();
     while (read(end)) {
     }
     pollfd process{process_.get(), POLLIN, 0};
@@ -167,15 +167,16 @@ int Child::wait(std::chrono::seconds patience) {
 
 /// @return false when both outputs are at their end, or nothing has come in time.
 bool Child::read(Clock::time_point end) {
-    pollfd streams[] = {{output_.get(), POLLIN, 0}, {errors_.get(), POLLIN, 0}};
-    if ((!output_.isOpen() && !errors_.isOpen()) || poll(streams, 2, millisecondsUntil(end)) <= 0) {
+    pollfd streams[] = {{streams_.output.get(), POLLIN, 0}, {streams_.errors.get(), POLLIN, 0}};
+    if ((!streams_.output.isOpen() && !streams_.errors.isOpen()) ||
+        poll(streams, 2, millisecondsUntil(end)) <= 0) {
         return false;
     }
     if (streams[0].revents != 0) {
-        append(output_, outputText_);
+        append(streams_.output, outputText_);
     }
     if (streams[1].revents != 0) {
-        append(errors_, errorsText_);
+        append(streams_.errors, errorsText_);
     }
     return true;
 }

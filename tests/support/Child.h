@@ -38,7 +38,7 @@ public:
     bool waitForOutput(const std::string& text, int count = 1);
 
     /// Reads no more of the standard output: the program's next write to it fails.
-    void closeOutput() { output_.close(); }
+    void closeOutput() { streams_.output.close(); }
 
     /// Ends the standard input, reads both outputs to their end, and waits for the program's.
     /// @return its exit status, 1000 plus the signal that ended it, or -1 when it has not ended.
@@ -52,22 +52,28 @@ public:
     const std::string& errors() const { return errorsText_; }
 
 protected:
+    /// This process's ends of the standard streams.
+    struct Streams {
+        Descriptor input;
+        Descriptor output;
+        Descriptor errors;
+    };
+
     /// Nothing is running yet.
     Child() = default;
 
     /// @param connect called in the new process: makes its ends of these its standard streams
-    void start(const Words& command, const Words& environment,
+    void start(const Words& command, const Words& environment, Streams streams,
                const std::function<void()>& connect);
 
-    Descriptor input_;
-    Descriptor output_;
-    Descriptor errors_;
+    int outputDescriptor() const { return streams_.output.get(); }
 
 private:
     using Clock = std::chrono::steady_clock;
 
     bool read(Clock::time_point end);
 
+    Streams streams_;
     pid_t pid_ = -1;
     Descriptor process_; ///< becomes readable with the program's end
     double cpuSeconds_ = 0;
