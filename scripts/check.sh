@@ -30,7 +30,7 @@ jobs=$(nproc)
 # Most tests wait most of the time; less so in an emulator, or with a sanitizer.
 case $preset in
   armhf | asan | tsan) test_jobs=$((jobs * 4)) ;;
-  *) test_jobs=$((jobs * 8)) ;;
+  *) test_jobs=$((jobs * 12)) ;;
 esac
 log=build/$preset/ctest.log
 
