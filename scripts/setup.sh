@@ -9,7 +9,7 @@
 set -euo pipefail
 
 # GCC optimises across files with make, and warns without it.
-build=(cmake ninja-build g++ make pkg-config libcjson-dev libboost-dev nlohmann-json3-dev
+build=(cmake ninja-build g++ make pkg-config libcjson-dev libsystemd-dev libboost-dev nlohmann-json3-dev
   libcli11-dev libfmt-dev systemtap-sdt-dev)
 daemon=(linuxptp iproute2 mount util-linux procps)
 tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
@@ -22,7 +22,7 @@ if [[ $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release) == bookworm ]]; then
   checks+=(clang-format-14 clang-tidy-14)
 fi
 armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
-  libcjson-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
+  libcjson-dev:armhf libsystemd-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
   libbenchmark-dev:armhf)
 bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap uidmap)

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cmath>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -98,10 +99,16 @@ Event qualityEvent(const double* quality, const std::string& reason) {
             {{"quality", kind}, {"values", values}, {"reason", reason}}};
 }
 
-Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset) {
-    return {"pair",
-            fmt::format("reference {} local {} offset {} ns", reference, local, offset),
-            {{"reference", reference}, {"local", local}, {"offset", offset}}};
+Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset, PairKind kind) {
+    Event event{"pair",
+                fmt::format("reference {} local {} offset {} ns", reference, local, offset),
+                {{"reference", reference}, {"local", local}, {"offset", offset}}};
+    if (kind != PairKind::measured) {
+        const char* const leftOut = kind == PairKind::of1970 ? "1970" : "no-delay";
+        event.text += fmt::format(", no measurement ({})", leftOut);
+        event.members["leftOut"] = leftOut;
+    }
+    return event;
 }
 
 Event metadataEvent(const Json& metadata) {
@@ -176,6 +183,22 @@ Event causeEvent(const std::string& cause) {
 
 Event mendEvent(const std::string& mend) {
     return {"mend", mend, Json{{"text", mend}}};
+}
+
+Event healthEvent(const std::string& state, const std::string& reason, const std::string& before,
+                  double spent) {
+    return {"health",
+            fmt::format("{}, {}; before: {} for {:.1f} s", state, reason, before, spent),
+            {{"state", state},
+             {"reason", reason},
+             {"before", before},
+             {"spent", std::round(spent * 1e3) / 1e3}}};
+}
+
+Event restartEvent(const std::string& cause, double delay, std::uint64_t restarts) {
+    return {"restart",
+            fmt::format("{}; the next session begins in {:.0f} s", cause, delay),
+            {{"cause", cause}, {"delay", delay}, {"restarts", restarts}}};
 }
 
 Event stoppingEvent(const std::string& cause) {

@@ -7,6 +7,7 @@
 #include <string>
 
 #include "Json.h"
+#include "PairFilter.h"
 #include "Signals.h"
 #include "Tally.h"
 
@@ -27,7 +28,8 @@ Event epochOffsetEvent(std::int64_t nanoseconds);
 Event qualityEvent(const double* quality, const std::string& reason);
 
 /// Times in nanoseconds modulo 2^64. The offset is local - reference.
-Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset);
+Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset,
+                PairKind kind = PairKind::measured);
 
 Event metadataEvent(const Json& metadata);
 Event invalidMetadataEvent(const std::string& text);
@@ -61,6 +63,19 @@ Event daemonEndedEvent(const ChildEnd& end, const std::deque<std::string>& words
 /// Why the run failed, and what to do about it.
 Event causeEvent(const std::string& cause);
 Event mendEvent(const std::string& mend);
+
+/// The health is another one.
+/// @param spent how long it was the one before, in seconds
+Event healthEvent(const std::string& state, const std::string& reason, const std::string& before,
+                  double spent);
+
+/// A session is over, and the next one follows.
+/// @param delay    after so many seconds
+/// @param restarts how many there have been, with this one
+Event restartEvent(const std::string& cause, double delay, std::uint64_t restarts);
+
+/// With which the event "stopping" tells that the run goes on.
+constexpr char restartCause[] = "restart";
 
 Event stoppingEvent(const std::string& cause);
 Event stoppedEvent();

@@ -55,6 +55,7 @@ void Journal::error(const Event& event) {
 void Journal::quality(const double* quality, const std::string& reason, bool expected) {
     const Event event = qualityEvent(quality, reason);
     const std::lock_guard lock(mutex_);
+    lastCall_ = Moment::Clock::now();
     if (expected) {
         print(expectedEvent(event));
         return;
@@ -69,8 +70,9 @@ void Journal::quality(const double* quality, const std::string& reason, bool exp
 
 void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     const std::int64_t offset = difference(local, reference);
-    const Event event = pairEvent(reference, local, offset);
     const std::lock_guard lock(mutex_);
+    lastCall_ = Moment::Clock::now();
+    const Event event = pairEvent(reference, local, offset, filter_.pair(local, offset));
     tally_.offsets.add(offset);
     print(event);
     if (!pairTaker_) {
@@ -101,13 +103,30 @@ void Journal::metadata(const std::string& text, bool expected) {
 
 void Journal::timeRequest() {
     const std::lock_guard lock(mutex_);
+    lastCall_ = Moment::Clock::now();
     ++tally_.timeRequests;
 }
 
 void Journal::refusal(const std::string& function) {
     const std::lock_guard lock(mutex_);
+    lastCall_ = Moment::Clock::now();
     ++tally_.refused;
     print(refusedEvent(function));
+}
+
+void Journal::turn() {
+    const std::lock_guard lock(mutex_);
+    tellHealth(Moment::now(begin_));
+}
+
+Standing Journal::health() const {
+    const std::lock_guard lock(mutex_);
+    return health_.standing(Moment::now(begin_).seconds);
+}
+
+double Journal::sinceLastCall() const {
+    const std::lock_guard lock(mutex_);
+    return std::chrono::duration<double>(Moment::Clock::now() - lastCall_).count();
 }
 
 void Journal::summary() {
@@ -126,7 +145,28 @@ Tally Journal::tally() const {
 }
 
 void Journal::print(const Event& event) {
-    pass(event, Moment::now(begin_));
+    const Moment moment = Moment::now(begin_);
+    pass(event, moment);
+    tellFilter(event);
+    health_.take(event, moment.seconds);
+    tellHealth(moment);
+}
+
+void Journal::tellFilter(const Event& event) {
+    if (event.name == "quality") {
+        filter_.quality(event.members["quality"].get_ref<const std::string&>(),
+                        event.members["reason"].get_ref<const std::string&>());
+    } else if (event.name == "epoch-offset") {
+        filter_.epochOffset(event.members["offset"]);
+    } else if (event.name == "initialised") {
+        filter_ = {};
+    }
+}
+
+void Journal::tellHealth(const Moment& moment) {
+    if (const auto event = health_.change(moment.seconds)) {
+        pass(*event, moment);
+    }
 }
 
 void Journal::pass(const Event& event, const Moment& moment) {

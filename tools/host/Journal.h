@@ -10,7 +10,9 @@
 #include <vector>
 
 #include "Events.h"
+#include "Health.h"
 #include "Moment.h"
+#include "PairFilter.h"
 #include "Tally.h"
 
 namespace vantelhost {
@@ -65,6 +67,15 @@ public:
     /// A call of this function was refused because the host is stopping.
     void refusal(const std::string& function);
 
+    /// To be called now and then: the health also changes when nothing happens.
+    void turn();
+
+    /// For how long which health has lasted.
+    Standing health() const;
+
+    /// How long ago the plug-in called, whatever it had to say, in seconds.
+    double sinceLastCall() const;
+
     void summary();
 
     /// Whether there was no error and no lost output.
@@ -81,6 +92,10 @@ private:
     };
 
     void print(const Event& event);
+
+    /// What the time pairs to come are judged by.
+    void tellFilter(const Event& event);
+    void tellHealth(const Moment& moment);
     void pass(const Event& event, const Moment& moment);
     void tell(const std::vector<Event>& losses, const Moment& moment);
 
@@ -92,6 +107,9 @@ private:
     std::vector<Output> outputs_;
     std::optional<std::vector<std::pair<Event, Moment>>> early_{std::in_place};
     PairTaker pairTaker_;
+    PairFilter filter_;
+    HealthWatch health_;
+    Moment::Clock::time_point lastCall_ = Moment::Clock::now();
     std::string lastQuality_;
     Tally tally_;
 };

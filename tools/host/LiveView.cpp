@@ -15,12 +15,6 @@ constexpr double shortestTime = 0.1;
 LiveView::LiveView(int terminal, Moment::Clock::time_point begin)
     : terminal_(terminal), begin_(begin), printer_(terminal, Format::readable) {}
 
-void LiveView::open() {
-    const std::lock_guard lock(mutex_);
-    screen_.emplace(terminal_);
-    draw(now());
-}
-
 void LiveView::close() {
     const std::lock_guard lock(mutex_);
     if (!screen_) {
@@ -36,6 +30,9 @@ void LiveView::close() {
 bool LiveView::take(const Event& event, const Moment& moment) {
     const std::lock_guard lock(mutex_);
     update(state_, event, moment.seconds);
+    if (event.name == "initialised" && !screen_) {
+        screen_.emplace(terminal_);
+    }
     if (!screen_) {
         return printer_(event, moment);
     }

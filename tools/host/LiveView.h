@@ -18,12 +18,10 @@ public:
     /// @param begin    of the run
     LiveView(int terminal, Moment::Clock::time_point begin);
 
-    void open();
-
     /// The last picture stays, as plain lines.
     void close();
 
-    /// Whether something could be shown.
+    /// Opens with the first session. Whether something could be shown.
     bool take(const Event& event, const Moment& moment);
 
     /// Shows how time goes by. Does nothing when it is not open.

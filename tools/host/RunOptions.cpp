@@ -47,6 +47,21 @@ void addBehaviour(CLI::App& command, RunOptions& options) {
             },
             "Stop after this time; else at SIGINT, SIGTERM, SIGHUP or SIGQUIT")
         ->type_name("N");
+    command.add_flag("--restart", options.restart,
+                     "Begin a new session, after 1 s to 60 s, when ptp4l has ended or is given up");
+    command
+        .add_option_function<std::string>(
+            "--give-up-after",
+            [&options](const std::string& text) {
+                const auto seconds = parseSeconds(text);
+                if (!seconds) {
+                    refuse("--give-up-after", "a number of seconds", text);
+                }
+                options.giveUpAfter = *seconds;
+            },
+            "With --restart: give a session up that is lost for so long; 0 is never")
+        ->type_name("N")
+        ->default_str("60");
     command.add_flag("--refuse-while-stopping", options.refuseWhileStopping,
                      "Refuse the plug-in's calls while stopping");
     command.add_flag("--force", options.force,

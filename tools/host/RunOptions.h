@@ -33,6 +33,8 @@ struct RunOptions : SettingsOptions {
     std::string fifo = builtEpochFifo;
     std::optional<std::int64_t> epochOffset;
     std::vector<TimedOffset> timedOffsets; ///< in the order of their times
+    bool restart = false;                  ///< after a session that failed begins the next one
+    double giveUpAfter = 60; ///< so many seconds lost are a session that failed; 0: never
     bool refuseWhileStopping = false;
     bool force = false; ///< also when somebody listens at "udsAddress"
 };

@@ -77,6 +77,25 @@ std::string shownDuration(double seconds) {
     return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
 }
 
+std::string headText(const ViewState& state, double now) {
+    std::string text =
+        fmt::format("{}, {}, up {}", state.plugIn,
+                    state.phase == "running" ? state.health : state.phase, shownDuration(now));
+    if (state.restarts > 0) {
+        text += fmt::format(", {} restart{}", state.restarts, state.restarts == 1 ? "" : "s");
+    }
+    return text;
+}
+
+/// Why not all is well; empty when it is.
+std::string healthText(const ViewState& state, double now) {
+    if (state.health == "locked" || state.healthReason.empty() || state.phase != "running") {
+        return {};
+    }
+    return fmt::format("{} for {}: {}", state.health, shownDuration(now - state.healthSince),
+                       state.healthReason);
+}
+
 std::string qualityText(const ViewState& state, double now) {
     if (state.quality.empty()) {
         return "none yet";
@@ -107,17 +126,12 @@ std::string offsetText(const ViewState& state, double now) {
 /// What the other rows do not tell by themselves; empty when there is nothing.
 std::string hintText(const ViewState& state, double now) {
     constexpr double patience = 5;
-    constexpr std::uint64_t few = 2; // of a poll or two, while the quality changes
     const bool isUsable = state.quality == "usable";
     if (isUsable && state.allOffsets.count == 0 && now > state.qualitySince + patience) {
         return "no time pairs though the quality is usable: no epoch FIFO? Or, in ptp4l's log, "
                "\"SYNC without timestamp\"?";
     }
-    if (state.quality == "unusable" && state.pairsSinceQuality > few) {
-        return "time pairs come though the quality is unusable: it stays so until the grandmaster "
-               "changes or the host is restarted (silent-recovery)";
-    }
-    return frozenOffsets(state.allOffsets);
+    return {};
 }
 
 std::string windowText(const ViewState& state, double now) {
@@ -186,8 +200,11 @@ std::string shownOffset(double nanoseconds) {
 }
 
 std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSize size) {
-    Lines before{fmt::format("{}, {}, up {}", state.plugIn, state.phase, shownDuration(now))};
+    Lines before{headText(state, now)};
     const std::size_t room = roomOf(size);
+    if (const std::string health = healthText(state, now); !health.empty()) {
+        add(before, "health", wrapped(printable(health), room));
+    }
     add(before, "quality", wrapped(printable(qualityText(state, now)), room));
     add(before, "grandmaster",
         {clockText(state.metadata, "gmClockId", "gmClockClass", "gmClockAccuracy")});

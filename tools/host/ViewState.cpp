@@ -22,7 +22,6 @@ void addProblem(ViewState& state, double seconds, const std::string& text) {
 void updateQuality(ViewState& state, const Json& members, double seconds) {
     const std::string quality = members["quality"];
     const std::string reason = members["reason"];
-    state.pairsSinceQuality = 0;
     // What is told then follows from it.
     if (!state.daemonEnd.empty() && quality == state.quality) {
         return;
@@ -39,11 +38,27 @@ void updateQuality(ViewState& state, const Json& members, double seconds) {
 }
 
 void updateOffset(ViewState& state, std::int64_t offset, double seconds) {
-    ++state.pairsSinceQuality;
     state.offset = offset;
     state.offsetSeconds = seconds;
     state.allOffsets.add(offset);
     state.offsets.add(seconds, offset);
+}
+
+/// A session begins anew: what the last one told of its daemon is over.
+void updateRestart(ViewState& state, const Event& event) {
+    state.phase = "restarting";
+    state.started = false;
+    state.restarts = event.members["restarts"];
+    state.quality.clear();
+    state.reason.clear();
+    state.daemonEnd.clear();
+    state.metadata = Json::object();
+}
+
+void updateHealth(ViewState& state, const Json& members, double seconds) {
+    state.health = members["state"];
+    state.healthReason = members["reason"];
+    state.healthSince = seconds;
 }
 
 void updateMetadata(ViewState& state, const Event& event, double seconds) {
@@ -71,6 +86,10 @@ void update(ViewState& state, const Event& event, double seconds) {
         updateQuality(state, members, seconds);
     } else if (event.name == "pair") {
         updateOffset(state, members["offset"], seconds);
+    } else if (event.name == "health") {
+        updateHealth(state, members, seconds);
+    } else if (event.name == "restart") {
+        updateRestart(state, event);
     } else if (event.name == "metadata") {
         updateMetadata(state, event, seconds);
     } else if (event.name == "chrony") {

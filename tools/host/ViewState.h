@@ -24,11 +24,14 @@ struct ViewState {
     std::string plugIn; ///< its name; empty until it is loaded
     std::string phase = "starting";
     bool started = false;
+    std::string health = "starting";
+    std::string healthReason; ///< empty as long as it is the first one
+    double healthSince = 0;
+    std::uint64_t restarts = 0;
     std::string quality; ///< empty until there is one
     std::string reason;
     double qualitySince = 0;
-    std::uint64_t pairsSinceQuality = 0; ///< since the plug-in last told a quality
-    std::string daemonEnd;               ///< how ptp4l ended unasked; empty while it runs
+    std::string daemonEnd; ///< how ptp4l ended unasked; empty while it runs
     Json metadata = Json::object();
     std::optional<std::int64_t> offset; ///< of the last pair, in nanoseconds
     double offsetSeconds = 0;           ///< when it came

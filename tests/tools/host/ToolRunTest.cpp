@@ -25,8 +25,8 @@ TEST_F(ToolTest, ACleanRunTellsEachStepAndEndsWithStatus0) {
     const auto result = play("");
     EXPECT_EQ(result.status, 0) << result.errors;
     EXPECT_EQ(result.errors, "");
-    EXPECT_THAT(namesOf(result.events()),
-                ElementsAre("loaded", "initialised", "started", "stopping", "stopped", "summary"));
+    EXPECT_THAT(namesOf(result.events()), ElementsAre("loaded", "initialised", "started",
+                                                      "stopping", "health", "stopped", "summary"));
     EXPECT_THAT(record(), ElementsAre(StartsWith("initialise {"), "blocked yes", "start", "stop",
                                       "finalise"));
 }

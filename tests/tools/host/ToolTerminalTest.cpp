@@ -76,12 +76,12 @@ TEST_F(ToolTerminalTest, PicturesReplaceEachOtherInPlace) {
 
 TEST_F(ToolTerminalTest, TimeGoesByWithoutEvents) {
     Terminal terminal(live(""));
-    EXPECT_TRUE(terminal.waitForOutput("running, up 0:00:01"));
+    EXPECT_TRUE(terminal.waitForOutput("starting, up 0:00:01"));
 }
 
 TEST_F(ToolTerminalTest, CtrlCRestoresTheScreenAndLeavesTheLastPicture) {
     Terminal terminal(live("quality pairs"));
-    ASSERT_TRUE(terminal.waitForOutput("running"));
+    ASSERT_TRUE(terminal.waitForOutput("lost, up"));
     terminal.write(interrupt);
     EXPECT_EQ(terminal.wait(), 0);
     expectRestored(terminal.output());
@@ -95,7 +95,7 @@ TEST_F(ToolTerminalTest, CtrlCRestoresTheScreenAndLeavesTheLastPicture) {
 TEST_F(ToolTerminalTest, EverySignalThatStopsRestoresTheScreen) {
     for (const int number : {SIGTERM, SIGHUP, SIGQUIT}) {
         Terminal terminal(live(""));
-        ASSERT_TRUE(terminal.waitForOutput("running"));
+        ASSERT_TRUE(terminal.waitForOutput("starting, up"));
         terminal.signal(number);
         EXPECT_EQ(terminal.wait(), 0);
         expectRestored(terminal.output());
@@ -113,7 +113,7 @@ TEST_F(ToolTerminalTest, AStartThatFailsRestoresTheScreenAndLeavesTheError) {
 
 TEST_F(ToolTerminalTest, ANewSizeIsKeptAtOnce) {
     Terminal terminal(live("quality metadata pairs"));
-    ASSERT_TRUE(terminal.waitForOutput("running"));
+    ASSERT_TRUE(terminal.waitForOutput("starting, up"));
     terminal.resize(5, 30);
     for (int tries = 0; tries < 20; ++tries) {
         terminal.forgetOutput();

@@ -1,0 +1,102 @@
+/// @file
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <deque>
+#include <functional>
+#include <optional>
+#include <string>
+
+#include "EpochFifo.h"
+#include "Failure.h"
+#include "Journal.h"
+#include "Json.h"
+#include "Moment.h"
+#include "PlugIn.h"
+#include "RestartDelay.h"
+#include "RunOptions.h"
+#include "ServiceManager.h"
+#include "Session.h"
+#include "Signals.h"
+
+namespace vantelhost {
+
+/// Keeps a session of the plug-in at work until a signal, the end of the time or, without
+/// --restart, the end of ptp4l ends the run; with it, one session after the other. Single use.
+class SessionKeeper {
+public:
+    struct Surroundings {
+        const PlugIn& plugIn;
+        const RunOptions& options;
+        Journal& journal;
+        Signals& signals;
+        std::optional<EpochFifo>& fifo; ///< there when this host writes epoch offsets
+        int passWordsOn;                ///< as LastWords has it
+        std::function<void()> onTurn;   ///< called several times a second, by the same thread
+    };
+
+    SessionKeeper(Surroundings surroundings, Json settings);
+
+    /// Makes ready what the plug-in needs before it gets the settings. Throws UsageError.
+    void prepare();
+
+    void run();
+
+    /// Of the last session.
+    const RunFacts& facts() const { return facts_; }
+
+    /// How many of the journal's errors a restart has put behind.
+    std::uint64_t healedErrors() const { return healedErrors_; }
+
+    /// The last lines of the last session's ptp4l, when it did not end unasked.
+    const std::deque<std::string>& lastWords() const { return lastWords_; }
+
+private:
+    using TimePoint = Moment::Clock::time_point;
+
+    /// How a session ends.
+    struct End {
+        std::string cause;
+        bool isRestart;
+    };
+
+    End session();
+    End startAndAttend();
+
+    /// Prepares the next session.
+    /// @return false when the run ends instead.
+    bool restart(const std::string& cause);
+
+    /// @return how the session ends; nothing when the time has come.
+    std::optional<End> attend(std::optional<TimePoint> until = std::nullopt);
+    TimePoint nextTurn(std::optional<TimePoint> until) const;
+
+    /// When --seconds are over; nothing without them, or before they begin.
+    std::optional<TimePoint> endTime() const;
+    void turn();
+
+    /// What the health asks for.
+    std::optional<End> reasonToEnd() const;
+
+    /// @return the name of a signal that ends the run.
+    std::optional<std::string> takeNews();
+    void noteFacts();
+    void writeDueOffsets();
+    void writeOffset(std::int64_t nanoseconds);
+
+    const Surroundings with_;
+    const Json settings_;
+    ServiceManager manager_;
+    RestartDelay delay_;
+    RunFacts facts_;
+    std::optional<Session> session_;
+    std::optional<TimePoint> begin_;          ///< of the first session; nothing before
+    std::optional<std::int64_t> epochOffset_; ///< the last one that was written, or is to be
+    std::size_t offsetsWritten_ = 0;          ///< of the timed ones
+    std::uint64_t restarts_ = 0;
+    std::uint64_t healedErrors_ = 0;
+    std::deque<std::string> lastWords_;
+};
+
+} // namespace vantelhost
