@@ -158,6 +158,12 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
             {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
 }
 
+Event statusSocketEvent(const std::string& path, const std::string& problem) {
+    return {"status-socket",
+            fmt::format("{}: {}; tried again", path, problem),
+            {{"path", path}, {"problem", problem}}};
+}
+
 Event folderEvent(const std::string& path) {
     return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
 }

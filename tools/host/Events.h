@@ -49,6 +49,9 @@ Event refusedEvent(const std::string& function);
 /// @param problem why it does not; empty when it does.
 Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem);
 
+/// Nobody can ask how the run stands.
+Event statusSocketEvent(const std::string& path, const std::string& problem);
+
 /// The host made a folder that was missing.
 Event folderEvent(const std::string& path);
 

@@ -49,7 +49,17 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
     if (!options_.chronySocket.empty()) {
         chrony_.emplace(options_.chronySocket);
         journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
-            return chrony_->take(reference, local);
+            auto news = chrony_->take(reference, local);
+            if (statusPage_) {
+                statusPage_->takeChrony(chrony_->sent(), chrony_->failed());
+            }
+            return news;
+        });
+    }
+    if (!options_.statusSocket.empty()) {
+        statusPage_.emplace();
+        statusSocket_.emplace(options_.statusSocket, [this] {
+            return toAscii(statusPage_->at(Moment::now(begin_).seconds)) + "\n";
         });
     }
 }
@@ -127,6 +137,8 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
     if (!journal_.isClean()) {
         return;
     }
+    // Who asks is answered from the beginning.
+    turn();
     keeper.run();
     facts_ = keeper.facts();
     healedErrors_ = keeper.healedErrors();
@@ -146,12 +158,23 @@ void Run::beginRecord() {
         journal_.addOutput("record " + options_.recordFile,
                            EventPrinter(record_->descriptor(), Format::jsonLines));
     }
+    if (statusPage_) {
+        journal_.addOutput("status", [this](const Event& event, const Moment& moment) {
+            statusPage_->take(event, moment);
+            return true;
+        });
+    }
     journal_.outputsAreComplete();
 }
 
 void Run::turn() {
     if (view_) {
         view_->refresh();
+    }
+    if (statusSocket_) {
+        if (const auto news = statusSocket_->attend()) {
+            journal_.note(*news);
+        }
     }
 }
 

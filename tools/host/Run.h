@@ -15,6 +15,8 @@
 #include "RunOptions.h"
 #include "Schema.h"
 #include "Signals.h"
+#include "Status/StatusPage.h"
+#include "Status/StatusSocket.h"
 
 namespace vantelhost {
 
@@ -52,6 +54,8 @@ private:
     std::optional<LiveView> view_;
     std::optional<RecordFile> record_;
     std::optional<ChronyClock> chrony_;
+    std::optional<StatusPage> statusPage_;
+    std::optional<StatusSocket> statusSocket_;
     Journal journal_;
     RunFacts facts_;
     std::uint64_t healedErrors_ = 0;

@@ -82,6 +82,10 @@ void addOutput(CLI::App& command, RunOptions& options) {
         .add_option("--chrony", options.chronySocket,
                     "Hand every time pair to chronyd's reference clock (refclock SOCK) here")
         ->type_name("SOCKET");
+    command
+        .add_option("--status-socket", options.statusSocket,
+                    "Answer \"vantel-host status\" here, who may write to it: mode 0660")
+        ->type_name("PATH");
 }
 
 void addFifo(CLI::App& command, RunOptions& options) {

@@ -28,6 +28,7 @@ struct RunOptions : SettingsOptions {
     bool plain = false;       ///< lines also on a terminal
     std::string recordFile;   ///< empty when nothing is recorded
     std::string chronySocket; ///< empty when chronyd gets nothing
+    std::string statusSocket; ///< empty when nobody may ask
     bool useFifo = false;
     bool createFifo = false;
     std::string fifo = builtEpochFifo;

@@ -72,15 +72,10 @@ Lines wrapped(std::string text, std::size_t columns) {
     return lines;
 }
 
-std::string shownDuration(double seconds) {
-    const auto whole = static_cast<std::int64_t>(std::max(seconds, 0.0));
-    return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
-}
-
 std::string headText(const ViewState& state, double now) {
     std::string text =
         fmt::format("{}, {}, up {}", state.plugIn,
-                    state.phase == "running" ? state.health : state.phase, shownDuration(now));
+                    state.phase == "running" ? state.health : state.phase, shownHours(now));
     if (state.restarts > 0) {
         text += fmt::format(", {} restart{}", state.restarts, state.restarts == 1 ? "" : "s");
     }
@@ -92,7 +87,7 @@ std::string healthText(const ViewState& state, double now) {
     if (state.health == "locked" || state.healthReason.empty() || state.phase != "running") {
         return {};
     }
-    return fmt::format("{} for {}: {}", state.health, shownDuration(now - state.healthSince),
+    return fmt::format("{} for {}: {}", state.health, shownHours(now - state.healthSince),
                        state.healthReason);
 }
 
@@ -100,17 +95,8 @@ std::string qualityText(const ViewState& state, double now) {
     if (state.quality.empty()) {
         return "none yet";
     }
-    return fmt::format("{} for {}: {}", state.quality, shownDuration(now - state.qualitySince),
+    return fmt::format("{} for {}: {}", state.quality, shownHours(now - state.qualitySince),
                        state.daemonEnd.empty() ? state.reason : state.daemonEnd);
-}
-
-std::string clockText(const Json& metadata, const char* identity, const char* clockClass,
-                      const char* accuracy) {
-    if (metadata.empty()) {
-        return "none yet";
-    }
-    return fmt::format("{}, class {}, {}", shownMember(metadata, identity),
-                       shownMember(metadata, clockClass), shownMember(metadata, accuracy));
 }
 
 std::string offsetText(const ViewState& state, double now) {
@@ -120,7 +106,7 @@ std::string offsetText(const ViewState& state, double now) {
     }
     const std::string offset = shownOffset(static_cast<double>(*state.offset));
     const double age = now - state.offsetSeconds;
-    return age < fresh ? offset : fmt::format("{}, {} ago", offset, shownDuration(age));
+    return age < fresh ? offset : fmt::format("{}, {} ago", offset, shownHours(age));
 }
 
 /// What the other rows do not tell by themselves; empty when there is nothing.
@@ -172,7 +158,7 @@ Lines problemTexts(const ViewState& state, double now, std::size_t room) {
     for (auto each = state.problems.rbegin(); each != state.problems.rend(); ++each) {
         const std::string times = each->times > 1 ? fmt::format("{} times, ", each->times) : "";
         texts.push_back(
-            withoutMiddle(fmt::format("{}{} ago  {}", times, shownDuration(now - each->seconds),
+            withoutMiddle(fmt::format("{}{} ago  {}", times, shownHours(now - each->seconds),
                                       printable(each->text)),
                           room));
     }
@@ -180,6 +166,20 @@ Lines problemTexts(const ViewState& state, double now, std::size_t room) {
 }
 
 } // namespace
+
+std::string shownHours(double seconds) {
+    const auto whole = static_cast<std::int64_t>(std::max(seconds, 0.0));
+    return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
+}
+
+std::string shownClock(const Json& metadata, const char* identity, const char* clockClass,
+                       const char* accuracy) {
+    if (metadata.empty()) {
+        return "none yet";
+    }
+    return fmt::format("{}, class {}, {}", shownMember(metadata, identity),
+                       shownMember(metadata, clockClass), shownMember(metadata, accuracy));
+}
 
 std::string shownOffset(double nanoseconds) {
     struct Unit {
@@ -207,9 +207,9 @@ std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSiz
     }
     add(before, "quality", wrapped(printable(qualityText(state, now)), room));
     add(before, "grandmaster",
-        {clockText(state.metadata, "gmClockId", "gmClockClass", "gmClockAccuracy")});
+        {shownClock(state.metadata, "gmClockId", "gmClockClass", "gmClockAccuracy")});
     add(before, "this clock",
-        {clockText(state.metadata, "localClockId", "clockClass", "clockAccuracy")});
+        {shownClock(state.metadata, "localClockId", "clockClass", "clockAccuracy")});
     add(before, "offset", {offsetText(state, now)});
     add(before, fmt::format("last {:.0f} s", state.offsets.length()), {windowText(state, now)});
     add(before, "pairs", {fmt::format("{}", state.allOffsets.count)});

@@ -19,6 +19,13 @@ struct ScreenSize {
 /// height asks for, then of all from the end.
 std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSize size);
 
+/// As hours:minutes:seconds.
+std::string shownHours(double seconds);
+
+/// A clock of the metadata, whose members are named.
+std::string shownClock(const Json& metadata, const char* identity, const char* clockClass,
+                       const char* accuracy);
+
 /// Nanoseconds as people read them, with a unit that leaves at most four digits before the point.
 std::string shownOffset(double nanoseconds);
 

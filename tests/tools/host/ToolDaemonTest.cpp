@@ -94,3 +94,26 @@ TEST_F(ToolDaemonTest, ASecondInstanceIsRefusedAndTheFirstGoesOn) {
     first.signal(SIGTERM);
     EXPECT_EQ(first.wait(), 0);
 }
+
+TEST_F(ToolDaemonTest, ADaemonThatIsKilledIsReplacedAndTheClockLocksAgain) {
+    const std::string socket = folder.path("status");
+    Child host(run({"--json", "--restart", "--status-socket", socket}));
+    ASSERT_TRUE(host.waitForOutput("\"state\":\"locked\""));
+    Child locked({HOST_TOOL, "status", "--socket", socket});
+    EXPECT_EQ(locked.wait(), 0);
+    EXPECT_THAT(locked.output(), HasSubstr("Health          : locked for 0:00:"));
+
+    Child killer({"/bin/sh", "-c", "exec pkill -9 -P $0", std::to_string(host.pid())});
+    ASSERT_EQ(killer.wait(), 0);
+    ASSERT_TRUE(host.waitForOutput("\"state\":\"locked\"", 2));
+    Child again({HOST_TOOL, "status", "--socket", socket, "--json"});
+    EXPECT_EQ(again.wait(), 0);
+    EXPECT_EQ(Json::parse(again.output())["restarts"], 1);
+    host.signal(SIGTERM);
+    EXPECT_EQ(host.wait(), 0);
+    std::vector<std::string> states;
+    for (const auto& event : recorded().events("health")) {
+        states.push_back(event["state"]);
+    }
+    EXPECT_THAT(states, testing::IsSupersetOf({"locked", "dead", "starting", "stopping"}));
+}

@@ -1,0 +1,86 @@
+#include "Status/StatusText.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+#include <fmt/format.h>
+
+#include "Events.h"
+#include "Text.h"
+#include "ViewLines.h"
+
+namespace vantelhost {
+
+namespace {
+
+std::string row(const std::string& name, const std::string& text) {
+    return fmt::format("{:<16}: {}\n", name, onOneLine(text));
+}
+
+std::string lastText(const Json& last) {
+    return last.is_null()
+               ? "none"
+               : fmt::format("{}, {:.1f} s ago", shownOffset(last["offset"].get<double>()),
+                             last["age"].get<double>());
+}
+
+/// Of |offset|, as whoever asks wants to know how far off it was.
+std::string windowText(const Json& window) {
+    if (window.is_null()) {
+        return "none";
+    }
+    const double largest =
+        std::max(std::abs(window["min"].get<double>()), std::abs(window["max"].get<double>()));
+    return fmt::format("rms {}, max {} in {} pairs", shownOffset(window["rms"].get<double>()),
+                       shownOffset(largest), window["pairs"].get<std::uint64_t>());
+}
+
+std::string qualityText(const Json& status) {
+    const std::string quality = status["quality"];
+    return quality.empty()
+               ? "none yet"
+               : fmt::format("{} ({})", quality, status["qualityReason"].get<std::string>());
+}
+
+std::string healthText(const Json& status) {
+    const std::string reason = status["reason"];
+    return fmt::format("{} for {}{}", status["health"].get<std::string>(),
+                       shownHours(status["since"].get<double>()),
+                       reason.empty() ? "" : fmt::format(" ({})", reason));
+}
+
+std::string portRows(const Json& ports) {
+    std::string rows;
+    for (const auto& [name, port] : ports.items()) {
+        rows += row(name, fmt::format("{} on {}", shownMember(port, "portState"),
+                                      shownMember(port, "interface")));
+    }
+    return rows.empty() ? row("Ports", "none") : rows;
+}
+
+std::string chronyText(const Json& chrony) {
+    return chrony.is_null() ? "gets no pairs"
+                            : chronyEvent(chrony["sent"], chrony["failed"], chrony["problem"]).text;
+}
+
+} // namespace
+
+std::string statusText(const Json& status) {
+    const Json& clocks = status["clocks"];
+    return row("Health", healthText(status)) + row("Quality", qualityText(status)) +
+           row("Grandmaster", shownClock(clocks, "gmClockId", "gmClockClass", "gmClockAccuracy")) +
+           row("This clock", shownClock(clocks, "localClockId", "clockClass", "clockAccuracy")) +
+           row("Last offset", lastText(status["last"])) +
+           row("Last minute", windowText(status["minute"])) +
+           row("Last hour", windowText(status["hour"])) +
+           row("Pairs",
+               fmt::format("{}, {} of them no measurement", status["pairs"].get<std::uint64_t>(),
+                           status["leftOut"].get<std::uint64_t>())) +
+           portRows(status["ports"]) + row("chronyd", chronyText(status["chrony"])) +
+           row("Running",
+               fmt::format("{}, {} restarts, {}", shownHours(status["uptime"].get<double>()),
+                           status["restarts"].get<std::uint64_t>(),
+                           status["plugIn"].get<std::string>()));
+}
+
+} // namespace vantelhost
