@@ -158,6 +158,14 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
             {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
 }
 
+Event lostEvent(const std::string& output, std::uint64_t events, double seconds,
+                const std::string& problem) {
+    return {"lost",
+            fmt::format("{}: {} events in {:.3f} s: {}; it is written again", output, events,
+                        seconds, problem),
+            {{"output", output}, {"events", events}, {"seconds", seconds}, {"problem", problem}}};
+}
+
 Event folderEvent(const std::string& path) {
     return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
 }
