@@ -193,6 +193,7 @@ void RecordingBuilder::takeProblem(const std::string& kind, const Json& line, do
         ++recording_.refused;
     } else if (kind == "restart") {
         ++recording_.restarts;
+        recording_.stopCause.clear();
         beginSession();
     } else if (kind == "cause") {
         ++recording_.errors;
