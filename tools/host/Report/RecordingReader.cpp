@@ -36,10 +36,15 @@ Moment momentOf(const Json& line) {
 
 /// Valid as long as the line is.
 PairLine pairOf(const Json& line) {
-    const auto leftOut = line.find("leftOut");
-    return {line.at("t").get<double>(), line.at("time").get<std::uint64_t>(),
-            line.at("local").get<std::uint64_t>(), line.at("offset").get<std::int64_t>(),
-            leftOut == line.end() ? "" : leftOut->get_ref<const std::string&>()};
+    PairLine pair{line.at("t").get<double>(),
+                  line.at("time").get<std::uint64_t>(),
+                  line.at("local").get<std::uint64_t>(),
+                  line.at("offset").get<std::int64_t>(),
+                  {}};
+    if (const auto leftOut = line.find("leftOut"); leftOut != line.end()) {
+        pair.leftOut = leftOut->get_ref<const std::string&>();
+    }
+    return pair;
 }
 
 std::string clockText(double set) {

@@ -18,13 +18,15 @@ namespace {
 constexpr std::size_t longestTable = 200;
 constexpr std::size_t mostRows = 64; ///< of a time line
 
-/// Seconds of a day or more say little.
-std::string shownAt(const Recording& recording, double seconds) {
-    constexpr double longest = 86400;
-    if (recording.runs <= 1 && recording.duration <= longest) {
-        return fmt::format("{:.3f} s", seconds);
-    }
+std::string momentAt(const Recording& recording, double seconds) {
     return shownMoment(recording.begin + static_cast<std::uint64_t>(seconds * 1e9));
+}
+
+/// Many seconds say little.
+std::string shownAt(const Recording& recording, double seconds) {
+    constexpr double day = 86400;
+    return recording.duration <= day ? fmt::format("{:.3f} s", seconds)
+                                     : momentAt(recording, seconds);
 }
 
 /// The table with the first of its rows, and how many there are.
@@ -127,7 +129,7 @@ std::string gapSection(const Recording& recording) {
     }
     std::vector<Row> rows;
     for (const auto& gap : recording.gaps.items()) {
-        rows.push_back({shownAt(recording, gap.seconds),
+        rows.push_back({momentAt(recording, gap.seconds),
                         gap.length > 0 ? shownDuration(gap.length) : "-", gap.text});
     }
     return section("Gaps", cappedTable({"at", "for", "what"}, rows, recording.gaps.count()));

@@ -423,12 +423,12 @@ TEST(RecordingReader, LostEventsAreAGapBeforeTheyAreTold) {
 }
 
 TEST(RecordingReader, ARestartedSessionBeginsWithoutADelayAndWithoutAnEpochOffset) {
-    const auto recording = read(
-        line("loaded", 1, named) + line("epoch-offset", 1, R"("offset":7)") + pairAt(1000, 2, 5) +
-        line("stopping", 3, R"("cause":"restart")") +
-        line("restart", 3, R"("cause":"ptp4l has ended","delay":1,"restarts":1)") +
-        line("initialised", 4, R"("configuration":{"a":1})") + line("started", 4) +
-        pairAt(1000, 5, 0) + pairAt(1000, 6, 4));
+    const auto recording =
+        read(line("loaded", 1, named) + line("epoch-offset", 1, R"("offset":7)") +
+             pairAt(1000, 2, 5) + line("stopping", 3, R"("cause":"restart")") +
+             line("restart", 3, R"("cause":"ptp4l has ended","delay":1,"restarts":1)") +
+             line("initialised", 4, R"("configuration":{"a":1})") + line("started", 4) +
+             pairAt(1000, 5, 0) + pairAt(1000, 6, 4));
     EXPECT_EQ(recording.runs, 1U);
     EXPECT_EQ(recording.restarts, 1U);
     EXPECT_EQ(recording.stopCause, "");
