@@ -6,7 +6,6 @@
 #include <stdexcept>
 #include <string>
 #include <system_error>
-#include <utility>
 #include <vector>
 
 #include <CLI/CLI.hpp>
@@ -29,7 +28,8 @@ struct ReportOptions {
     std::string page;
 };
 
-Recording readRecords(std::vector<RecordSource> sources) {
+/// Each file is closed when it has been read.
+Recording readRecords(std::vector<RecordSource>& sources) {
     RecordingReader reader;
     for (auto& [path, stream] : sources) {
         reader.read(*stream, path);
@@ -76,7 +76,7 @@ int makeReport(const ReportOptions& options) {
     if (options.page != standardOutput) {
         refuseToReplace(sources, options.page);
     }
-    const auto recording = readRecords(std::move(sources));
+    const auto recording = readRecords(sources);
     writePage(options.page, reportPage(recording, nameOf(options.recordings)));
     return exitClean;
 }

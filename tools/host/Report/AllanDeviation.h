@@ -42,7 +42,7 @@ private:
     };
 
     struct Octave {
-        std::int64_t steps;
+        std::int64_t steps = 0;
         double squares = 0; ///< of second differences, in nanoseconds
         std::uint64_t terms = 0;
 

@@ -10,8 +10,8 @@ namespace vantelhost {
 
 /// An offset at its place on an even grid of time.
 struct PhaseSample {
-    std::int64_t slot;
-    double phase;        ///< nanoseconds
+    std::int64_t slot = 0;
+    double phase = 0;    ///< nanoseconds
     bool begins = false; ///< it is not to be compared with those before
 };
 

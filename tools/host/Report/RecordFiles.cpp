@@ -5,10 +5,10 @@
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <map>
 #include <optional>
 #include <system_error>
-#include <tuple>
 #include <utility>
 
 #include <fmt/format.h>
@@ -149,7 +149,8 @@ void refuseTwice(const std::vector<File>& files) {
     }
 }
 
-std::vector<File> inOrder(Families families) {
+/// Takes the files out of the families.
+std::vector<File> inOrder(Families& families) {
     std::vector<Family> all;
     for (auto& [base, family] : families) {
         std::stable_sort(family.begin(), family.end(),
@@ -179,9 +180,10 @@ std::vector<RecordSource> openRecords(const std::vector<std::string>& paths) {
             add(families, path);
         }
     }
-    auto files = inOrder(std::move(families));
+    auto files = inOrder(families);
     refuseTwice(files);
     std::vector<RecordSource> sources;
+    sources.reserve(files.size());
     for (auto& file : files) {
         sources.push_back(std::move(file.source));
     }
