@@ -10,4 +10,5 @@ void addInitializeCost(Program& program);
 void addPollCost(Program& program);
 void addPollInstructions(Program& program);
 void addPollLine(Program& program);
+void addReportCost(Program& program);
 void addSessionTimes(Program& program);

@@ -13,5 +13,6 @@ int main(int argc, char** argv) {
     addSessionTimes(program);
     addHostFootprint(program);
     addDelay(program);
+    addReportCost(program);
     return program.run(argc, argv);
 }

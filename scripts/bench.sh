@@ -13,16 +13,16 @@ usage() {
 
 # How long each measurement is. Many short rounds: the speed of a shared processor changes slowly.
 ports=1,2,8,32,64 real_ports=(1 2 8 32)
-rounds=101 answers=1000 sessions=25 seconds=60
+rounds=101 answers=1000 sessions=25 seconds=60 days=30
 log_syncs=([1]=0 [8]=-3 [16]=-4) # of Syncs a second
 build=
 json=
 while [[ $# -gt 0 ]]; do
   case $1 in
-    --quick) rounds=25 answers=500 sessions=9 seconds=10 ;;
+    --quick) rounds=25 answers=500 sessions=9 seconds=10 days=3 ;;
     --smoke)
       ports=1,2 real_ports=(1)
-      rounds=1 answers=60 sessions=1 seconds=3 log_syncs=([8]=-3)
+      rounds=1 answers=60 sessions=1 seconds=3 days=1 log_syncs=([8]=-3)
       ;;
     --json) json=$(realpath -m -- "$2") && shift ;;
     --build) build=$(realpath "$2") && shift ;;
@@ -104,6 +104,11 @@ measure_all() {
     measure_size armhf "$armhf_library" arm-linux-gnueabihf-strip 163840
   else
     skipped+=("size on armhf: nothing was built for it; scripts/setup.sh armhf installs what that needs")
+  fi
+  if type -P gnuplot >/dev/null; then
+    measure "$bench/measure" report_cost --days "$days"
+  else
+    skipped+=("report: there is no gnuplot")
   fi
   measure "$bench/measure" delay --daemon simptp4l --rates "$(IFS=, && echo "${!log_syncs[*]}")" --seconds "$seconds"
   for rate in "${!log_syncs[@]}"; do

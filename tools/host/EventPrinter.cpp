@@ -1,8 +1,6 @@
 #include "EventPrinter.h"
 
 #include <cmath>
-#include <string>
-
 #include <fmt/format.h>
 
 #include "Text.h"
@@ -18,6 +16,8 @@ std::string readableLine(const Event& event, const Moment& moment) {
     return onOneLine(text);
 }
 
+} // namespace
+
 std::string jsonLine(const Event& event, const Moment& moment) {
     Json object{{"event", event.name},
                 {"t", std::round(moment.seconds * 1e6) / 1e6},
@@ -25,8 +25,6 @@ std::string jsonLine(const Event& event, const Moment& moment) {
     object.update(event.members);
     return toAscii(object);
 }
-
-} // namespace
 
 EventPrinter::EventPrinter(int descriptor, Format format)
     : descriptor_(descriptor), format_(format) {}

@@ -1,10 +1,15 @@
 /// @file
 #pragma once
 
+#include <string>
+
 #include "Events.h"
 #include "Moment.h"
 
 namespace vantelhost {
+
+/// The event as a line of JSON, without its end.
+std::string jsonLine(const Event& event, const Moment& moment);
 
 enum class Format { readable, jsonLines };
 

@@ -164,6 +164,14 @@ Event statusSocketEvent(const std::string& path, const std::string& problem) {
             {{"path", path}, {"problem", problem}}};
 }
 
+Event lostEvent(const std::string& output, std::uint64_t events, double seconds,
+                const std::string& problem) {
+    return {"lost",
+            fmt::format("{}: {} events in {:.3f} s: {}; it is written again", output, events,
+                        seconds, problem),
+            {{"output", output}, {"events", events}, {"seconds", seconds}, {"problem", problem}}};
+}
+
 Event folderEvent(const std::string& path) {
     return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
 }

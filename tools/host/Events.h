@@ -51,6 +51,13 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
 
 /// Nobody can ask how the run stands.
 Event statusSocketEvent(const std::string& path, const std::string& problem);
+/// The record can be written again.
+/// @param output  the record
+/// @param events  that are not in it
+/// @param seconds for how long none could be written
+/// @param problem why
+Event lostEvent(const std::string& output, std::uint64_t events, double seconds,
+                const std::string& problem);
 
 /// The host made a folder that was missing.
 Event folderEvent(const std::string& path);

@@ -15,20 +15,34 @@ std::int64_t difference(std::uint64_t local, std::uint64_t reference) {
     return static_cast<std::int64_t>(local - reference);
 }
 
+/// An output that is lost with the first event that it does not take.
+EventTaker untilLost(EventSink output, std::function<void(const std::string&)> onLost) {
+    return [output = std::move(output), onLost = std::move(onLost), lost = false](
+               const Event& event, const Moment& moment) mutable -> std::optional<Event> {
+        if (lost || output(event, moment)) {
+            return std::nullopt;
+        }
+        const std::string reason = errorText(errno);
+        lost = true;
+        onLost(reason);
+        return failureEvent("output", reason);
+    };
+}
+
 } // namespace
 
 Journal::Journal(EventSink output, std::function<void(const std::string&)> onLostOutput,
                  Moment::Clock::time_point begin)
     : begin_(begin) {
-    outputs_.push_back({"output", std::move(output), std::move(onLostOutput), false});
+    outputs_.push_back(untilLost(std::move(output), std::move(onLostOutput)));
 }
 
-void Journal::addOutput(const std::string& name, EventSink output) {
-    outputs_.push_back({name, std::move(output), [](const std::string&) {}, false});
+void Journal::addOutput(EventTaker output) {
+    outputs_.push_back(std::move(output));
     const auto events = early_.value();
     for (const auto& [event, moment] : events) {
-        if (const auto loss = give(outputs_.back(), event, moment)) {
-            tell({*loss}, moment);
+        if (const auto news = outputs_.back()(event, moment)) {
+            tell({*news}, moment);
         }
     }
 }
@@ -173,30 +187,20 @@ void Journal::pass(const Event& event, const Moment& moment) {
     if (early_) {
         early_->emplace_back(event, moment);
     }
-    std::vector<Event> losses;
+    std::vector<Event> news;
     for (auto& output : outputs_) {
-        if (auto loss = give(output, event, moment)) {
-            losses.push_back(std::move(*loss));
+        if (auto told = output(event, moment)) {
+            news.push_back(std::move(*told));
         }
     }
-    tell(losses, moment);
+    tell(news, moment);
 }
 
-void Journal::tell(const std::vector<Event>& losses, const Moment& moment) {
-    for (const auto& loss : losses) {
-        ++tally_.errors;
-        pass(loss, moment);
+void Journal::tell(const std::vector<Event>& news, const Moment& moment) {
+    for (const auto& event : news) {
+        tally_.errors += event.name == "error" ? 1U : 0U;
+        pass(event, moment);
     }
-}
-
-std::optional<Event> Journal::give(Output& output, const Event& event, const Moment& moment) {
-    if (output.lost || output.take(event, moment)) {
-        return std::nullopt;
-    }
-    const std::string reason = errorText(errno);
-    output.lost = true;
-    output.onLost(reason);
-    return failureEvent(output.name, reason);
 }
 
 } // namespace vantelhost

@@ -25,10 +25,15 @@ using EventSink = std::function<bool(const Event&, const Moment&)>;
 /// @return an event, if there is something to tell.
 using PairTaker = std::function<std::optional<Event>(std::uint64_t reference, std::uint64_t local)>;
 
+/// Takes one event, and sees itself to what it cannot take.
+/// @return an event, if there is something to tell.
+using EventTaker = std::function<std::optional<Event>(const Event&, const Moment&)>;
+
 /// Takes everything that happens in a run, passes it on and sums it up. Thread-safe: events come
 /// out in the order in which they are counted.
 ///
-/// An output that loses an event gets no more, and the others are told: an error.
+/// When the output loses an event it gets no more, and the others are told: an error. So is told
+/// what one of these has to tell.
 class Journal {
 public:
     /// @param onLostOutput called once when this output loses an event, with the reason.
@@ -38,8 +43,7 @@ public:
 
     /// One more output, which also gets what has come so far. To be called before other threads use
     /// the journal, as the next two.
-    /// @param name for people
-    void addOutput(const std::string& name, EventSink output);
+    void addOutput(EventTaker output);
 
     /// There will be no more outputs: what has come so far need not be kept.
     void outputsAreComplete();
@@ -84,27 +88,17 @@ public:
     Tally tally() const;
 
 private:
-    struct Output {
-        std::string name;
-        EventSink take;
-        std::function<void(const std::string&)> onLost;
-        bool lost;
-    };
-
     void print(const Event& event);
 
     /// What the time pairs to come are judged by.
     void tellFilter(const Event& event);
     void tellHealth(const Moment& moment);
     void pass(const Event& event, const Moment& moment);
-    void tell(const std::vector<Event>& losses, const Moment& moment);
-
-    /// @return the loss, if the output has now lost this event.
-    static std::optional<Event> give(Output& output, const Event& event, const Moment& moment);
+    void tell(const std::vector<Event>& news, const Moment& moment);
 
     mutable std::mutex mutex_;
     const Moment::Clock::time_point begin_;
-    std::vector<Output> outputs_;
+    std::vector<EventTaker> outputs_;
     std::optional<std::vector<std::pair<Event, Moment>>> early_{std::in_place};
     PairTaker pairTaker_;
     PairFilter filter_;

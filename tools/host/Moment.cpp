@@ -1,5 +1,6 @@
 #include "Moment.h"
 
+#include <cmath>
 #include <ctime>
 
 namespace vantelhost {
@@ -15,6 +16,11 @@ std::uint64_t realtimeNanoseconds() {
 
 Moment Moment::now(Clock::time_point begin) {
     return {std::chrono::duration<double>(Clock::now() - begin).count(), realtimeNanoseconds()};
+}
+
+std::uint64_t beginOf(const Moment& moment) {
+    const auto microseconds = static_cast<std::uint64_t>(std::llround(moment.seconds * 1e6));
+    return moment.realtime - microseconds * 1000U;
 }
 
 } // namespace vantelhost

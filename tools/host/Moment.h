@@ -19,4 +19,8 @@ struct Moment {
     std::uint64_t realtime; ///< nanoseconds since 1970
 };
 
+/// The beginning in the clock that the moment has: nanoseconds since 1970. Seconds count to the
+/// microsecond, as records have them.
+std::uint64_t beginOf(const Moment& moment);
+
 } // namespace vantelhost

@@ -1,6 +1,7 @@
 #include "RecordFile.h"
 
 #include <cerrno>
+#include <utility>
 
 #include <fcntl.h>
 #include <fmt/format.h>
@@ -15,41 +16,85 @@ namespace vantelhost {
 
 namespace {
 
-bool isRegular(int descriptor) {
-    struct stat state {};
-    return ::fstat(descriptor, &state) == 0 && S_ISREG(state.st_mode);
-}
+constexpr int none = -1;
 
-bool isSomebodyElses(int descriptor) {
-    return isRegular(descriptor) && ::flock(descriptor, LOCK_EX | LOCK_NB) != 0 &&
-           errno == EWOULDBLOCK;
+struct stat stateOf(int descriptor) {
+    struct stat state {};
+    ::fstat(descriptor, &state);
+    return state;
 }
 
 [[noreturn]] void refuse(const std::string& path, const std::string& problem) {
     throw UsageError(fmt::format("cannot write {}: {}", path, problem));
 }
 
-} // namespace
-
-RecordFile::RecordFile(const std::string& path)
-    : path_(path), descriptor_(::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644)) {
-    if (descriptor_ < 0) {
+int opened(const std::string& path) {
+    const int descriptor = ::open(path.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
+    if (descriptor < 0) {
         refuse(path, errorText(errno));
     }
-    if (isSomebodyElses(descriptor_)) {
-        ::close(descriptor_);
-        refuse(path, "somebody else writes it");
+    return descriptor;
+}
+
+void closeIfOpen(int descriptor) {
+    if (descriptor != none) {
+        ::close(descriptor);
     }
 }
 
+bool isSomebodyElses(int descriptor) {
+    return ::flock(descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
+}
+
+} // namespace
+
+RecordFile::RecordFile(const std::string& path) : path_(path), descriptor_(opened(path)) {
+    while (isRegular()) {
+        if (isSomebodyElses(descriptor_)) {
+            ::close(descriptor_);
+            refuse(path, "somebody else writes it");
+        }
+        if (isAt(path)) {
+            return;
+        }
+        // Whoever wrote it has put another one in its place meanwhile.
+        ::close(descriptor_);
+        descriptor_ = opened(path);
+    }
+}
+
+RecordFile::RecordFile(RecordFile&& other) noexcept
+    : path_(std::move(other.path_)), descriptor_(std::exchange(other.descriptor_, none)) {}
+
+RecordFile& RecordFile::operator=(RecordFile&& other) noexcept {
+    std::swap(path_, other.path_);
+    std::swap(descriptor_, other.descriptor_);
+    return *this;
+}
+
+RecordFile::~RecordFile() {
+    closeIfOpen(descriptor_);
+}
+
 void RecordFile::begin() const {
-    if (isRegular(descriptor_) && ::ftruncate(descriptor_, 0) != 0) {
+    if (isRegular() && ::ftruncate(descriptor_, 0) != 0) {
         refuse(path_, errorText(errno));
     }
 }
 
-RecordFile::~RecordFile() {
-    ::close(descriptor_);
+bool RecordFile::isRegular() const {
+    return S_ISREG(stateOf(descriptor_).st_mode);
+}
+
+std::uint64_t RecordFile::size() const {
+    return isRegular() ? static_cast<std::uint64_t>(stateOf(descriptor_).st_size) : 0;
+}
+
+bool RecordFile::isAt(const std::string& path) const {
+    const auto mine = stateOf(descriptor_);
+    struct stat there {};
+    return ::stat(path.c_str(), &there) == 0 && there.st_dev == mine.st_dev &&
+           there.st_ino == mine.st_ino;
 }
 
 } // namespace vantelhost

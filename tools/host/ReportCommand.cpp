@@ -2,16 +2,18 @@
 
 #include <cerrno>
 #include <filesystem>
-#include <fstream>
 #include <memory>
 #include <stdexcept>
 #include <string>
+#include <system_error>
+#include <vector>
 
 #include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
 #include "RecordFile.h"
 #include "Report/Page.h"
+#include "Report/RecordFiles.h"
 #include "Report/RecordingReader.h"
 #include "Text.h"
 #include "UsageError.h"
@@ -22,16 +24,36 @@ namespace vantelhost {
 namespace {
 
 struct ReportOptions {
-    std::string recording;
+    std::vector<std::string> recordings;
     std::string page;
 };
 
-Recording readRecording(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    if (!file) {
-        throw UsageError(fmt::format("cannot read {}: {}", path, errorText(errno)));
+/// Each file is closed when it has been read.
+Recording readRecords(std::vector<RecordSource>& sources) {
+    RecordingReader reader;
+    for (auto& [path, stream] : sources) {
+        reader.read(*stream, path);
+        stream.reset();
     }
-    return RecordingReader::read(file, path);
+    return reader.finish();
+}
+
+void refuseToReplace(const std::vector<RecordSource>& sources, const std::string& page) {
+    for (const auto& source : sources) {
+        std::error_code ignored;
+        if (std::filesystem::equivalent(source.path, page, ignored)) {
+            throw UsageError("the page would replace the recording " + source.path);
+        }
+    }
+}
+
+/// What the page is called: the only recording's name, with how many more there are.
+std::string nameOf(const std::vector<std::string>& recordings) {
+    const std::filesystem::path first(recordings.front());
+    // That of a folder may end with a slash.
+    const auto last = first.has_filename() ? first.filename() : first.parent_path().filename();
+    const auto more = recordings.size() - 1;
+    return last.string() + (more == 0 ? "" : fmt::format(" and {} more", more));
 }
 
 constexpr const char* standardOutput = "-";
@@ -39,20 +61,23 @@ constexpr const char* standardOutput = "-";
 void writePage(const std::string& path, const std::string& page) {
     if (path == standardOutput) {
         writeOutput(page);
-    } else if (const RecordFile file(path); !writeAll(file.descriptor(), page)) {
+        return;
+    }
+    const RecordFile file(path);
+    file.begin();
+    if (!writeAll(file.descriptor(), page)) {
         throw std::runtime_error(fmt::format("cannot write {}: {}", path, errorText(errno)));
     }
 }
 
 /// The page is complete before the file is touched.
 int makeReport(const ReportOptions& options) {
-    std::error_code ignored;
-    if (options.page != standardOutput &&
-        std::filesystem::equivalent(options.recording, options.page, ignored)) {
-        throw UsageError("the page would replace the recording " + options.recording);
+    auto sources = openRecords(options.recordings);
+    if (options.page != standardOutput) {
+        refuseToReplace(sources, options.page);
     }
-    const auto name = std::filesystem::path(options.recording).filename().string();
-    writePage(options.page, reportPage(readRecording(options.recording), name));
+    const auto recording = readRecords(sources);
+    writePage(options.page, reportPage(recording, nameOf(options.recordings)));
     return exitClean;
 }
 
@@ -60,7 +85,9 @@ int makeReport(const ReportOptions& options) {
 
 std::function<int()> prepareReport(CLI::App& command) {
     const auto options = std::make_shared<ReportOptions>();
-    command.add_option("recording", options->recording, "What 'run --record' has written")
+    command
+        .add_option("recording", options->recordings,
+                    "What 'run --record' has written: files, in any order, or folders of them")
         ->type_name("FILE")
         ->required();
     command

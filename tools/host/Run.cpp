@@ -44,7 +44,7 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
       signals_(signals),
       journal_(output(), onLostOutput, begin_) {
     if (!options_.recordFile.empty()) {
-        record_.emplace(options_.recordFile);
+        record_.emplace(options_.recordFile, options_.recordRules);
     }
     if (!options_.chronySocket.empty()) {
         chrony_.emplace(options_.chronySocket);
@@ -155,8 +155,9 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
 void Run::beginRecord() {
     if (record_) {
         record_->begin();
-        journal_.addOutput("record " + options_.recordFile,
-                           EventPrinter(record_->descriptor(), Format::jsonLines));
+        journal_.addOutput([this](const Event& event, const Moment& moment) {
+            return record_->take(event, moment);
+        });
     }
     if (statusPage_) {
         journal_.addOutput("status", [this](const Event& event, const Moment& moment) {

@@ -11,7 +11,7 @@
 #include "Json.h"
 #include "LiveView.h"
 #include "PlugIn.h"
-#include "RecordFile.h"
+#include "Record.h"
 #include "RunOptions.h"
 #include "Schema.h"
 #include "Signals.h"
@@ -52,7 +52,7 @@ private:
     Signals& signals_;
     const Moment::Clock::time_point begin_ = Moment::Clock::now();
     std::optional<LiveView> view_;
-    std::optional<RecordFile> record_;
+    std::optional<Record> record_;
     std::optional<ChronyClock> chrony_;
     std::optional<StatusPage> statusPage_;
     std::optional<StatusSocket> statusSocket_;

@@ -6,6 +6,7 @@
 #include <fmt/format.h>
 
 #include "Numbers.h"
+#include "RotatedName.h"
 
 namespace vantelhost {
 
@@ -68,16 +69,39 @@ void addBehaviour(CLI::App& command, RunOptions& options) {
                      "Run also when somebody listens at udsAddress, and take the socket away");
 }
 
+void addRecord(CLI::App& command, RunOptions& options) {
+    auto* record = command
+                       .add_option("--record", options.recordFile,
+                                   "Write every event to this file, as JSON Lines; an old one is "
+                                   "replaced")
+                       ->type_name("FILE");
+    command
+        .add_flag("--record-append", options.recordRules.append,
+                  "Write behind what is in the record, rather than replace it")
+        ->needs(record);
+    auto* size = command
+                     .add_option("--record-size", options.recordRules.size,
+                                 "Begin a new file before one is larger than this, in octets, or "
+                                 "with K, M or G; 0: never. The old one becomes FILE.1")
+                     ->transform(CLI::AsSizeValue(false))
+                     ->type_name("SIZE")
+                     ->needs(record);
+    command
+        .add_option("--record-keep", options.recordRules.keep,
+                    "How many old files there may be, up to FILE.N")
+        ->check(CLI::Range(1U, mostRotated))
+        ->type_name("N")
+        ->capture_default_str()
+        ->needs(size);
+}
+
 void addOutput(CLI::App& command, RunOptions& options) {
     auto* json = command.add_flag("--json", options.jsonLines, "Print JSON Lines");
     command
         .add_flag("--plain", options.plain,
                   "Print a line per event also on a terminal, not the live view")
         ->excludes(json);
-    command
-        .add_option("--record", options.recordFile,
-                    "Write every event to this file, as JSON Lines; an old one is replaced")
-        ->type_name("FILE");
+    addRecord(command, options);
     command
         .add_option("--chrony", options.chronySocket,
                     "Hand every time pair to chronyd's reference clock (refclock SOCK) here")

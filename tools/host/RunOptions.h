@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "BuiltPaths.h"
+#include "Record.h"
 #include "SettingsOptions.h"
 
 namespace CLI {
@@ -25,8 +26,9 @@ struct TimedOffset {
 struct RunOptions : SettingsOptions {
     std::optional<double> seconds;
     bool jsonLines = false;
-    bool plain = false;       ///< lines also on a terminal
-    std::string recordFile;   ///< empty when nothing is recorded
+    bool plain = false;     ///< lines also on a terminal
+    std::string recordFile; ///< empty when nothing is recorded
+    RecordRules recordRules;
     std::string chronySocket; ///< empty when chronyd gets nothing
     std::string statusSocket; ///< empty when nobody may ask
     bool useFifo = false;

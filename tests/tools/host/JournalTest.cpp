@@ -1,7 +1,6 @@
 #include "Journal.h"
 
 #include <array>
-#include <cerrno>
 #include <functional>
 #include <optional>
 
@@ -142,32 +141,35 @@ TEST_F(JournalTest, ARefusalNamesTheFunction) {
     EXPECT_EQ(events().at(0)["function"], "zekel_getTime");
 }
 
-TEST_F(JournalTest, ALostSecondOutputIsAnErrorThatTheOthersAreToldOnce) {
-    int offered = 0;
-    journal.addOutput("record r", [&](const Event&, const Moment&) {
-        ++offered;
-        errno = ENOSPC;
-        return false;
+TEST_F(JournalTest, WhatALaterOutputTellsGoesToAllAndAnErrorIsNotClean) {
+    std::vector<std::string> names;
+    journal.addOutput([&](const Event& event, const Moment&) {
+        names.push_back(event.name);
+        return names.size() == 1   ? std::optional(failureEvent("record r", "full"))
+               : names.size() == 3 ? std::optional(lostEvent("record r", 2, 0.5, "full"))
+                                   : std::nullopt;
     });
     journal.note(startedEvent());
-    journal.note(stoppedEvent());
-    EXPECT_EQ(offered, 1);
-    EXPECT_EQ(lost, 0);
     EXPECT_FALSE(journal.isClean());
+    journal.note(stoppedEvent());
+    EXPECT_THAT(names, testing::ElementsAre("started", "error", "stopped", "lost"));
     const auto shown = events();
-    ASSERT_EQ(shown.size(), 3U);
-    EXPECT_EQ(shown[1]["event"], "error");
+    ASSERT_EQ(shown.size(), 4U);
     EXPECT_EQ(shown[1]["operation"], "record r");
-    EXPECT_EQ(shown[1]["problem"], "No space left on device");
-    EXPECT_EQ(shown[2]["event"], "stopped");
+    EXPECT_EQ(shown[1]["problem"], "full");
+    EXPECT_EQ(shown[3]["events"], 2);
+    EXPECT_EQ(shown[3]["seconds"], 0.5);
+    EXPECT_EQ(shown[3]["problem"], "full");
+    EXPECT_EQ(journal.tally().errors, 1U);
+    EXPECT_EQ(lost, 0);
 }
 
 TEST_F(JournalTest, ALaterOutputGetsWhatHasComeBefore) {
     journal.note(startedEvent());
     std::vector<std::string> names;
-    journal.addOutput("record r", [&](const Event& event, const Moment&) {
+    journal.addOutput([&](const Event& event, const Moment&) {
         names.push_back(event.name);
-        return true;
+        return std::nullopt;
     });
     journal.outputsAreComplete();
     journal.note(stoppedEvent());
@@ -175,11 +177,11 @@ TEST_F(JournalTest, ALaterOutputGetsWhatHasComeBefore) {
     EXPECT_EQ(events().size(), 2U);
 }
 
-TEST_F(JournalTest, ALaterOutputThatLosesWhatCameBeforeIsTold) {
+TEST_F(JournalTest, ALaterOutputThatCannotTakeWhatCameBeforeIsHeard) {
     journal.note(startedEvent());
-    journal.addOutput("record r", [](const Event&, const Moment&) {
-        errno = ENOSPC;
-        return false;
+    journal.addOutput([](const Event& event, const Moment&) {
+        return event.name == "started" ? std::optional(failureEvent("record r", "full"))
+                                       : std::nullopt;
     });
     EXPECT_FALSE(journal.isClean());
     EXPECT_EQ(events().at(1)["operation"], "record r");
@@ -189,9 +191,9 @@ TEST_F(JournalTest, ALaterOutputThatLosesWhatCameBeforeIsTold) {
 TEST_F(JournalTest, EveryOutputGetsTheSameMoment) {
     std::vector<Moment> moments;
     for (int i = 0; i < 2; ++i) {
-        journal.addOutput("", [&](const Event&, const Moment& moment) {
+        journal.addOutput([&](const Event&, const Moment& moment) {
             moments.push_back(moment);
-            return true;
+            return std::nullopt;
         });
     }
     journal.note(startedEvent());

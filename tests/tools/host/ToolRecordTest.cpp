@@ -2,6 +2,7 @@
 
 #include <csignal>
 #include <ctime>
+#include <sstream>
 
 #include <sys/stat.h>
 
@@ -66,6 +67,44 @@ TEST_F(ToolRecordTest, AnOldFileIsReplaced) {
     writeFile(file, "old\n");
     play("", {"--record", file});
     EXPECT_EQ(recorded().events().at(0)["event"], "loaded");
+}
+
+TEST_F(ToolRecordTest, AnOldFileIsKeptWhenAppending) {
+    writeFile(file, "cut");
+    play("", {"--record", file, "--record-append"});
+    play("pairs", {"--record", file, "--record-append"});
+    const auto content = contentOf(file);
+    EXPECT_THAT(content, testing::StartsWith("cut\n{\"event\":\"loaded\""));
+    const Result result{0, content.substr(4), ""};
+    EXPECT_EQ(result.events("loaded").size(), 2U);
+    EXPECT_EQ(result.events("summary").size(), 2U);
+    EXPECT_EQ(result.events("pair").size(), 3U);
+}
+
+TEST_F(ToolRecordTest, AFullFileBecomesAnOldOne) {
+    const auto result = play("quality pairs metadata bad-metadata",
+                             {"--record", file, "--record-size", "1K", "--record-keep", "20"});
+    std::string all;
+    for (int number = 20; number >= 0; --number) {
+        all += contentOf(number == 0 ? file : file + "." + std::to_string(number));
+    }
+    std::string lines;
+    std::istringstream stream(all);
+    for (std::string line; std::getline(stream, line);) {
+        lines += line.find("{\"event\":\"continued\"") == 0 ? "" : line + "\n";
+    }
+    EXPECT_EQ(lines, result.output);
+    EXPECT_NE(contentOf(file + ".1"), "");
+}
+
+TEST_F(ToolRecordTest, OptionsWithoutARecordAreMistakes) {
+    EXPECT_EQ(play("", {"--record-append"}).status, 2);
+    EXPECT_EQ(play("", {"--record-size", "1K"}).status, 2);
+    EXPECT_EQ(play("", {"--record", file, "--record-keep", "3"}).status, 2);
+    EXPECT_EQ(play("", {"--record", file, "--record-size", "1X"}).status, 2);
+    EXPECT_EQ(play("", {"--record", file, "--record-size", "1K", "--record-keep", "1000"}).status,
+              2);
+    EXPECT_EQ(contentOf(file), "");
 }
 
 TEST_F(ToolRecordTest, AFileThatAnotherRunWritesIsLeftAlone) {

@@ -6,37 +6,52 @@
 #include <cstdint>
 #include <vector>
 
+#include "Report/PhaseGrid.h"
+
 namespace vantelhost {
 
-/// An offset at its place on an even grid of time.
-struct PhaseSample {
-    std::int64_t slot;
-    double phase; ///< nanoseconds
-};
-
-struct PhaseSeries {
-    double interval = 0;      ///< of the grid, in seconds; 0 with less than two samples
-    std::int64_t missing = 0; ///< slots without a sample, between the first and the last one
-    std::vector<PhaseSample> samples; ///< slots ascend
-};
-
-/// Puts offsets onto a grid. Its interval is the mean of the distances between neighbours that
-/// nothing is missing between: those that round to one median distance. A longer distance leaves
-/// as many slots empty as it rounds to.
-/// @param times   nanoseconds, one for each offset
-/// @param offsets nanoseconds
-PhaseSeries onGrid(const std::vector<std::uint64_t>& times,
-                   const std::vector<std::int64_t>& offsets);
-
 struct Deviation {
-    double tau;        ///< seconds
-    double value;      ///< dimensionless
-    std::size_t terms; ///< how many second differences it is made of; at least 1
+    double tau;          ///< seconds
+    double value;        ///< dimensionless
+    std::uint64_t terms; ///< how many second differences it is made of; at least 1
 };
 
-/// The overlapping Allan deviation for 1, 2, 4, ... intervals, up to a quarter of the series'
-/// length. Second differences that need a missing sample are left out; a deviation without any is
-/// not there.
-std::vector<Deviation> allanDeviations(const PhaseSeries& series);
+/// The overlapping Allan deviation for 1, 2, 4, ... intervals, in bounded memory: up to 1024
+/// intervals a second difference begins at each slot, for longer times at 1024 slots in each.
+/// Second differences that need a missing sample are left out.
+class AllanDeviation {
+public:
+    AllanDeviation();
+
+    /// Slots ascend.
+    void add(const PhaseSample& sample);
+
+    /// Up to a quarter of all slots. A deviation without any second difference is not there.
+    /// @param interval of the grid, seconds
+    std::vector<Deviation> deviations(double interval) const;
+
+private:
+    /// The last samples of slots whose number ends in so many zeros, in binary.
+    struct Ring {
+        unsigned zeros;
+        std::vector<PhaseSample> samples;
+
+        bool takes(std::int64_t slot) const { return slot >> zeros << zeros == slot; }
+        PhaseSample& at(std::int64_t slot);
+        void clear();
+    };
+
+    struct Octave {
+        std::int64_t steps = 0;
+        double squares = 0; ///< of second differences, in nanoseconds
+        std::uint64_t terms = 0;
+
+        void add(Ring& ring, const PhaseSample& last);
+    };
+
+    std::vector<Ring> rings_;     ///< of 0, 1, 2, ... zeros
+    std::vector<Octave> octaves_; ///< of 1, 2, 4, ... steps
+    std::int64_t slots_ = 0;
+};
 
 } // namespace vantelhost

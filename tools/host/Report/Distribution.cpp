@@ -1,7 +1,7 @@
 #include "Report/Distribution.h"
 
 #include <algorithm>
-#include <cstdint>
+#include <utility>
 
 #include "Report/Statistics.h"
 
@@ -9,37 +9,61 @@ namespace vantelhost {
 
 namespace {
 
-Stretch stretchOf(double begin, double end, std::vector<double>& values) {
+/// As many as can be told apart in a drawing.
+constexpr std::size_t mostValues = 1024;
+
+Stretch stretchOf(double begin, double end, const ValueCounts& values) {
     Stretch stretch{begin, end, {}};
-    std::sort(values.begin(), values.end());
     for (std::size_t mark = 0; mark < distributionMarks.size(); ++mark) {
-        stretch.values[mark] = percentile(values, distributionMarks[mark]);
+        stretch.values[mark] = static_cast<double>(percentile(values, distributionMarks[mark]));
     }
     return stretch;
 }
 
 } // namespace
 
-std::vector<Stretch> distribution(const std::vector<Point>& points, std::size_t stretches) {
-    const double begin = points.front().x;
-    const double width = (points.back().x - begin) / static_cast<double>(stretches);
-    const auto edge = [&](std::size_t number) {
-        return begin + width * static_cast<double>(number);
-    };
+void Distribution::add(double x, std::int64_t y) {
+    if (parts_.empty()) {
+        begin_ = x;
+    }
+    const auto number = numberOf(x);
+    if (number >= parts_.size()) {
+        parts_.resize(number + 1, ValueCounts(mostValues));
+    }
+    parts_[number].add(y);
+    last_ = x;
+}
+
+std::vector<Stretch> Distribution::stretches() const {
     std::vector<Stretch> result;
-    std::vector<double> values;
-    auto point = points.begin();
-    for (std::size_t number = 1; number <= stretches; ++number) {
-        values.clear();
-        const double end = edge(number);
-        for (; point != points.end() && (point->x < end || number == stretches); ++point) {
-            values.push_back(point->y);
+    double begin = begin_;
+    for (const auto& part : parts_) {
+        const double end = begin + width_;
+        if (part.size() > 0) {
+            result.push_back(stretchOf(begin, std::min(end, last_), part));
         }
-        if (!values.empty()) {
-            result.push_back(stretchOf(edge(number - 1), end, values));
-        }
+        begin = end;
     }
     return result;
+}
+
+std::size_t Distribution::numberOf(double x) {
+    while ((x - begin_) / width_ >= most) {
+        halve();
+    }
+    return static_cast<std::size_t>((x - begin_) / width_);
+}
+
+void Distribution::halve() {
+    for (std::size_t i = 0; i < parts_.size(); ++i) {
+        if (i % 2 == 0) {
+            std::swap(parts_[i / 2], parts_[i]);
+        } else {
+            parts_[i / 2].add(parts_[i]);
+        }
+    }
+    parts_.resize((parts_.size() + 1) / 2, ValueCounts(mostValues));
+    width_ *= 2;
 }
 
 } // namespace vantelhost

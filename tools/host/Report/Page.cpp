@@ -1,6 +1,7 @@
 #include "Report/Page.h"
 
 #include <algorithm>
+#include <utility>
 #include <vector>
 
 #include <fmt/format.h>
@@ -42,6 +43,10 @@ std::string notes(const Recording& recording) {
     if (recording.counts.onlyZeros() && !isTold) {
         html += note(noDelayText(0, recording.counts.falseOffsets));
     }
+    if (recording.gaps.count() > 0) {
+        html += note(fmt::format("Not all is here, or in its order: {} gap{}, see below.",
+                                 recording.gaps.count(), recording.gaps.count() == 1 ? "" : "s"));
+    }
     return html;
 }
 
@@ -56,12 +61,20 @@ std::string pairCount(const PairCounts& counts) {
     return text;
 }
 
-std::string pairRate(const std::vector<Pair>& pairs) {
-    const double time = pairs.empty() ? 0 : pairs.back().seconds - pairs.front().seconds;
-    if (time <= 0) {
-        return "-";
+std::string pairRate(double rate) {
+    return rate > 0 ? fmt::format("{:.3g} each second", rate) : "-";
+}
+
+/// What a recording of one file and one run has not.
+std::vector<Row> sizeRows(const Recording& recording) {
+    std::vector<Row> rows;
+    for (const auto& [name, count] :
+         {std::pair("Files", recording.files), std::pair("Runs", recording.runs)}) {
+        if (count > 1) {
+            rows.push_back({name, fmt::format("{}", count)});
+        }
     }
-    return fmt::format("{:.3g} each second", static_cast<double>(pairs.size() - 1) / time);
+    return rows;
 }
 
 std::string summarySection(const Recording& recording) {
@@ -74,13 +87,16 @@ std::string summarySection(const Recording& recording) {
         {"Plug-in", recording.plugIn + ", " + recording.plugInFile},
         {"End", recording.stopCause.empty() ? "not recorded" : recording.stopCause},
         {"Time pairs", pairCount(recording.counts)},
-        {"Rate of pairs", pairRate(recording.pairs)},
+        {"Rate of pairs", pairRate(recording.pairs->rate())},
         {"Quality usable", fmt::format("{} ({:.1f} %)", shownDuration(usable), share)},
         {"Changes of quality", fmt::format("{}", recording.qualities.count())},
         {"Errors", fmt::format("{}", recording.errors)},
         {"Warnings", fmt::format("{}", recording.warnings)},
         {"Refused calls", fmt::format("{}", recording.refused)},
     };
+    if (recording.restarts > 0) {
+        rows.push_back({"Restarted sessions", fmt::format("{}", recording.restarts)});
+    }
     if (recording.epochOffsets > 0) {
         rows.push_back(
             {"Epoch offset", fmt::format("{} ns, written {} times", recording.epochOffset,
@@ -91,6 +107,8 @@ std::string summarySection(const Recording& recording) {
             {"To chronyd", fmt::format("{} pairs sent, {} failed", recording.chrony->sent,
                                        recording.chrony->failed)});
     }
+    const auto sizes = sizeRows(recording);
+    rows.insert(rows.begin() + 2, sizes.begin(), sizes.end());
     return section("Summary", table({}, rows));
 }
 
@@ -132,8 +150,8 @@ std::string portTable(const Json& metadata) {
 }
 
 std::string sections(const Recording& recording) {
-    std::string html = summarySection(recording);
-    html += recording.pairs.empty()
+    std::string html = summarySection(recording) + gapSection(recording);
+    html += recording.pairs->empty()
                 ? section("Offset",
                           paragraph(recording.counts.all() == 0 ? "There are no time pairs."
                                                                 : "No pair is a measurement."))

@@ -1,8 +1,6 @@
 #include "Report/PairSections.h"
 
 #include <algorithm>
-#include <iterator>
-#include <utility>
 
 #include <fmt/format.h>
 
@@ -12,60 +10,10 @@
 #include "Report/SeriesFigure.h"
 #include "Report/Statistics.h"
 #include "Report/Units.h"
-#include "Tally.h"
 
 namespace vantelhost {
 
 namespace {
-
-/// One value for each pair, at the time of its call.
-template <typename Value>
-std::vector<Point> pointsOf(const std::vector<Pair>& pairs, Value value) {
-    std::vector<Point> points;
-    points.reserve(pairs.size());
-    for (const auto& pair : pairs) {
-        points.push_back({pair.seconds, static_cast<double>(value(pair))});
-    }
-    return points;
-}
-
-template <typename Value>
-std::vector<std::int64_t> sortedValues(const std::vector<Pair>& pairs, Value value) {
-    std::vector<std::int64_t> values;
-    values.reserve(pairs.size());
-    std::transform(pairs.begin(), pairs.end(), std::back_inserter(values), value);
-    std::sort(values.begin(), values.end());
-    return values;
-}
-
-std::int64_t offsetOf(const Pair& pair) {
-    return pair.offset;
-}
-
-std::int64_t delayOf(const Pair& pair) {
-    return pair.delay;
-}
-
-/// From each pair's ingress to the next one's.
-std::vector<std::int64_t> intervalsOf(const std::vector<Pair>& pairs) {
-    std::vector<std::int64_t> intervals;
-    for (std::size_t i = 1; i < pairs.size(); ++i) {
-        intervals.push_back(static_cast<std::int64_t>(pairs[i].ingress - pairs[i - 1].ingress));
-    }
-    return intervals;
-}
-
-PhaseSeries phaseOf(const std::vector<Pair>& pairs) {
-    std::vector<std::uint64_t> times;
-    std::vector<std::int64_t> offsets;
-    times.reserve(pairs.size());
-    offsets.reserve(pairs.size());
-    for (const auto& pair : pairs) {
-        times.push_back(pair.ingress);
-        offsets.push_back(pair.offset);
-    }
-    return onGrid(times, offsets);
-}
 
 std::string pairsText(std::size_t count) {
     return fmt::format("{} pair{}", count, count == 1 ? "" : "s");
@@ -78,46 +26,35 @@ std::string baseText(const Extent& extent) {
 }
 
 /// What a reader of the drawing must know.
-std::string howItIsDrawn(const std::vector<std::int64_t>& sorted, const Extent& range) {
+std::string howItIsDrawn(const Series& series, const Extent& range) {
     std::string text = "Shaded: the quality was not usable." + baseText(range);
-    if (areBands(sorted.size())) {
-        text += fmt::format(" For each of {} stretches of time: the median (line), 25 to 75 % of "
-                            "the values (dark), 1 to 99 % (light), the lowest and the highest "
-                            "(strokes).",
-                            bandStretches);
+    if (!series.isWhole()) {
+        text += fmt::format(" For each {} of time: the median (line), 25 to 75 % of the values "
+                            "(dark), 1 to 99 % (light), the lowest and the highest (strokes).",
+                            shownDuration(series.distribution().width()));
     }
-    const auto isBefore = [](std::int64_t value, double edge) {
-        return static_cast<double>(value) < edge;
-    };
-    const auto isBeyond = [](double edge, std::int64_t value) {
-        return edge < static_cast<double>(value);
-    };
-    const auto below = std::lower_bound(sorted.begin(), sorted.end(), range.low, isBefore);
-    const auto above = std::upper_bound(sorted.begin(), sorted.end(), range.high, isBeyond);
-    if (above != sorted.end()) {
-        text += fmt::format(" Above the edge: {}, up to {}.", sorted.end() - above,
-                            shownTime(static_cast<double>(sorted.back())));
+    const auto& values = series.values();
+    const auto [below, above] = outliers(values, range);
+    if (above > 0) {
+        text += fmt::format(" Above the edge: {}, up to {}.", above,
+                            shownTime(static_cast<double>(values.largest())));
     }
-    if (below != sorted.begin()) {
-        text += fmt::format(" Below the edge: {}, down to {}.", below - sorted.begin(),
-                            shownTime(static_cast<double>(sorted.front())));
+    if (below > 0) {
+        text += fmt::format(" Below the edge: {}, down to {}.", below,
+                            shownTime(static_cast<double>(values.smallest())));
     }
     return paragraph(text);
 }
 
-/// Figures of values that ascend, in nanoseconds.
-/// @param range where nearly all are
-std::string figures(const std::vector<std::int64_t>& sorted, const Extent& range) {
+/// Figures in nanoseconds.
+/// @param range where nearly all values are
+std::string figures(const Series& series, const Extent& range) {
     const bool isExact = baseOf(range) != 0;
     const auto shown = [&](double value) {
         return isExact ? fmt::format("{:.0f} ns", value) : shownTime(value);
     };
-    OffsetStatistics statistics;
-    for (const auto value : sorted) {
-        statistics.add(value);
-    }
     const auto at = [&](unsigned perMille) {
-        return shown(static_cast<double>(percentile(sorted, perMille)));
+        return shown(static_cast<double>(percentile(series.values(), perMille)));
     };
     return definitions({{"min", at(0)},
                         {"1 %", at(10)},
@@ -126,20 +63,16 @@ std::string figures(const std::vector<std::int64_t>& sorted, const Extent& range
                         {"95 %", at(950)},
                         {"99 %", at(990)},
                         {"max", at(1000)},
-                        {"mean", shown(statistics.mean())},
-                        {"rms", shown(statistics.rms())}});
+                        {"mean", shown(series.statistics().mean())},
+                        {"rms", shown(series.statistics().rms())}});
 }
 
 /// A drawing of values over time, and their figures.
-/// @param sorted   the same values, ascending
-/// @param interval about the time from one to the next, seconds
-std::string series(const Caption& caption, std::vector<Point> points,
-                   const std::vector<std::int64_t>& sorted, const Recording& recording,
-                   double interval) {
-    const auto range = bulk(sorted);
-    const double gap = std::max(5 * interval, recording.duration / 500);
-    return seriesFigure(caption, {std::move(points), range, gap}, TimeAxis(recording)) +
-           howItIsDrawn(sorted, range) + figures(sorted, range);
+std::string seriesPart(const Caption& caption, const Series& series, const Recording& recording) {
+    const auto range = bulk(series.values());
+    const double gap = std::max(5 * recording.pairs->grid().interval(), recording.duration / 500);
+    return seriesFigure(caption, series, {range, gap}, TimeAxis(recording)) +
+           howItIsDrawn(series, range) + figures(series, range);
 }
 
 /// What the figures below are not made of; empty if that is nothing.
@@ -158,7 +91,7 @@ std::string leftOut(const PairCounts& counts) {
     return html;
 }
 
-std::string histogramSection(const std::vector<std::int64_t>& offsets) {
+std::string histogramSection(const ValueCounts& offsets) {
     const auto bars = histogram(offsets, 60);
     const double end = bars.low + bars.width * static_cast<double>(bars.counts.size());
     std::string text =
@@ -172,17 +105,17 @@ std::string histogramSection(const std::vector<std::int64_t>& offsets) {
                        paragraph(text));
 }
 
-std::string howItIsMade(const PhaseSeries& series) {
+std::string howItIsMade(const PhaseGrid& grid) {
     return paragraph(fmt::format(
         "Overlapping Allan deviation of the offset as time error. The offsets stand on a grid of "
         "{}, the mean distance of successive pairs. Places of the grid without an offset, from "
         "missed Syncs and gaps: {}. Nothing is interpolated: sums that need one of those are "
         "left out.",
-        shownTime(series.interval * 1e9), series.missing));
+        shownTime(grid.interval() * 1e9), grid.missing()));
 }
 
-std::string deviationSection(const PhaseSeries& series) {
-    const auto deviations = allanDeviations(series);
+std::string deviationSection(const PairSeries& pairs) {
+    const auto deviations = pairs.deviations();
     const bool visible = std::any_of(deviations.begin(), deviations.end(),
                                      [](const Deviation& each) { return each.value > 0; });
     std::string html;
@@ -199,56 +132,46 @@ std::string deviationSection(const PhaseSeries& series) {
             rows.push_back({fmt::format("{:.5g} s", each.tau), fmt::format("{:.3e}", each.value),
                             fmt::format("{}", each.terms)});
         }
-        html += howItIsMade(series) + table({"tau", "deviation", "sums"}, rows);
+        html += howItIsMade(pairs.grid()) + table({"tau", "deviation", "sums"}, rows);
     }
     return section("Allan deviation", html);
 }
 
-std::string intervalSection(const Recording& recording, const PhaseSeries& phase) {
-    auto intervals = intervalsOf(recording.pairs);
-    if (intervals.empty()) {
+std::string intervalSection(const Recording& recording) {
+    const auto& intervals = recording.pairs->intervals();
+    if (intervals.values().size() == 0) {
         return section("Pair intervals", paragraph("There is one pair only."));
     }
-    std::vector<Point> points;
-    points.reserve(intervals.size());
-    for (std::size_t i = 0; i < intervals.size(); ++i) {
-        points.push_back({recording.pairs[i + 1].seconds, static_cast<double>(intervals[i])});
-    }
-    std::sort(intervals.begin(), intervals.end());
-    return section("Pair intervals",
-                   paragraph("From the ingress of a pair's Sync to that of the next pair's.") +
-                       series({"interval", "Intervals of pairs over time"}, std::move(points),
-                              intervals, recording, phase.interval));
+    return section(
+        "Pair intervals",
+        paragraph("From the ingress of a pair's Sync to that of the next pair's.") +
+            seriesPart({"interval", "Intervals of pairs over time"}, intervals, recording));
 }
 
-std::string delaySection(const Recording& recording, const PhaseSeries& phase) {
+std::string delaySection(const Recording& recording) {
     return section(
         "Poll delay",
         paragraph("From the ingress of the Sync to the call, in the host's clock (CLOCK_REALTIME). "
                   "If ptp4l stamps with another clock, what is between the two is in it.") +
-            series({"delay", "Poll delay over time"}, pointsOf(recording.pairs, delayOf),
-                   sortedValues(recording.pairs, delayOf), recording, phase.interval));
+            seriesPart({"delay", "Poll delay over time"}, recording.pairs->delays(), recording));
 }
 
-std::string offsetSections(const Recording& recording, const PhaseSeries& phase) {
-    const auto offsets = sortedValues(recording.pairs, offsetOf);
-    return section("Offset",
-                   paragraph("Local minus reference time, at the time of the call.") +
-                       leftOut(recording.counts) +
-                       series({"offset", "Offset over time"}, pointsOf(recording.pairs, offsetOf),
-                              offsets, recording, phase.interval)) +
-           histogramSection(offsets) + deviationSection(phase);
+std::string offsetSections(const Recording& recording) {
+    const auto& offsets = recording.pairs->offsets();
+    return section("Offset", paragraph("Local minus reference time, at the time of the call.") +
+                                 leftOut(recording.counts) +
+                                 seriesPart({"offset", "Offset over time"}, offsets, recording)) +
+           histogramSection(offsets.values()) + deviationSection(*recording.pairs);
 }
 
 } // namespace
 
 std::string pairSections(const Recording& recording) {
-    const auto phase = phaseOf(recording.pairs);
     const auto& counts = recording.counts;
     return (counts.onlyZeros()
                 ? section("Offset", paragraph("No offset is a measurement.") + leftOut(counts))
-                : offsetSections(recording, phase)) +
-           intervalSection(recording, phase) + delaySection(recording, phase);
+                : offsetSections(recording)) +
+           intervalSection(recording) + delaySection(recording);
 }
 
 } // namespace vantelhost

@@ -4,26 +4,22 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "Json.h"
 #include "PairFilter.h"
+#include "Report/PairSeries.h"
 
 namespace vantelhost {
 
-/// A time pair. Seconds are those since the host's start, here and below.
-struct Pair {
+/// Seconds are those on the axis of the recording, here and below: since the host's start, or,
+/// where that is not recorded, since the first line. They go on over files and runs.
+struct StateChange {
     double seconds = 0;
-    std::uint64_t ingress = 0; ///< of the Sync: nanoseconds modulo 2^64, without the epoch offset
-    std::int64_t offset = 0;   ///< local minus reference, nanoseconds
-    std::int64_t delay = 0;    ///< from the ingress to the call in the host's clock, nanoseconds
-};
-
-struct QualityChange {
-    double seconds = 0;
-    std::string quality;
+    std::string state; ///< empty: nothing is known any more
     std::string reason;
 };
 
@@ -39,7 +35,15 @@ struct ChronyCount {
     std::uint64_t failed;
 };
 
-/// An error, a warning or a refused call; ptp4l's end; the cause of a run in vain, and its mend.
+/// A time of which something is missing, a line that is no event, or a clock that was set.
+struct Gap {
+    double seconds = 0; ///< its beginning
+    double length = 0;  ///< seconds
+    std::string text;
+};
+
+/// An error, a warning or a refused call; ptp4l's end; a restart; the cause of a run in vain, and
+/// its mend.
 struct Problem {
     double seconds = 0;
     std::string kind;
@@ -51,12 +55,17 @@ template <typename Item>
 class First {
 public:
     void add(const Item& item) {
+        keep(item);
+        ++count_;
+    }
+
+    /// The same, but not counted.
+    void keep(const Item& item) {
         if (items_.size() < limit) {
             items_.push_back(item);
         } else if (!fullSince_) {
             fullSince_ = item.seconds;
         }
-        ++count_;
     }
 
     const std::vector<Item>& items() const { return items_; }
@@ -73,24 +82,31 @@ private:
 };
 
 struct Recording {
-    std::uint64_t lines = 0;
+    std::uint64_t lines = 0; ///< that are events
+    std::size_t files = 0;
+    std::size_t runs = 0;
     bool truncated = false;  ///< the last line is cut
-    bool summarised = false; ///< the host came to its end
-    std::uint64_t begin = 0; ///< the host's start in its clock: nanoseconds since 1970
-    double duration = 0;     ///< seconds until the last event
-    std::string plugIn;      ///< its name; empty when it was not loaded
+    bool summarised = false; ///< the last host came to its end
+    std::uint64_t begin =
+        0;               ///< of the axis, in the host's clock at the end: nanoseconds since 1970
+    double duration = 0; ///< seconds until the last event
+    std::string plugIn;  ///< its name; empty when it was not loaded
     std::string plugInFile;
     std::string stopCause; ///< empty when the host was not stopped
     std::string cause;     ///< why the run was in vain; empty when it was not, or was not told
     std::string mend;      ///< what to do about it
     PairCounts counts;
-    std::vector<Pair> pairs;        ///< the measured ones; with only zeros, those of offset 0
-    First<QualityChange> qualities; ///< only what differs from the one before
+    /// The measured ones; with only zeros, those of offset 0. Not null.
+    std::unique_ptr<PairSeries> pairs = std::make_unique<PairSeries>();
+    First<StateChange> qualities; ///< only what differs from the one before
+    First<StateChange> healths;   ///< none where the host told none
     First<PortChange> portChanges;
     First<Problem> problems;
+    First<Gap> gaps;
     std::size_t errors = 0;
     std::size_t warnings = 0;
     std::size_t refused = 0;
+    std::size_t restarts = 0;     ///< of the plug-in's session
     std::size_t epochOffsets = 0; ///< how often one was written
     std::int64_t epochOffset = 0; ///< the last one, nanoseconds
     std::optional<ChronyCount> chrony;

@@ -1,17 +1,13 @@
 #include "Report/RecordingReader.h"
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
-#include <deque>
+#include <cmath>
 #include <stdexcept>
-#include <string_view>
-#include <vector>
 
 #include <fmt/format.h>
 
-#include "Events.h"
-#include "Report/JsonText.h"
+#include "Report/Units.h"
 #include "Text.h"
 #include "UsageError.h"
 
@@ -22,6 +18,9 @@ namespace {
 /// What a line of a file that is no record may at most take up.
 constexpr std::size_t longestLine = std::size_t{1} << 20U;
 
+/// So many lines without an event show that a file is no record.
+constexpr std::uint64_t hopeless = 1000;
+
 /// Deeper ones would not be safe to walk.
 constexpr int deepest = 100;
 
@@ -31,198 +30,193 @@ Json parsed(std::string_view text) {
     });
 }
 
-std::string portLabel(const std::string& name, const Json& port) {
-    const auto interface = jsonText(port, "interface");
-    return interface.empty() ? name : name + " " + interface;
+Moment momentOf(const Json& line) {
+    return {line.at("t").get<double>(), line.at("time").get<std::uint64_t>()};
 }
 
-bool isProblem(std::string_view event) {
-    constexpr std::array<std::string_view, 6> problems{"error",        "warning", "refused",
-                                                       "daemon-ended", "cause",   "mend"};
-    return std::find(problems.begin(), problems.end(), event) != problems.end();
-}
-
-/// As the host told it.
-std::string daemonEndText(const Json& line) {
-    const bool bySignal = line.contains("signal");
-    const ChildEnd end{line.at("pid").get<pid_t>(), bySignal,
-                       line.at(bySignal ? "signal" : "status").get<int>()};
-    return daemonEndedEvent(end, line.at("words").get<std::deque<std::string>>()).text;
-}
-
-/// What went wrong, in words.
-std::string problemText(const std::string& kind, const Json& line) {
-    if (kind == "daemon-ended") {
-        return daemonEndText(line);
+/// Valid as long as the line is.
+PairLine pairOf(const Json& line) {
+    PairLine pair{line.at("t").get<double>(),
+                  line.at("time").get<std::uint64_t>(),
+                  line.at("local").get<std::uint64_t>(),
+                  line.at("offset").get<std::int64_t>(),
+                  {}};
+    if (const auto leftOut = line.find("leftOut"); leftOut != line.end()) {
+        pair.leftOut = leftOut->get_ref<const std::string&>();
     }
-    std::string text;
-    for (const char* key : {"operation", "function", "code", "problem", "status", "text"}) {
-        const auto word = jsonText(line, key);
-        text += (text.empty() || word.empty() ? "" : ": ") + word;
-    }
+    return pair;
+}
+
+std::string clockText(double set) {
+    return fmt::format("the host's clock was set {} by {}{}", set > 0 ? "forward" : "back",
+                       shownDuration(std::abs(set)), set > 0 ? ", or the machine slept" : "");
+}
+
+/// @param passed since the run before, by the host's clock, seconds
+std::string pauseText(double passed, bool isSummarised) {
+    std::string text = "another run begins";
+    text += isSummarised ? "" : "; the one before has no summary: it was killed";
+    text += passed < 0 ? fmt::format("; the host's clock was set back by {}, or the files are out "
+                                     "of order",
+                                     shownDuration(-passed))
+                       : "";
     return text;
 }
 
 } // namespace
 
-Recording RecordingReader::read(std::istream& stream, const std::string& name) {
-    RecordingReader reader;
-    auto& recording = reader.recording_;
-    std::vector<char> buffer(longestLine);
-    while (stream.getline(buffer.data(), static_cast<std::streamsize>(buffer.size()))) {
-        // The count holds the line's end, if there is one.
-        const bool isWhole = !stream.eof();
-        const auto length = static_cast<std::size_t>(stream.gcount()) - (isWhole ? 1 : 0);
-        const std::string_view text(buffer.data(), length);
-        try {
-            reader.take(parsed(text));
-        } catch (const std::exception& error) {
-            if (!isWhole) {
-                recording.truncated = true;
-                break;
-            }
-            throw UsageError(fmt::format("{}:{}: this is no record of vantel-host: {}", name,
-                                         recording.lines + 1, error.what()));
+void RecordingReader::read(std::istream& stream, const std::string& name) {
+    beginFile(name);
+    LineReader lines(stream, longestLine);
+    while (const auto line = lines.next()) {
+        ++lineNumber_;
+        takeLine(*line);
+        if (!hasEvent_ && lineNumber_ >= hopeless) {
+            break;
         }
-        ++recording.lines;
     }
     if (stream.bad()) {
         throw UsageError(fmt::format("cannot read {}: {}", name, errorText(errno)));
     }
-    if (!stream.eof()) {
-        throw UsageError(
-            fmt::format("{}:{}: this is no record of vantel-host: the line is too long", name,
-                        recording.lines + 1));
-    }
-    return recording;
+    endFile();
 }
 
-void RecordingReader::take(const Json& line) {
-    const auto& event = line.at("event").get_ref<const std::string&>();
-    takeMoment(line);
-    if (event == "pair") {
-        takePair(line);
-    } else if (event == "quality") {
-        takeQuality(line);
-    } else if (event == "metadata") {
-        takeMetadata(line);
-    } else if (isProblem(event)) {
-        takeProblem(event, line);
-    } else {
-        takeOther(event, line);
-    }
+Recording RecordingReader::finish() {
+    auto& recording = builder_.recording();
+    recording.begin = axis_.origin();
+    recording.duration = axis_.seconds();
+    recording.pairs->finish();
+    return std::move(recording);
 }
 
-void RecordingReader::takeMoment(const Json& line) {
-    const auto seconds = line.at("t").get<double>();
-    const auto time = line.at("time").get<std::uint64_t>();
-    // A year of 366 days, a hundred times.
-    if (seconds < seconds_ || seconds > 3.2e9) {
-        throw std::runtime_error("t goes back, or is out of range");
+void RecordingReader::beginFile(const std::string& name) {
+    auto& recording = builder_.recording();
+    if (std::exchange(recording.truncated, false)) {
+        tell(fmt::format("{}:{}: the last line is cut", name_, lineNumber_));
     }
-    if (recording_.lines == 0) {
-        recording_.begin = time - static_cast<std::uint64_t>(seconds * 1e9);
-    }
-    seconds_ = seconds;
-    recording_.duration = seconds;
+    ++recording.files;
+    name_ = name;
+    lineNumber_ = 0;
+    hasEvent_ = false;
+    firstProblem_.clear();
 }
 
-void RecordingReader::takePair(const Json& line) {
-    const auto local = line.at("local").get<std::uint64_t>();
-    const auto offset = line.at("offset").get<std::int64_t>();
-    const auto ingress = local - static_cast<std::uint64_t>(recording_.epochOffset);
-    const auto delay = static_cast<std::int64_t>(line.at("time").get<std::uint64_t>() - ingress);
-    const bool onlyZerosBefore = recording_.counts.onlyZeros();
-    const auto kind = filter_.pair(local, offset);
-    recording_.counts = filter_.counts();
-    if (onlyZerosBefore && kind == PairKind::measured) {
-        recording_.pairs.clear();
-    }
-    if (kind == PairKind::measured ||
-        (kind == PairKind::falseOffset && recording_.counts.onlyZeros())) {
-        recording_.pairs.push_back({seconds_, ingress, offset, delay});
+void RecordingReader::endFile() const {
+    if (!hasEvent_ && !firstProblem_.empty()) {
+        throw UsageError(firstProblem_);
     }
 }
 
-void RecordingReader::takeQuality(const Json& line) {
-    const QualityChange change{seconds_, line.at("quality").get<std::string>(),
-                               line.at("reason").get<std::string>()};
-    filter_.quality(change.quality, change.reason);
-    if (lastQuality_ != std::pair(change.quality, change.reason)) {
-        recording_.qualities.add(change);
-        lastQuality_ = {change.quality, change.reason};
-    }
-}
-
-void RecordingReader::takeMetadata(const Json& line) {
-    if (!line.at("valid").get<bool>()) {
-        ++recording_.errors;
-        recording_.problems.add(
-            {seconds_, "error", "metadata is no JSON object: " + jsonText(line, "text")});
+void RecordingReader::takeLine(const LineReader::Line& line) {
+    if (line.isTooLong) {
+        leaveOut("the line is too long");
         return;
     }
-    recording_.metadata = line.at("metadata");
-    takePorts(recording_.metadata);
-}
-
-void RecordingReader::takePorts(const Json& metadata) {
-    std::map<std::string, std::string> states;
-    for (const auto& [name, value] : metadata.items()) {
-        if (value.is_object()) {
-            states[portLabel(name, value)] = jsonText(value, "portState");
+    try {
+        takeText(line.text);
+        hasEvent_ = true;
+        ++builder_.recording().lines;
+    } catch (const std::exception& error) {
+        if (line.isWhole) {
+            leaveOut(error.what());
+        } else {
+            builder_.recording().truncated = true;
         }
-    }
-    for (const auto& [port, state] : states) {
-        if (portStates_[port] != state) {
-            recording_.portChanges.add({seconds_, port, state});
-        }
-    }
-    for (const auto& [port, state] : portStates_) {
-        if (!state.empty() && states.count(port) == 0) {
-            recording_.portChanges.add({seconds_, port, ""});
-        }
-    }
-    portStates_ = std::move(states);
-}
-
-void RecordingReader::takeProblem(const std::string& kind, const Json& line) {
-    const auto text = problemText(kind, line);
-    recording_.problems.add({seconds_, kind, text});
-    if (kind == "error") {
-        ++recording_.errors;
-    } else if (kind == "warning") {
-        ++recording_.warnings;
-    } else if (kind == "refused") {
-        ++recording_.refused;
-    } else if (kind == "cause") {
-        ++recording_.errors;
-        recording_.cause = text;
-    } else if (kind == "mend") {
-        recording_.mend = text;
     }
 }
 
-void RecordingReader::takeOther(const std::string& event, const Json& line) {
-    if (event == "loaded") {
-        if (!recording_.plugInFile.empty()) {
-            throw std::runtime_error("another recording begins");
+void RecordingReader::takeText(std::string_view text) {
+    // Nearly all lines are pairs behind other lines.
+    if (hasEvent_) {
+        if (const auto pair = parsePairLine(text)) {
+            follow({pair->t, pair->time});
+            builder_.takePair(*pair, axis_.seconds());
+            return;
         }
-        recording_.plugIn = line.at("name").get<std::string>();
-        recording_.plugInFile = line.at("library").get<std::string>();
-    } else if (event == "initialised") {
-        recording_.configuration = line.at("configuration");
-    } else if (event == "epoch-offset") {
-        ++recording_.epochOffsets;
-        recording_.epochOffset = line.at("offset").get<std::int64_t>();
-        filter_.epochOffset(recording_.epochOffset);
-    } else if (event == "chrony") {
-        recording_.chrony = ChronyCount{line.at("sent").get<std::uint64_t>(),
-                                        line.at("failed").get<std::uint64_t>()};
-    } else if (event == "stopping") {
-        recording_.stopCause = line.at("cause").get<std::string>();
-    } else if (event == "summary") {
-        recording_.summarised = true;
     }
+    const Json line = parsed(text);
+    const auto& event = line.at("event").get_ref<const std::string&>();
+    if (event == "pair") {
+        const auto pair = pairOf(line);
+        place(event, line, momentOf(line));
+        builder_.takePair(pair, axis_.seconds());
+    } else {
+        place(event, line, momentOf(line));
+        builder_.take(event, line, axis_.seconds());
+    }
+}
+
+void RecordingReader::place(const std::string& event, const Json& line, const Moment& moment) {
+    if (event == "continued") {
+        takeContinued(line, moment);
+    } else if (builder_.recording().runs == 0) {
+        beginRun(moment, beginOf(moment), true);
+    } else if (event == "loaded" || (!hasEvent_ && !axis_.mayFollow(moment))) {
+        beginRun(moment, beginOf(moment), event == "loaded");
+    } else {
+        follow(moment);
+    }
+}
+
+void RecordingReader::follow(const Moment& moment) {
+    const double set = axis_.follow(moment);
+    if (set != 0) {
+        tell(clockText(set));
+    }
+}
+
+void RecordingReader::beginRun(const Moment& moment, std::uint64_t begin, bool fromStart) {
+    auto& recording = builder_.recording();
+    const double end = axis_.seconds();
+    const double passed = axis_.begin(moment, fromStart);
+    if (recording.runs > 0) {
+        builder_.interrupt(end);
+        recording.gaps.add({end, axis_.seconds() - end, pauseText(passed, recording.summarised)});
+    }
+    ++recording.runs;
+    recording.summarised = false;
+    recording.stopCause.clear();
+    recording.cause.clear();
+    recording.mend.clear();
+    runBegin_ = begin;
+    part_ = 0;
+}
+
+/// What was told before counts where a part is missing.
+void RecordingReader::takeContinued(const Json& line, const Moment& moment) {
+    const auto begin = line.at("begin").get<std::uint64_t>();
+    const auto part = line.at("part").get<std::uint64_t>();
+    const double end = axis_.seconds();
+    const bool isSameRun = builder_.recording().runs > 0 && begin == runBegin_;
+    if (isSameRun) {
+        follow(moment);
+    } else {
+        beginRun(moment, begin, false);
+    }
+    const auto missing = part - std::min(part, isSameRun ? part_ + 1 : 0);
+    part_ = part;
+    if (missing == 0) {
+        return;
+    }
+    builder_.interrupt(end);
+    tell(fmt::format("{} of the run's files {} missing", missing, missing == 1 ? "is" : "are"),
+         axis_.seconds() - end);
+    for (const auto& before : line.at("before")) {
+        builder_.takeOld(before.at("event").get<std::string>(), before, axis_.seconds());
+    }
+}
+
+/// @param length of what ends now, seconds
+void RecordingReader::tell(const std::string& text, double length) {
+    builder_.recording().gaps.add({axis_.seconds() - length, length, text});
+}
+
+void RecordingReader::leaveOut(const std::string& problem) {
+    const auto where = fmt::format("{}:{}: ", name_, lineNumber_);
+    if (firstProblem_.empty()) {
+        firstProblem_ = where + "this is no record of vantel-host: " + problem;
+    }
+    tell(where + "this line is no event: " + problem);
 }
 
 } // namespace vantelhost

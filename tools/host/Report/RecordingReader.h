@@ -1,40 +1,50 @@
 /// @file
 #pragma once
 
+#include <cstdint>
 #include <istream>
-#include <map>
 #include <string>
-#include <utility>
+#include <string_view>
 
-#include "PairFilter.h"
-#include "Report/Recording.h"
+#include "Json.h"
+#include "Moment.h"
+#include "Report/LineReader.h"
+#include "Report/RecordAxis.h"
+#include "Report/RecordingBuilder.h"
 
 namespace vantelhost {
 
-/// Reads a record of "run --record", line by line. Events and members that it does not know are
-/// passed over.
+/// Reads a record of "run --record": one file, or several in their order, each with a run, a part
+/// of one, or several. Lines that are no events are left out and told as gaps.
 class RecordingReader {
 public:
-    /// A last line without its end may be cut.
+    /// Throws UsageError for a file that has lines but no event, and when reading fails.
     /// @param name of the stream, for people
-    /// Throws UsageError for a line that is none of a record, and when reading fails.
-    static Recording read(std::istream& stream, const std::string& name);
+    void read(std::istream& stream, const std::string& name);
+
+    /// There are no more files. To be called once.
+    Recording finish();
 
 private:
-    void take(const Json& line);
-    void takeMoment(const Json& line);
-    void takePair(const Json& line);
-    void takeQuality(const Json& line);
-    void takeMetadata(const Json& line);
-    void takePorts(const Json& metadata);
-    void takeProblem(const std::string& kind, const Json& line);
-    void takeOther(const std::string& event, const Json& line);
+    void beginFile(const std::string& name);
+    void endFile() const;
+    void takeLine(const LineReader::Line& line);
+    void takeText(std::string_view text);
+    void place(const std::string& event, const Json& line, const Moment& moment);
+    void follow(const Moment& moment);
+    void beginRun(const Moment& moment, std::uint64_t begin, bool fromStart);
+    void takeContinued(const Json& line, const Moment& moment);
+    void tell(const std::string& text, double length = 0);
+    void leaveOut(const std::string& problem);
 
-    Recording recording_;
-    PairFilter filter_;
-    double seconds_ = 0;                              ///< of the present line
-    std::pair<std::string, std::string> lastQuality_; ///< with its reason
-    std::map<std::string, std::string> portStates_;
+    RecordingBuilder builder_;
+    RecordAxis axis_;
+    std::string name_;
+    std::uint64_t lineNumber_ = 0;
+    bool hasEvent_ = false;      ///< this file
+    std::string firstProblem_;   ///< of this file
+    std::uint64_t runBegin_ = 0; ///< what tells the present run from others
+    std::uint64_t part_ = 0;     ///< of it
 };
 
 } // namespace vantelhost

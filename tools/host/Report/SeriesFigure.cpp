@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <vector>
 
 #include <fmt/format.h>
 
@@ -38,9 +39,8 @@ private:
 };
 
 /// The points of a line. One between two gaps becomes a dot: a line of no visible length.
-std::string lineData(const Series& series, const TimeAxis& axis, const ValueAxis& values,
-                     double dot) {
-    const auto& points = series.points;
+std::string lineData(const std::vector<Point>& points, double gap, const TimeAxis& axis,
+                     const ValueAxis& values, double dot) {
     std::string data;
     bool alone = true;
     for (std::size_t i = 0; i < points.size(); ++i) {
@@ -48,7 +48,7 @@ std::string lineData(const Series& series, const TimeAxis& axis, const ValueAxis
             data += fmt::format("{:.9g} {:.12g}\n", axis.at(x), values.at(points[i].y));
         };
         add(points[i].x);
-        if (i + 1 < points.size() && points[i + 1].x - points[i].x <= series.gap) {
+        if (i + 1 < points.size() && points[i + 1].x - points[i].x <= gap) {
             alone = false;
             continue;
         }
@@ -93,12 +93,11 @@ std::string extremesData(const std::vector<Stretch>& stretches, const TimeAxis& 
 
 /// Where values are beyond the edge, no closer than can be told apart.
 /// @param sign 1: above, -1: below
-std::string edgeData(const Series& series, const TimeAxis& axis, const ValueAxis& values, int sign,
-                     double distance) {
-    const double edge = sign > 0 ? series.range.high : series.range.low;
+std::string edgeData(const std::vector<Point>& points, double edge, const TimeAxis& axis,
+                     const ValueAxis& values, int sign, double distance) {
     std::string data;
     double next = 0;
-    for (const auto& point : series.points) {
+    for (const auto& point : points) {
         if ((point.y - edge) * sign > 0 && point.x >= next) {
             data += fmt::format("{:.9g} {:.12g}\n", axis.at(point.x), values.at(edge));
             next = point.x + distance;
@@ -113,14 +112,15 @@ struct Drawn {
     std::string plots;
 };
 
-Drawn line(const Series& series, const TimeAxis& axis, const ValueAxis& values) {
+Drawn line(const Series& series, const SeriesStyle& style, const TimeAxis& axis,
+           const ValueAxis& values) {
     const double dot = axis.pixel(canvases.front()) / 2;
-    return {fmt::format("$data << END\n{}END\n", lineData(series, axis, values, dot)),
+    return {fmt::format("$data << END\n{}END\n",
+                        lineData(series.points(), style.gap, axis, values, dot)),
             R"($data with lines lc rgb "#2b6cb0")"};
 }
 
-Drawn bands(const Series& series, const TimeAxis& axis, const ValueAxis& values) {
-    const auto stretches = distribution(series.points, bandStretches);
+Drawn bands(const std::vector<Stretch>& stretches, const TimeAxis& axis, const ValueAxis& values) {
     return {
         fmt::format("$data << END\n{}END\n$extremes << END\n{}END\n",
                     bandData(stretches, axis, values), extremesData(stretches, axis, values)),
@@ -129,10 +129,25 @@ Drawn bands(const Series& series, const TimeAxis& axis, const ValueAxis& values)
         R"($data using 1:5 with lines lc rgb "#2b6cb0", $extremes with lines lc rgb "#2b6cb0")"};
 }
 
+/// Where values may be beyond an edge: all points, or the extremes of stretches.
+std::vector<Point> extremePoints(const Series& series, const std::vector<Stretch>& stretches) {
+    if (series.isWhole()) {
+        return series.points();
+    }
+    std::vector<Point> points;
+    for (const auto& stretch : stretches) {
+        const double middle = (stretch.begin + stretch.end) / 2;
+        points.push_back({middle, stretch.values.front()});
+        points.push_back({middle, stretch.values.back()});
+    }
+    return points;
+}
+
 /// Marks where values are beyond the edges.
-Drawn edges(const Series& series, const TimeAxis& axis, const ValueAxis& values, double distance) {
-    const auto above = edgeData(series, axis, values, 1, distance);
-    const auto below = edgeData(series, axis, values, -1, distance);
+Drawn edges(const std::vector<Point>& points, const Extent& range, const TimeAxis& axis,
+            const ValueAxis& values, double distance) {
+    const auto above = edgeData(points, range.high, axis, values, 1, distance);
+    const auto below = edgeData(points, range.low, axis, values, -1, distance);
     return {
         fmt::format("$above << END\n{}END\n$below << END\n{}END\n", above, below),
         std::string(above.empty() ? "" : R"(, $above with points pt 9 ps 0.6 lc rgb "#d9480f")") +
@@ -141,16 +156,16 @@ Drawn edges(const Series& series, const TimeAxis& axis, const ValueAxis& values,
 
 } // namespace
 
-bool areBands(std::size_t points) {
-    return points > 3000;
-}
-
-std::string seriesFigure(const Caption& caption, const Series& series, const TimeAxis& axis) {
-    const ValueAxis values(series.range);
+std::string seriesFigure(const Caption& caption, const Series& series, const SeriesStyle& style,
+                         const TimeAxis& axis) {
+    const ValueAxis values(style.range);
+    const auto stretches =
+        series.isWhole() ? std::vector<Stretch>() : series.distribution().stretches();
     const auto drawn =
-        areBands(series.points.size()) ? bands(series, axis, values) : line(series, axis, values);
+        series.isWhole() ? line(series, style, axis, values) : bands(stretches, axis, values);
+    const auto extremes = extremePoints(series, stretches);
     return draw(caption, 300, [&](const Canvas& canvas) {
-        const auto marks = edges(series, axis, values, 6 * axis.pixel(canvas));
+        const auto marks = edges(extremes, style.range, axis, values, 6 * axis.pixel(canvas));
         return axis.commands(canvas) + values.commands(caption.name) + drawn.data + marks.data +
                "plot " + drawn.plots + marks.plots + "\n";
     });

@@ -18,16 +18,30 @@ double roundWidth(double width) {
     return 10 * power;
 }
 
-Extent bulk(const std::vector<std::int64_t>& sorted) {
-    constexpr std::size_t few = 3;
-    const auto count = sorted.size();
-    const auto first = static_cast<double>(sorted.front());
-    const auto last = static_cast<double>(sorted.back());
+std::int64_t percentile(const ValueCounts& values, unsigned perMille) {
+    const std::uint64_t number = (perMille * values.size() + 999) / 1000;
+    return values.at(number == 0 ? 0 : number - 1);
+}
+
+Extent bulk(const ValueCounts& values) {
+    constexpr std::uint64_t few = 3;
+    const auto count = values.size();
     const auto out = std::max(count / 1000, std::min(few, count / 10));
-    const auto low = static_cast<double>(sorted[out]);
-    const auto high = static_cast<double>(sorted[count - 1 - out]);
+    const auto low = static_cast<double>(values.at(out));
+    const auto high = static_cast<double>(values.at(count - 1 - out));
     const double margin = std::max((high - low) / 4, 10.0);
-    return {std::max(first, low - margin), std::min(last, high + margin)};
+    return {std::max(static_cast<double>(values.smallest()), low - margin),
+            std::min(static_cast<double>(values.largest()), high + margin)};
+}
+
+Outliers outliers(const ValueCounts& values, const Extent& extent) {
+    Outliers result;
+    for (const auto& [value, count] : values.rows()) {
+        const auto number = static_cast<double>(value);
+        result.below += number < extent.low ? count : 0;
+        result.above += number > extent.high ? count : 0;
+    }
+    return result;
 }
 
 double baseOf(const Extent& extent) {
@@ -36,8 +50,8 @@ double baseOf(const Extent& extent) {
     return (extent.high - extent.low) * shownParts < largest ? std::floor(extent.low) : 0;
 }
 
-Histogram histogram(const std::vector<std::int64_t>& sorted, std::size_t bins) {
-    const auto [low, high] = bulk(sorted);
+Histogram histogram(const ValueCounts& values, std::size_t bins) {
+    const auto [low, high] = bulk(values);
     Histogram result;
     result.width = roundWidth((high - low) / static_cast<double>(bins));
     result.low = std::floor(low / result.width) * result.width;
@@ -45,14 +59,14 @@ Histogram histogram(const std::vector<std::int64_t>& sorted, std::size_t bins) {
         return static_cast<std::size_t>((value - result.low) / result.width);
     };
     result.counts.resize(binOf(high) + 1);
-    for (const auto value : sorted) {
+    for (const auto& [value, count] : values.rows()) {
         const auto number = static_cast<double>(value);
         if (number < result.low) {
-            ++result.below;
+            result.below += count;
         } else if (binOf(number) >= result.counts.size()) {
-            ++result.above;
+            result.above += count;
         } else {
-            ++result.counts[binOf(number)];
+            result.counts[binOf(number)] += count;
         }
     }
     return result;

@@ -6,18 +6,14 @@
 #include <cstdint>
 #include <vector>
 
+#include "Report/ValueCounts.h"
+
 namespace vantelhost {
 
 /// The smallest of the values that at least so many thousandths of all do not exceed.
-/// @param sorted   ascending, not empty
+/// @param values   not empty
 /// @param perMille 0 to 1000; 500 is the median.
-template <typename Number>
-Number percentile(const std::vector<Number>& sorted, unsigned perMille) {
-    // Of some millions the product is beyond 32 bits.
-    const auto rank =
-        static_cast<std::size_t>((std::uint64_t{perMille} * sorted.size() + 999) / 1000);
-    return sorted[rank == 0 ? 0 : rank - 1];
-}
+std::int64_t percentile(const ValueCounts& values, unsigned perMille);
 
 struct Extent {
     double low;
@@ -28,8 +24,16 @@ struct Extent {
 /// up to three, but no more than a tenth, does not count. It is then made wider by a quarter at
 /// each end, at least by 10, for the values that are not far away, but reaches no further than the
 /// values.
-/// @param sorted ascending, not empty
-Extent bulk(const std::vector<std::int64_t>& sorted);
+/// @param values not empty
+Extent bulk(const ValueCounts& values);
+
+/// How many values are outside.
+struct Outliers {
+    std::uint64_t below = 0;
+    std::uint64_t above = 0;
+};
+
+Outliers outliers(const ValueCounts& values, const Extent& extent);
 
 /// What to take away from values of this extent, so that few digits tell them apart: their lowest,
 /// or 0 if it needs not be. So a difference of nanoseconds is seen behind an epoch offset.
@@ -42,14 +46,14 @@ double roundWidth(double width);
 struct Histogram {
     double low = 0;   ///< where the first bin begins
     double width = 1; ///< 1, 2 or 5 times a power of ten
-    std::vector<std::size_t> counts;
-    std::size_t below = 0; ///< values left of all bins
-    std::size_t above = 0; ///< values right of all bins
+    std::vector<std::uint64_t> counts;
+    std::uint64_t below = 0; ///< values left of all bins
+    std::uint64_t above = 0; ///< values right of all bins
 };
 
 /// The bins are where the bulk of the values is.
-/// @param sorted ascending, not empty
+/// @param values not empty
 /// @param bins   about how many at most
-Histogram histogram(const std::vector<std::int64_t>& sorted, std::size_t bins);
+Histogram histogram(const ValueCounts& values, std::size_t bins);
 
 } // namespace vantelhost

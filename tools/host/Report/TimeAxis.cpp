@@ -9,7 +9,8 @@
 namespace vantelhost {
 
 TimeAxis::TimeAxis(const Recording& recording)
-    : begin_(recording.begin),
+    : origin_(recording.runs > 1 ? "record's begin" : "host's start"),
+      begin_(recording.begin),
       duration_(std::max(recording.duration, 1e-6)),
       unit_(unitForDuration(recording.duration)),
       outages_(outages(recording)) {}
@@ -17,9 +18,9 @@ TimeAxis::TimeAxis(const Recording& recording)
 std::string TimeAxis::commands(const Canvas& canvas) const {
     const auto step = roundStep(duration_, canvas.texts);
     const double end = at(duration_);
-    return fmt::format("set xlabel \"time since the host's start in {}\"\n"
+    return fmt::format("set xlabel \"time since the {} in {}\"\n"
                        "set xrange [0:{:.9g}]\nset x2range [0:{:.9g}]\n",
-                       unit_.name, end, end) +
+                       origin_, unit_.name, end, end) +
            // Below its smallest step gnuplot finds a better one.
            (step > 1 ? fmt::format("set xtics {:.9g}\n", at(static_cast<double>(step))) : "") +
            wallClock(step) + shades(canvas);

@@ -11,7 +11,7 @@
 
 namespace vantelhost {
 
-/// The axis that all drawings over time have: below the time since the host's start, above the
+/// The axis that all drawings over time have: below the time since the beginning, above the
 /// time of day. Outages are shaded.
 class TimeAxis {
 public:
@@ -20,7 +20,7 @@ public:
     /// What gnuplot is told before it draws over this axis.
     std::string commands(const Canvas& canvas) const;
 
-    /// Where seconds since the host's start are, as gnuplot counts.
+    /// Where seconds are, as gnuplot counts.
     double at(double seconds) const { return seconds * 1e9 / unit_.size; }
 
     /// Seconds as wide as a pixel.
@@ -30,6 +30,7 @@ private:
     std::string wallClock(std::int64_t step) const;
     std::string shades(const Canvas& canvas) const;
 
+    const char* origin_;
     std::uint64_t begin_; ///< nanoseconds since 1970
     double duration_;     ///< seconds
     Unit unit_;

@@ -24,19 +24,34 @@ double endOf(const First<Change>& changes, const Recording& recording) {
     return changes.fullSince().value_or(recording.duration);
 }
 
-} // namespace
-
-TimeLine qualityTimeLine(const Recording& recording) {
+/// A row for each state; times in which none is known are left out.
+template <typename Label>
+TimeLine stateTimeLine(const First<StateChange>& states, const Recording& recording, Label label) {
     TimeLine timeLine;
-    const auto& changes = recording.qualities.items();
+    const auto& changes = states.items();
     for (std::size_t i = 0; i < changes.size(); ++i) {
         const auto& change = changes[i];
         const double end =
-            i + 1 < changes.size() ? changes[i + 1].seconds : endOf(recording.qualities, recording);
-        timeLine.spans.push_back({rowNumber(timeLine, change.quality), change.seconds, end,
-                                  change.quality + ": " + change.reason});
+            i + 1 < changes.size() ? changes[i + 1].seconds : endOf(states, recording);
+        if (!change.state.empty()) {
+            timeLine.spans.push_back(
+                {rowNumber(timeLine, change.state), change.seconds, end, label(change)});
+        }
     }
     return timeLine;
+}
+
+} // namespace
+
+TimeLine qualityTimeLine(const Recording& recording) {
+    return stateTimeLine(recording.qualities, recording, [](const StateChange& change) {
+        return change.state + ": " + change.reason;
+    });
+}
+
+TimeLine healthTimeLine(const Recording& recording) {
+    return stateTimeLine(recording.healths, recording,
+                         [](const StateChange& change) { return change.state; });
 }
 
 TimeLine portTimeLine(const Recording& recording) {

@@ -10,7 +10,7 @@
 
 namespace vantelhost {
 
-/// Times in seconds since the host's start.
+/// Times in seconds on the axis of the recording.
 struct Span {
     std::size_t row;
     double begin;
@@ -25,6 +25,9 @@ struct TimeLine {
 
 /// A row for each quality; the label is the quality with its reason.
 TimeLine qualityTimeLine(const Recording& recording);
+
+/// A row for each health, which is the label.
+TimeLine healthTimeLine(const Recording& recording);
 
 /// A row for each port; the label is its state.
 TimeLine portTimeLine(const Recording& recording);

@@ -31,7 +31,7 @@ struct Colour {
     unsigned value;
 };
 
-constexpr std::array<Colour, 14> colours{{
+constexpr std::array<Colour, 22> colours{{
     {"usable: PTP role has changed.", 0x2A9D4A},
     {"unusable: PTP role has changed.", 0x8E5EA2},
     {"unusable: Waiting for ptp4l status", 0x9AA0A6},
@@ -48,6 +48,14 @@ constexpr std::array<Colour, 14> colours{{
     {"PTP_PRE_MASTER", 0x6AAED6},
     {"PTP_INITIALIZING", 0xC9B458},
     {"PTP_DISABLED", 0x606468},
+    {"locked", 0x2A9D4A},
+    {"recovered", 0x8FBF3F},
+    {"starting", 0x9AA0A6},
+    {"stopping", 0x606468},
+    {"stale", 0xE08E0B},
+    {"unmeasured", 0x3B7DD8},
+    {"lost", 0x8E5EA2},
+    {"dead", 0xC0392B},
 }};
 
 /// For labels that are not in the table, by their number.

@@ -1,79 +1,42 @@
 #include "Report/AllanDeviation.h"
 
 #include <cmath>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 using namespace vantelhost;
-using testing::ElementsAre;
 
 namespace {
 
 constexpr std::uint64_t second = 1000000000;
 
-std::vector<std::int64_t> slotsOf(const PhaseSeries& series) {
-    std::vector<std::int64_t> slots;
-    for (const auto& sample : series.samples) {
-        slots.push_back(sample.slot);
+/// Of one sample a second, without gaps.
+std::vector<Deviation> everySecond(const std::vector<double>& phases) {
+    AllanDeviation deviation;
+    for (std::size_t i = 0; i < phases.size(); ++i) {
+        deviation.add({static_cast<std::int64_t>(i), phases[i]});
     }
-    return slots;
+    return deviation.deviations(1);
 }
 
-/// One sample a second, without gaps.
-PhaseSeries everySecond(const std::vector<double>& phases) {
-    PhaseSeries series;
-    series.interval = 1;
-    for (const auto phase : phases) {
-        series.samples.push_back({static_cast<std::int64_t>(series.samples.size()), phase});
+/// Phases that a sum of sines has.
+double wave(int i) {
+    return 50 * std::sin(i * 0.01) + 7 * std::sin(i * 1.3) + i * 0.001;
+}
+
+/// The definition, with all second differences.
+double definition(int samples, int steps) {
+    double squares = 0;
+    for (int i = 0; i + 2 * steps < samples; ++i) {
+        const double difference = wave(i + 2 * steps) - 2 * wave(i + steps) + wave(i);
+        squares += difference * difference;
     }
-    return series;
+    return std::sqrt(squares / (2.0 * steps * steps * (samples - 2 * steps))) * 1e-9;
 }
 
 } // namespace
-
-TEST(PhaseGrid, IntervalIsTheMeanDistanceOfNeighbours) {
-    const auto series = onGrid({1000, 2000, 3010, 4010}, {5, 6, 7, 9});
-    EXPECT_NEAR(series.interval, 1003.3333333e-9, 1e-15);
-    EXPECT_THAT(slotsOf(series), ElementsAre(0, 1, 2, 3));
-    EXPECT_EQ(series.missing, 0);
-    EXPECT_EQ(series.samples[3].phase - series.samples[0].phase, 4);
-}
-
-TEST(PhaseGrid, MissedSyncsLeaveSlotsEmptyAndDoNotCountForTheInterval) {
-    const auto series = onGrid({0, 1000, 3000, 4000, 5000, 9000, 10000}, {1, 2, 3, 4, 5, 6, 7});
-    EXPECT_NEAR(series.interval, 1000e-9, 1e-15);
-    EXPECT_THAT(slotsOf(series), ElementsAre(0, 1, 3, 4, 5, 9, 10));
-    EXPECT_EQ(series.missing, 4);
-}
-
-TEST(PhaseGrid, UnevenDistancesDoNotAddUp) {
-    // 4 % slow for 30 samples, then fast: each is a neighbour of the one before.
-    std::vector<std::uint64_t> times{0};
-    for (int i = 0; i < 60; ++i) {
-        times.push_back(times.back() + (i < 30 ? 1040 : 960));
-    }
-    const auto series = onGrid(times, std::vector<std::int64_t>(times.size()));
-    EXPECT_EQ(series.samples.back().slot, 60);
-    EXPECT_EQ(series.missing, 0);
-}
-
-TEST(PhaseGrid, AClockThatIsSetBackGoesToTheNextSlot) {
-    const auto series = onGrid({5000, 6000, 2000, 3000}, {0, 0, 0, 0});
-    EXPECT_THAT(slotsOf(series), ElementsAre(0, 1, 2, 3));
-}
-
-TEST(PhaseGrid, TimesAndOffsetsMayWrapAround) {
-    const auto series = onGrid({UINT64_MAX - 999, 0, 1000}, {INT64_MAX, INT64_MIN, INT64_MIN + 1});
-    EXPECT_THAT(slotsOf(series), ElementsAre(0, 1, 2));
-    EXPECT_EQ(series.samples[2].phase, 2);
-}
-
-TEST(PhaseGrid, NeedsTwoTimesThatDiffer) {
-    EXPECT_TRUE(onGrid({}, {}).samples.empty());
-    EXPECT_TRUE(onGrid({1}, {1}).samples.empty());
-    EXPECT_TRUE(onGrid({1, 1}, {1, 2}).samples.empty());
-}
 
 TEST(AllanDeviation, OfASquareGrowsWithTheRootOfTwoTimesTheSteps) {
     // The second difference of i^2 over m steps is 2 m^2, everywhere.
@@ -81,7 +44,7 @@ TEST(AllanDeviation, OfASquareGrowsWithTheRootOfTwoTimesTheSteps) {
     for (int i = 0; i < 17; ++i) {
         phases.push_back(i * i);
     }
-    const auto deviations = allanDeviations(everySecond(phases));
+    const auto deviations = everySecond(phases);
     ASSERT_EQ(deviations.size(), 3U);
     EXPECT_EQ(deviations[0].tau, 1);
     EXPECT_NEAR(deviations[0].value, 1.41421356e-9, 1e-16);
@@ -96,13 +59,13 @@ TEST(AllanDeviation, OfASquareGrowsWithTheRootOfTwoTimesTheSteps) {
 
 TEST(AllanDeviation, OfFiveKnownPhases) {
     // Second differences 3, -5, 4: the mean of the squares is 50 / 3, its half 25 / 3.
-    const auto deviations = allanDeviations(everySecond({0, 1, 5, 4, 7}));
+    const auto deviations = everySecond({0, 1, 5, 4, 7});
     ASSERT_EQ(deviations.size(), 1U);
     EXPECT_NEAR(deviations[0].value, 2.88675135e-9, 1e-16);
 }
 
 TEST(AllanDeviation, OfAConstantFrequencyIsNothing) {
-    const auto deviations = allanDeviations(everySecond({0, 3, 6, 9, 12, 15, 18, 21}));
+    const auto deviations = everySecond({0, 3, 6, 9, 12, 15, 18, 21});
     ASSERT_EQ(deviations.size(), 2U);
     EXPECT_EQ(deviations[0].value, 0);
     EXPECT_EQ(deviations[1].value, 0);
@@ -110,9 +73,11 @@ TEST(AllanDeviation, OfAConstantFrequencyIsNothing) {
 
 TEST(AllanDeviation, LeavesOutWhatNeedsAMissingSample) {
     // Slot 4 is missing: of 0 to 8 the differences that begin at 2, 3 and 4 for one step.
-    auto series = everySecond({0, 1, 4, 9, 99, 25, 36, 49, 64});
-    series.samples.erase(series.samples.begin() + 4);
-    const auto deviations = allanDeviations(series);
+    AllanDeviation deviation;
+    for (const int i : {0, 1, 2, 3, 5, 6, 7, 8}) {
+        deviation.add({i, static_cast<double>(i * i)});
+    }
+    const auto deviations = deviation.deviations(1);
     ASSERT_EQ(deviations.size(), 2U);
     EXPECT_EQ(deviations[0].terms, 4U);
     EXPECT_NEAR(deviations[0].value, 1.41421356e-9, 1e-16);
@@ -122,19 +87,61 @@ TEST(AllanDeviation, LeavesOutWhatNeedsAMissingSample) {
 }
 
 TEST(AllanDeviation, IntervalComesFromTheGrid) {
-    std::vector<std::uint64_t> times;
-    std::vector<std::int64_t> offsets;
+    AllanDeviation deviation;
+    PhaseGrid grid([&](const PhaseSample& sample) { deviation.add(sample); });
     for (int i = 0; i < 9; ++i) {
-        times.push_back(7 * second + static_cast<std::uint64_t>(i) * second / 8);
-        offsets.push_back(-917 + i * i);
+        grid.add(7 * second + static_cast<std::uint64_t>(i) * second / 8, -917 + i * i);
     }
-    const auto deviations = allanDeviations(onGrid(times, offsets));
+    grid.flush();
+    const auto deviations = deviation.deviations(grid.interval());
     ASSERT_EQ(deviations.size(), 2U);
     EXPECT_NEAR(deviations[0].tau, 0.125, 1e-12);
     EXPECT_NEAR(deviations[0].value, 11.3137085e-9, 1e-15);
 }
 
 TEST(AllanDeviation, OfTooLittleIsNotThere) {
-    EXPECT_TRUE(allanDeviations({}).empty());
-    EXPECT_TRUE(allanDeviations(everySecond({1, 2, 3})).empty());
+    EXPECT_TRUE(everySecond({}).empty());
+    EXPECT_TRUE(everySecond({1, 2, 3}).empty());
+}
+
+TEST(AllanDeviation, NothingIsComparedAcrossABeginning) {
+    AllanDeviation deviation;
+    for (int i = 0; i < 20; ++i) {
+        // 0 to 9 are of another clock than 10 to 19.
+        deviation.add({i, i < 10 ? i * i : 1e9 + i * i, i == 10});
+    }
+    const auto deviations = deviation.deviations(1);
+    ASSERT_EQ(deviations.size(), 3U);
+    EXPECT_EQ(deviations[0].terms, 16U);
+    EXPECT_NEAR(deviations[0].value, 1.41421356e-9, 1e-16);
+    EXPECT_EQ(deviations[2].terms, 4U);
+    EXPECT_NEAR(deviations[2].value, 5.65685425e-9, 1e-16);
+}
+
+TEST(AllanDeviation, UpTo1024StepsIsThatOfAllSecondDifferences) {
+    std::vector<double> phases;
+    for (int i = 0; i < 20000; ++i) {
+        phases.push_back(wave(i));
+    }
+    const auto deviations = everySecond(phases);
+    ASSERT_EQ(deviations.size(), 13U);
+    for (std::size_t octave = 0; octave <= 10; ++octave) {
+        const int steps = 1 << octave;
+        EXPECT_EQ(deviations[octave].terms, 20000U - 2U * static_cast<unsigned>(steps));
+        EXPECT_NEAR(deviations[octave].value / definition(20000, steps), 1, 1e-9) << steps;
+    }
+}
+
+TEST(AllanDeviation, BeyondThatThousandStartsInEachTimeAreAsGood) {
+    std::vector<double> phases;
+    for (int i = 0; i < 20000; ++i) {
+        phases.push_back(wave(i));
+    }
+    const auto deviations = everySecond(phases);
+    ASSERT_EQ(deviations.size(), 13U);
+    // Each second slot, and each fourth one.
+    EXPECT_EQ(deviations[11].terms, (20000U - 2 * 2048) / 2);
+    EXPECT_EQ(deviations[12].terms, (20000U - 2 * 4096) / 4);
+    EXPECT_NEAR(deviations[11].value / definition(20000, 2048), 1, 0.01);
+    EXPECT_NEAR(deviations[12].value / definition(20000, 4096), 1, 0.01);
 }

@@ -4,24 +4,37 @@
 #include <gtest/gtest.h>
 
 using namespace vantelhost;
-using testing::Each;
 using testing::ElementsAre;
 
 namespace {
 
-/// From first to last, ascending.
-std::vector<std::int64_t> range(std::int64_t first, std::int64_t last) {
-    std::vector<std::int64_t> values;
-    for (auto value = first; value <= last; ++value) {
-        values.push_back(value);
+ValueCounts valuesOf(const std::vector<std::int64_t>& list) {
+    ValueCounts values;
+    for (const auto value : list) {
+        values.add(value);
     }
     return values;
+}
+
+/// From first to last.
+ValueCounts range(std::int64_t first, std::int64_t last) {
+    ValueCounts values;
+    for (auto value = first; value <= last; ++value) {
+        values.add(value);
+    }
+    return values;
+}
+
+void add(ValueCounts& values, int count, std::int64_t value) {
+    for (int i = 0; i < count; ++i) {
+        values.add(value);
+    }
 }
 
 } // namespace
 
 TEST(Percentile, IsTheSmallestValueThatSoManyDoNotExceed) {
-    const std::vector<std::int64_t> values{15, 20, 35, 40, 50};
+    const auto values = valuesOf({50, 15, 40, 20, 35});
     EXPECT_EQ(percentile(values, 0), 15);
     EXPECT_EQ(percentile(values, 50), 15);
     EXPECT_EQ(percentile(values, 200), 15);
@@ -40,15 +53,16 @@ TEST(Percentile, OfHundredValuesIsTheirNumber) {
 }
 
 TEST(Percentile, OfMillionsOfValuesNeedsMoreThan32Bits) {
-    std::vector<std::uint8_t> values(4300000, 0);
-    values.back() = 1;
+    ValueCounts values;
+    add(values, 4299999, 0);
+    values.add(1);
     EXPECT_EQ(percentile(values, 999), 0);
     EXPECT_EQ(percentile(values, 1000), 1);
 }
 
 TEST(Bulk, ASpikeOfThreeValuesDoesNotCount) {
     auto values = range(0, 399);
-    values.insert(values.end(), {5000000, 6000000, 7000000});
+    values.add(valuesOf({5000000, 6000000, 7000000}));
     const auto bulkOf = bulk(values);
     EXPECT_EQ(bulkOf.low, 0);
     EXPECT_EQ(bulkOf.high, 498);
@@ -56,8 +70,8 @@ TEST(Bulk, ASpikeOfThreeValuesDoesNotCount) {
 
 TEST(Bulk, IsAQuarterWiderThanTheThousandthPartsAtTheEnds) {
     auto values = range(-100000, 100000);
-    values.insert(values.begin(), 100, -1000000000);
-    values.insert(values.end(), 100, 1000000000);
+    add(values, 100, -1000000000);
+    add(values, 100, 1000000000);
     const auto bulkOf = bulk(values);
     EXPECT_EQ(bulkOf.low, -149850);
     EXPECT_EQ(bulkOf.high, 149850);
@@ -70,17 +84,24 @@ TEST(Bulk, ReachesNoFurtherThanTheValues) {
 }
 
 TEST(Bulk, OfFewValuesIsAll) {
-    const auto bulkOf = bulk({1, 2, 3, 4, 5, 6, 7, 8, 1000000});
+    const auto bulkOf = bulk(valuesOf({1, 2, 3, 4, 5, 6, 7, 8, 1000000}));
     EXPECT_EQ(bulkOf.low, 1);
     EXPECT_EQ(bulkOf.high, 1000000);
 }
 
 TEST(Bulk, OfEqualValuesAndASpikeIsWhatIsEqual) {
-    std::vector<std::int64_t> values(20, 250);
-    values.push_back(1000000);
+    ValueCounts values;
+    add(values, 20, 250);
+    values.add(1000000);
     const auto bulkOf = bulk(values);
     EXPECT_EQ(bulkOf.low, 250);
     EXPECT_EQ(bulkOf.high, 260);
+}
+
+TEST(Outliers, AreOutsideOfTheExtentNotAtItsEdge) {
+    const auto [below, above] = outliers(valuesOf({1, 2, 2, 3, 9, 10, 11, 12}), {2, 10});
+    EXPECT_EQ(below, 1U);
+    EXPECT_EQ(above, 2U);
 }
 
 TEST(Base, IsTakenAwayWhereDigitsWouldNotTellValuesApart) {
@@ -92,7 +113,7 @@ TEST(Base, IsTakenAwayWhereDigitsWouldNotTellValuesApart) {
 }
 
 TEST(Histogram, CountsEveryValueOnce) {
-    const auto result = histogram({-3, -1, 0, 0, 2, 5}, 9);
+    const auto result = histogram(valuesOf({-3, -1, 0, 0, 2, 5}), 9);
     EXPECT_EQ(result.low, -3);
     EXPECT_EQ(result.width, 1);
     EXPECT_THAT(result.counts, ElementsAre(1, 0, 1, 2, 0, 1, 0, 0, 1));
@@ -111,8 +132,7 @@ TEST(Histogram, HasBinsOfARoundWidthThatBeginAtAMultipleOfIt) {
 
 TEST(Histogram, FewValuesFarAwayAreOnlyCounted) {
     auto values = range(0, 999);
-    values.insert(values.begin(), -1000000);
-    values.insert(values.end(), {2000000, 3000000});
+    values.add(valuesOf({2000000, -1000000, 3000000}));
     const auto result = histogram(values, 60);
     EXPECT_EQ(result.below, 1U);
     EXPECT_EQ(result.above, 2U);
@@ -121,21 +141,22 @@ TEST(Histogram, FewValuesFarAwayAreOnlyCounted) {
 }
 
 TEST(Histogram, OfEqualValuesIsOneBin) {
-    const auto result = histogram({7, 7, 7}, 60);
+    const auto result = histogram(valuesOf({7, 7, 7}), 60);
     EXPECT_EQ(result.low, 7);
     EXPECT_THAT(result.counts, ElementsAre(3));
 }
 
 TEST(Histogram, OfEqualValuesButOneIsOneBin) {
-    std::vector<std::int64_t> values(1000, 0);
-    values.push_back(100);
+    ValueCounts values;
+    add(values, 1000, 0);
+    values.add(100);
     const auto result = histogram(values, 10);
     EXPECT_EQ(result.counts.front(), 1000U);
     EXPECT_EQ(result.above, 1U);
 }
 
 TEST(Histogram, TakesTheWholeRangeOfOffsets) {
-    const auto result = histogram({INT64_MIN, 0, INT64_MAX}, 60);
+    const auto result = histogram(valuesOf({INT64_MIN, 0, INT64_MAX}), 60);
     EXPECT_EQ(result.counts.front(), 1U);
     EXPECT_EQ(result.counts.back(), 1U);
     EXPECT_LE(result.counts.size(), 62U);

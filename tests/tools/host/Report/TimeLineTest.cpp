@@ -63,6 +63,28 @@ TEST(TimeLine, NeighboursThatAreNotUsableAreOneOutage) {
     EXPECT_THAT(outages(recording), ElementsAre(Span{0, 1, 4, ""}, Span{0, 7, 10, ""}));
 }
 
+TEST(TimeLine, NoStateIsKnownBetweenRuns) {
+    Recording recording;
+    recording.duration = 10;
+    recording.qualities.add({1, "unusable", "a"});
+    recording.qualities.keep({3, "", ""});
+    recording.qualities.add({6, "unusable", "a"});
+    EXPECT_THAT(qualityTimeLine(recording).spans,
+                ElementsAre(Span{0, 1, 3, "unusable: a"}, Span{0, 6, 10, "unusable: a"}));
+    EXPECT_THAT(outages(recording), ElementsAre(Span{0, 1, 3, ""}, Span{0, 6, 10, ""}));
+    EXPECT_EQ(recording.qualities.count(), 2U);
+}
+
+TEST(TimeLine, HealthHasARowForEachState) {
+    Recording recording;
+    recording.duration = 10;
+    recording.healths.add({1, "starting", ""});
+    recording.healths.add({3, "locked", "pairs arrive"});
+    const auto timeLine = healthTimeLine(recording);
+    EXPECT_THAT(timeLine.rows, ElementsAre("starting", "locked"));
+    EXPECT_THAT(timeLine.spans, ElementsAre(Span{0, 1, 3, "starting"}, Span{1, 3, 10, "locked"}));
+}
+
 TEST(TimeLine, OfNothingIsEmpty) {
     EXPECT_TRUE(qualityTimeLine({}).spans.empty());
     EXPECT_TRUE(outages({}).empty());

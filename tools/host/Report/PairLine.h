@@ -1,0 +1,28 @@
+/// @file
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string_view>
+
+#include "PairFilter.h"
+
+namespace vantelhost {
+
+/// A line of the event "pair".
+struct PairLine {
+    double t = 0;             ///< seconds since the host's start
+    std::uint64_t time = 0;   ///< nanoseconds since 1970
+    std::uint64_t local = 0;  ///< nanoseconds modulo 2^64
+    std::int64_t offset = 0;  ///< nanoseconds
+    std::string_view leftOut; ///< why it is no measurement, if the host said so
+};
+
+/// Reads the line if it is as "run --record" writes it, to the octet: nearly all lines are, and a
+/// reader of all JSON takes ten times as long.
+std::optional<PairLine> parsePairLine(std::string_view text);
+
+/// What the host judged; nothing when it did not.
+std::optional<PairKind> judgementOf(std::string_view leftOut);
+
+} // namespace vantelhost

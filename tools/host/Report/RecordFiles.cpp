@@ -1,0 +1,193 @@
+#include "Report/RecordFiles.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdint>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <map>
+#include <optional>
+#include <system_error>
+#include <utility>
+
+#include <fmt/format.h>
+
+#include "Json.h"
+#include "Moment.h"
+#include "RotatedName.h"
+#include "Text.h"
+#include "UsageError.h"
+
+namespace vantelhost {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+/// When a file begins: the start of its run, the seconds since then.
+using Key = std::pair<std::uint64_t, double>;
+
+struct File {
+    RecordSource source;
+    unsigned number = 0; ///< of the rotation
+    std::string firstLine;
+    std::optional<Key> key; ///< none when the first line is no event
+};
+
+/// All of one name, the oldest first.
+using Family = std::vector<File>;
+using Families = std::map<std::string, Family>;
+
+std::optional<Key> keyOf(const std::string& text) {
+    const Json line = Json::parse(text, nullptr, false);
+    if (!line.is_object() || !line.contains("event")) {
+        return std::nullopt;
+    }
+    try {
+        const Moment moment{line.at("t").get<double>(), line.at("time").get<std::uint64_t>()};
+        return Key{line.value("begin", beginOf(moment)), moment.seconds};
+    } catch (const Json::exception&) {
+        return std::nullopt;
+    }
+}
+
+/// The first line; nothing of a file that can be read only once, and of a line that is none.
+std::string firstLineOf(const std::string& path) {
+    constexpr std::streamsize longest = 1 << 20;
+    if (!fs::is_regular_file(path)) {
+        return "";
+    }
+    std::string line(static_cast<std::size_t>(longest), '\0');
+    std::ifstream stream(path, std::ios::binary);
+    stream.getline(line.data(), longest);
+    line.resize(stream.good() ? static_cast<std::size_t>(stream.gcount()) - 1 : 0);
+    return line;
+}
+
+File opened(const std::string& path, unsigned number) {
+    auto stream = std::make_unique<std::ifstream>(path, std::ios::binary);
+    if (!*stream) {
+        throw UsageError(fmt::format("cannot read {}: {}", path, errorText(errno)));
+    }
+    auto line = firstLineOf(path);
+    auto key = keyOf(line);
+    return {{path, std::move(stream)}, number, std::move(line), key};
+}
+
+bool hasKey(const Family& family) {
+    return std::any_of(family.begin(), family.end(),
+                       [](const File& file) { return file.key.has_value(); });
+}
+
+Key firstKey(const Family& family) {
+    return *std::find_if(family.begin(), family.end(), [](const File& file) {
+                return file.key.has_value();
+            })->key;
+}
+
+bool isSame(const File& a, const File& b) {
+    std::error_code ignored;
+    return fs::equivalent(a.source.path, b.source.path, ignored);
+}
+
+void add(Families& families, const std::string& path) {
+    const auto [base, number] = rotatedName(path);
+    families[base].push_back(opened(path, number));
+}
+
+std::vector<std::string> filesIn(const std::string& folder) {
+    std::vector<std::string> paths;
+    std::error_code error;
+    for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
+         entry.increment(error)) {
+        std::error_code ignored;
+        if (entry->is_regular_file(ignored)) {
+            paths.push_back(entry->path().string());
+        }
+    }
+    if (error) {
+        throw UsageError(fmt::format("cannot read {}: {}", folder, error.message()));
+    }
+    return paths;
+}
+
+/// A rotation that was cut short leaves one file with two names.
+void addFolder(Families& families, const std::string& folder) {
+    Families found;
+    for (const auto& path : filesIn(folder)) {
+        add(found, path);
+    }
+    bool isEmpty = true;
+    for (auto& [base, family] : found) {
+        if (!hasKey(family)) {
+            continue;
+        }
+        isEmpty = false;
+        auto& all = families[base];
+        for (auto& file : family) {
+            if (std::none_of(all.begin(), all.end(),
+                             [&](const File& each) { return isSame(each, file); })) {
+                all.push_back(std::move(file));
+            }
+        }
+    }
+    if (isEmpty) {
+        throw UsageError(fmt::format("there is no record in {}", folder));
+    }
+}
+
+void refuseTwice(const std::vector<File>& files) {
+    std::map<std::string, const File*> seen;
+    for (const auto& file : files) {
+        const auto [place, isNew] = seen.emplace(file.firstLine, &file);
+        const bool isAgain = !isNew && file.key;
+        if (isAgain) {
+            throw UsageError(fmt::format("{} and {} hold the same record",
+                                         place->second->source.path, file.source.path));
+        }
+    }
+}
+
+/// Takes the files out of the families.
+std::vector<File> inOrder(Families& families) {
+    std::vector<Family> all;
+    for (auto& [base, family] : families) {
+        std::stable_sort(family.begin(), family.end(),
+                         [](const File& a, const File& b) { return a.number > b.number; });
+        all.push_back(std::move(family));
+    }
+    if (std::all_of(all.begin(), all.end(), hasKey)) {
+        std::stable_sort(all.begin(), all.end(), [](const Family& a, const Family& b) {
+            return firstKey(a) < firstKey(b);
+        });
+    }
+    std::vector<File> files;
+    for (auto& family : all) {
+        std::move(family.begin(), family.end(), std::back_inserter(files));
+    }
+    return files;
+}
+
+} // namespace
+
+std::vector<RecordSource> openRecords(const std::vector<std::string>& paths) {
+    Families families;
+    for (const auto& path : paths) {
+        if (fs::is_directory(path)) {
+            addFolder(families, path);
+        } else {
+            add(families, path);
+        }
+    }
+    auto files = inOrder(families);
+    refuseTwice(files);
+    std::vector<RecordSource> sources;
+    sources.reserve(files.size());
+    for (auto& file : files) {
+        sources.push_back(std::move(file.source));
+    }
+    return sources;
+}
+
+} // namespace vantelhost
