@@ -158,6 +158,16 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
             {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
 }
 
+Event metricsEvent(const std::string& address, const std::string& problem) {
+    const bool listening = problem.empty();
+    std::string text = listening
+                           ? "served at " + address
+                           : fmt::format("not served at {}: {}; tried again", address, problem);
+    return {"metrics",
+            std::move(text),
+            {{"listening", listening}, {"address", address}, {"problem", problem}}};
+}
+
 Event folderEvent(const std::string& path) {
     return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
 }

@@ -49,6 +49,11 @@ Event refusedEvent(const std::string& function);
 /// @param problem why it does not; empty when it does.
 Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem);
 
+/// Whether metrics are served.
+/// @param address where
+/// @param problem why they are not; empty when they are.
+Event metricsEvent(const std::string& address, const std::string& problem);
+
 /// The host made a folder that was missing.
 Event folderEvent(const std::string& path);
 
