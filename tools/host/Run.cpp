@@ -49,8 +49,11 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
     if (!options_.chronySocket.empty()) {
         chrony_.emplace(options_.chronySocket);
         journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
-            return chrony_->take(reference, local);
+            return handToChrony(reference, local);
         });
+    }
+    if (options_.metrics) {
+        metrics_.emplace(*options_.metrics, begin_);
     }
 }
 
@@ -65,6 +68,14 @@ EventSink Run::output() {
     return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };
 }
 
+std::optional<Event> Run::handToChrony(std::uint64_t reference, std::uint64_t local) {
+    auto news = chrony_->take(reference, local);
+    if (metrics_) {
+        metrics_->takeChrony(chrony_->sent(), chrony_->failed());
+    }
+    return news;
+}
+
 int Run::execute() {
     const PlugIn plugIn(options_.pluginPath);
     journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
@@ -72,7 +83,7 @@ int Run::execute() {
     if (journal_.isClean() && readSchema(plugIn, schema)) {
         keepSessions(plugIn, completedSettings(schema));
     } else {
-        beginRecord();
+        beginOutputs();
     }
     if (chrony_) {
         journal_.note(chrony_->state());
@@ -122,7 +133,7 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
         fifo.emplace(options_.fifo,
                      options_.createFifo ? EpochFifo::Absent::create : EpochFifo::Absent::refuse);
     }
-    beginRecord();
+    beginOutputs();
     // Nothing is begun when the output or the record is lost already.
     if (!journal_.isClean()) {
         return;
@@ -140,19 +151,36 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
     }
 }
 
-void Run::beginRecord() {
+void Run::beginOutputs() {
     if (record_) {
         record_->begin();
         journal_.addOutput("record " + options_.recordFile,
                            EventPrinter(record_->descriptor(), Format::jsonLines));
     }
+    if (metrics_) {
+        journal_.addOutput("metrics", [this](const Event& event, const Moment& moment) {
+            metrics_->take(event, moment);
+            return true;
+        });
+    }
     journal_.outputsAreComplete();
+    attendMetrics();
+}
+
+void Run::attendMetrics() {
+    if (!metrics_) {
+        return;
+    }
+    if (const auto news = metrics_->attend()) {
+        journal_.note(*news);
+    }
 }
 
 void Run::turn() {
     if (view_) {
         view_->refresh();
     }
+    attendMetrics();
 }
 
 void Run::tellFailure() {

@@ -82,6 +82,17 @@ void addOutput(CLI::App& command, RunOptions& options) {
         .add_option("--chrony", options.chronySocket,
                     "Hand every time pair to chronyd's reference clock (refclock SOCK) here")
         ->type_name("SOCKET");
+    command
+        .add_option_function<std::string>(
+            "--metrics",
+            [&options](const std::string& text) {
+                options.metrics = parseListenAddress(text);
+                if (!options.metrics) {
+                    refuse("--metrics", "ADDRESS:PORT or [IPV6]:PORT, in numbers", text);
+                }
+            },
+            "Serve metrics to Prometheus here, over HTTP; port 0 is any that is free")
+        ->type_name("ADDRESS:PORT");
 }
 
 void addFifo(CLI::App& command, RunOptions& options) {

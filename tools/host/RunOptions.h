@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "BuiltPaths.h"
+#include "Metrics/ListenAddress.h"
 #include "SettingsOptions.h"
 
 namespace CLI {
@@ -28,6 +29,7 @@ struct RunOptions : SettingsOptions {
     bool plain = false;       ///< lines also on a terminal
     std::string recordFile;   ///< empty when nothing is recorded
     std::string chronySocket; ///< empty when chronyd gets nothing
+    std::optional<ListenAddress> metrics; ///< where they are served
     bool useFifo = false;
     bool createFifo = false;
     std::string fifo = builtEpochFifo;

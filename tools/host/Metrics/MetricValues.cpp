@@ -12,8 +12,8 @@ std::vector<double> offsetBounds() {
 
 /// From the time that ptp4l takes for a Sync, past the 128 ms that polls aim at.
 std::vector<double> pollDelayBounds() {
-    return {1e-3, 2e-3, 3e-3, 4e-3, 5e-3, 7e-3, 1e-2, 1.5e-2, 2e-2, 3e-2,
-            5e-2, 7e-2, 0.1,  0.13, 0.2,  0.3,  0.5,  1,      2,    5};
+    return {1e-3, 2e-3,   3e-3, 4e-3, 5e-3, 7.5e-3, 1e-2, 1.5e-2, 2e-2, 3e-2,
+            5e-2, 7.5e-2, 0.1,  0.13, 0.2,  0.3,    0.5,  1,      2,    5};
 }
 
 } // namespace

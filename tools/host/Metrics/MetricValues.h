@@ -14,9 +14,9 @@
 
 namespace vantelhost {
 
-constexpr std::array healthNames{"starting",  "locked", "stale", "unmeasured",
-                                 "recovered", "lost",   "dead",  "stopping"};
-constexpr std::array qualityNames{"usable", "unusable", "other"};
+inline constexpr std::array healthNames{"starting",  "locked", "stale", "unmeasured",
+                                        "recovered", "lost",   "dead",  "stopping"};
+inline constexpr std::array qualityNames{"usable", "unusable", "other"};
 
 /// The last quality; both are empty before the first.
 struct QualityLabels {
