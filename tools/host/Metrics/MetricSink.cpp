@@ -42,11 +42,21 @@ void increase(std::atomic<std::uint64_t>& count) {
     count.fetch_add(1, std::memory_order_relaxed);
 }
 
+/// A string; empty when there is none.
+std::string_view text(const Json& object, const char* key) {
+    const auto found = object.find(key);
+    return found != object.end() && found->is_string() ? found->get_ref<const std::string&>()
+                                                       : std::string_view();
+}
+
 /// A member as a label: numbers in digits, nothing when it is missing.
 std::string label(const Json& object, const char* key) {
     const auto found = object.find(key);
     if (found == object.end()) {
         return "";
+    }
+    if (found->is_number_integer()) {
+        return std::to_string(found->get<std::int64_t>());
     }
     return found->is_string() ? found->get<std::string>() : toAscii(*found);
 }
@@ -62,7 +72,7 @@ PortLabels portLabels(const std::string& name, const Json& port) {
     constexpr std::string_view prefix = "Port";
     const bool hasPrefix = name.compare(0, prefix.size(), prefix) == 0;
     return {hasPrefix ? name.substr(prefix.size()) : name, label(port, "interface"),
-            static_cast<int>(placeOf(label(port, "portState"), portStates))};
+            static_cast<int>(placeOf(text(port, "portState"), portStates))};
 }
 
 std::vector<PortLabels> allPortLabels(const Json& metadata) {
@@ -161,11 +171,11 @@ void MetricSink::takeMetadata(const Event& event, const Moment& /*moment*/) {
         return;
     }
     auto grandmaster = grandmasterLabels(metadata);
-    takeGrandmaster(grandmaster.identity, label(metadata, "localClockId"));
+    takeGrandmaster(grandmaster.identity, text(metadata, "localClockId"));
     values_.clocks.set({std::move(grandmaster), std::move(ports)});
 }
 
-void MetricSink::takeGrandmaster(const std::string& identity, const std::string& ownIdentity) {
+void MetricSink::takeGrandmaster(const std::string& identity, std::string_view ownIdentity) {
     if (identity == ownIdentity || identity == grandmaster_) {
         return;
     }
@@ -177,7 +187,7 @@ void MetricSink::takeGrandmaster(const std::string& identity, const std::string&
 
 void MetricSink::takeError(const Event& event, const Moment& /*moment*/) {
     increase(values_.errors);
-    if (label(event.members, "operation").compare(0, 6, "zekel_") == 0) {
+    if (text(event.members, "operation").compare(0, 6, "zekel_") == 0) {
         increase(values_.hostCallErrors);
     }
 }

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 #include "Events.h"
 #include "Metrics/MetricValues.h"
@@ -29,7 +30,7 @@ private:
     void takeError(const Event& event, const Moment& moment);
 
     void countPollDelay(std::uint64_t local, std::uint64_t now);
-    void takeGrandmaster(const std::string& identity, const std::string& ownIdentity);
+    void takeGrandmaster(const std::string& identity, std::string_view ownIdentity);
 
     MetricValues& values_;
     std::uint64_t epochOffset_ = 0;
