@@ -10,10 +10,9 @@
 #include <unistd.h>
 
 #include "Tool.h"
-#include "support/Child.h"
 #include "support/Http.h"
 #include "support/Markdown.h"
-#include "support/Processes.h"
+#include "support/SimulatedRun.h"
 #include "support/TcpConnection.h"
 
 using testing::HasSubstr;
@@ -76,59 +75,17 @@ Kinds documentedKinds() {
     return kinds;
 }
 
-/// The plug-in of the tests has its paths below the working folder.
 class ToolMetricsTest : public testing::Test {
 protected:
-    void SetUp() override {
-        ASSERT_EQ(::symlink(VANTEL_SIMPTP4L, folder.path("ptp4l").c_str()), 0);
-        writeFile(folder.path("ptp4l.conf.sim"), "offset 250\n");
-    }
-
-    Words run(int port, const Words& options = {}) const {
-        Words words{"/bin/sh",
-                    "-c",
-                    "cd \"$0\" && exec \"$@\"",
-                    folder.path(""),
-                    HOST_TOOL,
-                    "run",
-                    "--json",
-                    "--library",
-                    VANTEL_BC_TEST_LIBRARY,
-                    "--interface",
-                    "sim0",
-                    "--fifo",
-                    folder.path("quillEpochOffset"),
-                    "--create-fifo",
-                    "--set",
-                    "logSyncInterval=-3",
-                    "--set",
-                    "udsAddress=" + folder.path("uds"),
-                    "--set",
-                    "configFile=" + folder.path("ptp4l.conf"),
-                    "--metrics",
-                    "127.0.0.1:" + std::to_string(port)};
-        words.insert(words.end(), options.begin(), options.end());
-        return words;
-    }
-
-    /// Where a run serves its metrics; 0 when it does not.
-    static int portOf(Child& host) {
-        static const std::regex address("\"listening\":true,\"address\":\"127.0.0.1:(\\d+)\"");
-        std::smatch found;
-        return host.waitForOutput("\"listening\":true") &&
-                       std::regex_search(host.output(), found, address)
-                   ? std::stoi(found[1])
-                   : 0;
-    }
-
     Folder folder;
 };
 
 } // namespace
 
 TEST_F(ToolMetricsTest, ARunServesWhatTheDocumentHasAndNothingElse) {
-    Child host(run(0, {"--chrony", folder.path("chrony.sock")}));
-    const int port = portOf(host);
+    SimulatedRun run(folder.path(""), "offset 250\n", {"--chrony", folder.path("chrony.sock")});
+    Child& host = run.host();
+    const int port = run.metricsPort();
     ASSERT_TRUE(host.waitForOutput("\"offset\":250", 2)) << host.errors();
     const std::string page = httpGet(port, "/metrics");
     const Kinds documented = documentedKinds();
@@ -146,8 +103,9 @@ TEST_F(ToolMetricsTest, PromtoolFindsNothingInThePage) {
     if (::access("/usr/bin/promtool", X_OK) != 0) {
         GTEST_SKIP() << "SKIPPED: there is no /usr/bin/promtool";
     }
-    Child host(run(0));
-    const int port = portOf(host);
+    SimulatedRun run(folder.path(""), "offset 250\n");
+    Child& host = run.host();
+    const int port = run.metricsPort();
     ASSERT_TRUE(host.waitForOutput("\"offset\":250"));
     std::string page = httpGet(port, "/metrics");
     // Its own metrics are not ours to name.
@@ -161,7 +119,8 @@ TEST_F(ToolMetricsTest, PromtoolFindsNothingInThePage) {
 
 TEST_F(ToolMetricsTest, APortInUseIsToldAndTheRunGoesOn) {
     const SilentListener other;
-    Child host(run(other.port()));
+    SimulatedRun run(folder.path(""), "offset 250\n", {}, other.port());
+    Child& host = run.host();
     ASSERT_TRUE(host.waitForOutput("\"offset\":250"));
     EXPECT_THAT(host.output(), HasSubstr("\"listening\":false,\"address\":\"127.0.0.1:" +
                                          std::to_string(other.port()) +
@@ -178,8 +137,9 @@ TEST_F(ToolMetricsTest, AnAddressThatIsNoneIsRefused) {
 }
 
 TEST_F(ToolMetricsTest, ClientsThatNeverReadHoldUpNeitherPairsNorTheEnd) {
-    Child host(run(0));
-    const int port = portOf(host);
+    SimulatedRun run(folder.path(""), "offset 250\n");
+    Child& host = run.host();
+    const int port = run.metricsPort();
     std::vector<Descriptor> clients;
     for (int i = 0; i < 20; ++i) {
         clients.push_back(connectTo(port));
