@@ -155,8 +155,11 @@ void printWays(const std::string& figure, const std::vector<Way>& ways) {
     constexpr double most = 1000;
     const Way& without = ways.front();
     for (const Way& way : ways) {
-        print({figure + ": " + way.name, "", median(way.medians), "ns",
-               medianRatio(way.medians, without.medians)});
+        Row row{figure + ": " + way.name, "", median(way.medians), "ns"};
+        if (way.hasMetrics) {
+            row.ratio = medianRatio(way.medians, without.medians);
+        }
+        print(row);
         if (way.hasMetrics) {
             print({figure + ", added: " + way.name, "", added(way.medians, without.medians), "ns",
                    std::nullopt, most});

@@ -78,7 +78,7 @@ protected:
 
 TEST_F(DashboardTest, EachExpressionHasDataAndTwoFaultsAreToldApart) {
     if (!PrometheusServer::isInstalled()) {
-        GTEST_SKIP() << "SKIPPED: Prometheus is missing; run scripts/setup.sh";
+        GTEST_SKIP() << "SKIPPED: Prometheus is missing; run scripts/setup.sh checks";
     }
     SimulatedRun lost(folder.path("lost"), "offset 250\nat 4 do gm off\n",
                       {"--chrony", folder.path("chrony.sock")});

@@ -5,7 +5,7 @@ set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
 rules=$here/../../monitoring/vantel.rules.yml
 if ! command -v promtool >/dev/null; then
-  echo "SKIPPED: promtool is missing; run scripts/setup.sh"
+  echo "SKIPPED: promtool is missing; run scripts/setup.sh checks"
   exit 77
 fi
 

@@ -26,9 +26,9 @@ struct TimedOffset {
 struct RunOptions : SettingsOptions {
     std::optional<double> seconds;
     bool jsonLines = false;
-    bool plain = false;       ///< lines also on a terminal
-    std::string recordFile;   ///< empty when nothing is recorded
-    std::string chronySocket; ///< empty when chronyd gets nothing
+    bool plain = false;                   ///< lines also on a terminal
+    std::string recordFile;               ///< empty when nothing is recorded
+    std::string chronySocket;             ///< empty when chronyd gets nothing
     std::optional<ListenAddress> metrics; ///< where they are served
     bool useFifo = false;
     bool createFifo = false;

@@ -101,7 +101,7 @@ TEST_F(ToolMetricsTest, ARunServesWhatTheDocumentHasAndNothingElse) {
 
 TEST_F(ToolMetricsTest, PromtoolFindsNothingInThePage) {
     if (::access("/usr/bin/promtool", X_OK) != 0) {
-        GTEST_SKIP() << "SKIPPED: there is no /usr/bin/promtool";
+        GTEST_SKIP() << "SKIPPED: promtool is missing; run scripts/setup.sh checks";
     }
     SimulatedRun run(folder.path(""), "offset 250\n");
     Child& host = run.host();
