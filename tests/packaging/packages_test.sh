@@ -170,8 +170,8 @@ DependenciesNameTheLibrariesInUse() {
   expect_equal "libraries of the library" "libc6, libcjson1, libgcc-s1, libstdc++6" \
     "$(names libvantel-bc19)"
   # Each release of Debian has its own fmt and prometheus-cpp.
-  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libprometheus-cpp-coreN,\
- libprometheus-cpp-pullN, libstdc++6, libvantel-bc19" \
+  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libprometheus-cpp-pullN,\
+ libstdc++6, libvantel-bc19" \
     "$(names vantel-host | sed -E 's/(libfmt|libprometheus-cpp-[a-z]+)[0-9.]+/\1N/g')"
 }
 
