@@ -16,7 +16,7 @@ std::string answerTo(const std::string& request, int port) {
     if (::send(connection.get(), request.data(), request.size(), MSG_NOSIGNAL) < 0) {
         return answer;
     }
-    std::array<char, 4096> part;
+    std::array<char, 4096> part{};
     ssize_t size = 0;
     while ((size = ::recv(connection.get(), part.data(), part.size(), 0)) > 0) {
         answer.append(part.data(), static_cast<std::size_t>(size));
@@ -27,7 +27,8 @@ std::string answerTo(const std::string& request, int port) {
 bool isUnreserved(char character) {
     constexpr std::string_view others = "-._~";
     return (character >= 'a' && character <= 'z') || (character >= 'A' && character <= 'Z') ||
-           (character >= '0' && character <= '9') || others.find(character) != others.npos;
+           (character >= '0' && character <= '9') ||
+           others.find(character) != std::string_view::npos;
 }
 
 } // namespace

@@ -13,7 +13,7 @@ Child::Words prepare(const std::string& folder, const std::string& script,
     std::ofstream(folder + "/ptp4l.conf.sim") << script;
     Child::Words words{"/bin/sh",
                        "-c",
-                       "cd \"$0\" && exec \"$@\"",
+                       R"(cd "$0" && exec "$@")",
                        folder,
                        HOST_TOOL,
                        "run",

@@ -73,7 +73,7 @@ std::string listeningProblem(const ListenAddress& address) {
     const bool works =
         ::bind(descriptor, static_cast<const sockaddr*>(memory), address.size) == 0 &&
         ::listen(descriptor, 1) == 0;
-    const std::string problem = works ? "" : errorText(errno);
+    std::string problem = works ? "" : errorText(errno);
     ::close(descriptor);
     return problem;
 }
