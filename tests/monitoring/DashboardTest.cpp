@@ -53,14 +53,23 @@ protected:
         return "";
     }
 
+    using Values = std::set<std::string>;
+
     /// The values of a label among the samples of a panel, for some instances.
-    std::set<std::string> labels(const std::string& title, const std::string& label,
-                                 const std::string& instances) const {
-        std::set<std::string> values;
+    Values labels(const std::string& title, const std::string& label,
+                  const std::string& instances) const {
+        Values values;
         for (const auto& sample : prometheus->query(filledIn(expression(title), instances))) {
             values.insert(sample["metric"].value(label, ""));
         }
         return values;
+    }
+
+    /// They become these in time.
+    void expectLabels(const std::string& title, const std::string& label,
+                      const std::string& instances, const Values& expected) const {
+        EXPECT_TRUE(waitUntil([&] { return labels(title, label, instances) == expected; }))
+            << title << ": " << testing::PrintToString(labels(title, label, instances));
     }
 
     static std::string instance(SimulatedRun& run) {
@@ -96,17 +105,12 @@ TEST_F(DashboardTest, EachExpressionHasDataAndTwoFaultsAreToldApart) {
                 << ": " << expression;
         }
     }
-    using testing::ElementsAre;
-    EXPECT_TRUE(waitUntil([&] {
-        return labels("Quality and its reason", "quality", lostInstance) ==
-               std::set<std::string>{"unusable"};
-    }));
-    EXPECT_THAT(labels("Quality and its reason", "reason", lostInstance),
-                ElementsAre("PTP role has changed."));
-    EXPECT_THAT(labels("Quality and its reason", "quality", unmeasuredInstance),
-                ElementsAre("usable"));
-    EXPECT_THAT(labels("Quality and its reason", "instance", ".+"),
-                testing::UnorderedElementsAre(lostInstance, unmeasuredInstance));
+    expectLabels("Health", "state", lostInstance, {"lost"});
+    expectLabels("Health", "state", unmeasuredInstance, {"unmeasured"});
+    expectLabels("Quality and its reason", "quality", lostInstance, {"unusable"});
+    expectLabels("Quality and its reason", "quality", unmeasuredInstance, {"usable"});
+    expectLabels("Offset", "instance", ".+", {lostInstance});
+    expectLabels("Time pairs", "instance", ".+", {lostInstance, unmeasuredInstance});
 }
 
 TEST(Dashboard, NeedsNothingThatGrafanaDoesNotBring) {

@@ -31,11 +31,10 @@ constexpr std::array<std::string_view, 11> portStates = {
     "PTP_GRAND_MASTER",
 };
 
-/// 0 for a name that is not known.
-template <typename Names>
-std::size_t placeOf(std::string_view name, const Names& names) {
-    const auto* const found = std::find(names.begin(), names.end(), name);
-    return found == names.end() ? 0 : static_cast<std::size_t>(found - names.begin());
+/// Its number; 0 for a name that is not known.
+int portState(std::string_view name) {
+    const auto* const found = std::find(portStates.begin(), portStates.end(), name);
+    return found == portStates.end() ? 0 : static_cast<int>(found - portStates.begin());
 }
 
 void increase(std::atomic<std::uint64_t>& count) {
@@ -72,7 +71,7 @@ PortLabels portLabels(const std::string& name, const Json& port) {
     constexpr std::string_view prefix = "Port";
     const bool hasPrefix = name.compare(0, prefix.size(), prefix) == 0;
     return {hasPrefix ? name.substr(prefix.size()) : name, label(port, "interface"),
-            static_cast<int>(placeOf(text(port, "portState"), portStates))};
+            portState(text(port, "portState"))};
 }
 
 std::vector<PortLabels> allPortLabels(const Json& metadata) {
@@ -101,7 +100,12 @@ void MetricSink::take(const Event& event, const Moment& moment) {
 }
 
 void MetricSink::takeHealth(const Event& event, const Moment& /*moment*/) {
-    values_.health = placeOf(event.members["state"].get<std::string>(), healthNames);
+    const std::string_view state = text(event.members, "state");
+    for (const HealthState each : allHealthStates) {
+        if (state == nameOf(each)) {
+            values_.health = each;
+        }
+    }
     increase(values_.healthChanges);
 }
 

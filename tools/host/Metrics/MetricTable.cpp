@@ -14,9 +14,9 @@ double number(std::uint64_t count) {
 }
 
 void sampleHealth(Samples& samples, const MetricValues& values, double /*seconds*/) {
-    const std::size_t health = values.health;
-    for (std::size_t i = 0; i < healthNames.size(); ++i) {
-        samples.add(i == health ? 1 : 0, {healthNames.at(i)});
+    const HealthState health = values.health;
+    for (const HealthState state : allHealthStates) {
+        samples.add(state == health ? 1 : 0, {nameOf(state)});
     }
 }
 

@@ -9,13 +9,12 @@
 #include <string>
 #include <vector>
 
+#include "Health.h"
 #include "Metrics/AtomicHistogram.h"
 #include "Metrics/Published.h"
 
 namespace vantelhost {
 
-inline constexpr std::array healthNames{"starting",  "locked", "stale", "unmeasured",
-                                        "recovered", "lost",   "dead",  "stopping"};
 inline constexpr std::array qualityNames{"usable", "unusable", "other"};
 
 /// The last quality; both are empty before the first.
@@ -48,7 +47,7 @@ struct ClockLabels {
 struct MetricValues {
     using Count = std::atomic<std::uint64_t>;
 
-    std::atomic<std::size_t> health{0}; ///< place in healthNames
+    std::atomic<HealthState> health{HealthState::starting};
     Count healthChanges{0};
     Count restarts{0};
     Count failedPolls{0};

@@ -32,12 +32,9 @@ protected:
         take(qualityEvent(isUsable ? usable.data() : unusable.data(), reason));
     }
 
-    void takePair(std::int64_t offset, const char* leftOut = nullptr) {
-        Event event = pairEvent(arrival - static_cast<std::uint64_t>(offset), arrival, offset);
-        if (leftOut != nullptr) {
-            event.members["leftOut"] = leftOut;
-        }
-        take(event, arrival + 4500000);
+    void takePair(std::int64_t offset, PairKind kind = PairKind::measured) {
+        take(pairEvent(arrival - static_cast<std::uint64_t>(offset), arrival, offset, kind),
+             arrival + 4500000);
     }
 
     void takeMetadata(const std::string& grandmaster) {
@@ -78,7 +75,7 @@ TEST_F(MetricSinkTest, OneHealthIsThatOfTheLastEvent) {
     const std::vector<std::string> states{"starting",  "locked", "stale", "unmeasured",
                                           "recovered", "lost",   "dead",  "stopping"};
     for (const auto& state : states) {
-        take({"health", "", {{"state", state}}});
+        take(healthEvent(state, "", "", 0));
         const std::string text = page();
         for (const auto& other : states) {
             EXPECT_THAT(text, HasSubstr("\nvantel_health{state=\"" + other + "\"} " +
@@ -125,7 +122,7 @@ TEST_F(MetricSinkTest, TheAgeOfAPairGrows) {
 
 TEST_F(MetricSinkTest, APairOf1970IsLeftOutOfAllFigures) {
     takePair(250);
-    takePair(999, "1970");
+    takePair(999, PairKind::of1970);
     EXPECT_THAT(page(), HasSubstr("\nvantel_pairs_total 2\n"));
     EXPECT_THAT(page(), HasSubstr("\nvantel_pairs_left_out_total{reason=\"1970\"} 1\n"));
     EXPECT_THAT(page(), HasSubstr("\nvantel_pairs_left_out_total{reason=\"no-delay\"} 0\n"));
@@ -135,7 +132,7 @@ TEST_F(MetricSinkTest, APairOf1970IsLeftOutOfAllFigures) {
 }
 
 TEST_F(MetricSinkTest, APairWithoutADelayHasAPollDelayAndNoOffset) {
-    takePair(0, "no-delay");
+    takePair(0, PairKind::falseOffset);
     EXPECT_THAT(page(), HasSubstr("\nvantel_pairs_left_out_total{reason=\"no-delay\"} 1\n"));
     EXPECT_THAT(page(), Not(HasSubstr("\nvantel_offset_seconds ")));
     EXPECT_THAT(page(), HasSubstr("\nvantel_offset_magnitude_seconds_count 0\n"));
@@ -195,7 +192,7 @@ TEST_F(MetricSinkTest, AChangeOfGrandmasterIsOneToAnotherClockThanBefore) {
 
 TEST_F(MetricSinkTest, ARestartIsCountedAndForgetsThePorts) {
     takeMetadata("first");
-    take({"restart", "", {{"cause", "dead"}}});
+    take(restartEvent("dead", 1, 1));
     EXPECT_THAT(page(), HasSubstr("\nvantel_session_restarts_total 1\n"));
     EXPECT_THAT(page(), Not(HasSubstr("\nvantel_port_state{")));
 }
