@@ -12,6 +12,7 @@
 #include "Tool.h"
 #include "support/Http.h"
 #include "support/Markdown.h"
+#include "support/Processes.h"
 #include "support/SimulatedRun.h"
 #include "support/TcpConnection.h"
 
@@ -127,6 +128,22 @@ TEST_F(ToolMetricsTest, APortInUseIsToldAndTheRunGoesOn) {
                                          "\",\"problem\":\"Address already in use\""));
     host.signal(SIGTERM);
     EXPECT_EQ(host.wait(), 0);
+}
+
+TEST_F(ToolMetricsTest, CountersGoOnOverARestart) {
+    SimulatedRun run(folder.path(""), "offset 250\nat 1 do exit 1\n", {"--restart"});
+    Child& host = run.host();
+    const int port = run.metricsPort();
+    ASSERT_TRUE(host.waitForOutput("\"event\":\"restart\""));
+    host.forgetOutput();
+    ASSERT_TRUE(host.waitForOutput("\"state\":\"locked\""));
+    std::string page;
+    EXPECT_TRUE(waitUntil([&] {
+        page = httpGet(port, "/metrics");
+        return page.find("\nvantel_health{state=\"locked\"} 1\n") != std::string::npos;
+    }));
+    EXPECT_THAT(page, HasSubstr("\nvantel_session_restarts_total 1\n"));
+    EXPECT_THAT(page, testing::Not(HasSubstr("\nvantel_pairs_total 1\n")));
 }
 
 TEST_F(ToolMetricsTest, AnAddressThatIsNoneIsRefused) {
