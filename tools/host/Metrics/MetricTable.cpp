@@ -69,7 +69,8 @@ void sampleGrandmaster(Samples& samples, const MetricValues& values, double /*se
 }
 
 void samplePorts(Samples& samples, const MetricValues& values, double /*seconds*/) {
-    for (const auto& port : values.clocks.get()->ports) {
+    const auto clocks = values.clocks.get();
+    for (const auto& port : clocks->ports) {
         samples.add(port.state, {port.port, port.interface});
     }
 }

@@ -18,6 +18,7 @@ public:
         value_.swap(next);
     }
 
+    /// The value lives as long as what is returned.
     std::shared_ptr<const Value> get() const {
         const std::lock_guard lock(mutex_);
         return value_;

@@ -3,6 +3,8 @@
 #include "Metrics/MetricSink.h"
 
 #include <array>
+#include <atomic>
+#include <thread>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -213,4 +215,21 @@ TEST_F(MetricSinkTest, WhatIsExpectedAfterASignalIsNotCounted) {
     take(expectedEvent(qualityEvent(unusable.data(), failedPoll)));
     EXPECT_THAT(page(), HasSubstr("\nvantel_quality{quality=\"usable\"} 1\n"));
     EXPECT_THAT(page(), HasSubstr("\nvantel_failed_polls_total 0\n"));
+}
+
+TEST_F(MetricSinkTest, APageIsWholeWhileMetadataAndQualityChange) {
+    takeMetadata("first");
+    std::atomic<bool> isOver{false};
+    std::thread reader([&] {
+        while (!isOver) {
+            EXPECT_THAT(page(), HasSubstr("\nvantel_port_state{port=\"12\",interface="
+                                          "\"eth\\\"1\"} 6\n"));
+        }
+    });
+    for (int i = 0; i < 2000; ++i) {
+        takeMetadata(std::to_string(i) + " is a long identity");
+        takeQuality(i % 2 == 0, std::to_string(i) + " is a long reason");
+    }
+    isOver = true;
+    reader.join();
 }
