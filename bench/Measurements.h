@@ -7,6 +7,7 @@ class Program;
 void addDelay(Program& program);
 void addHostFootprint(Program& program);
 void addInitializeCost(Program& program);
+void addMetricsCost(Program& program);
 void addPollCost(Program& program);
 void addPollInstructions(Program& program);
 void addPollLine(Program& program);

@@ -11,7 +11,8 @@ for figure in 'CPU per poll, stub: fetch +1 ' 'CPU per poll, stub: pmc per poll 
   'stripped library, amd64 .* met' 'allocations in a single-answer exchange .* met' \
   'allocations in a whole poll that reports a pair +2 .* met' \
   'report of 1 days, 8 pairs/s: memory at most .* met|SKIPPED: report' \
-  'delay of 50 % of the pairs, 8 Syncs/s, simptp4l' 'delay at best' 'Syncs that become pairs'; do
+  'delay of 50 % of the pairs, 8 Syncs/s, simptp4l' 'delay at best' 'Syncs that become pairs' \
+  'callback with a pair, added: metrics, 10 scrapes/s'; do
   if ! grep -qE "$figure" <<<"$table"; then
     echo "there is no row: $figure"
     exit 1

@@ -99,6 +99,7 @@ measure_all() {
   measure "$bench/measure" initialize_cost --rounds "$rounds"
   measure "$bench/measure" session_times --rounds "$sessions"
   measure "$bench/measure" host_footprint --rounds "$sessions"
+  measure "$bench/measure_host" metrics_cost --rounds "$sessions"
   measure_size "$(dpkg --print-architecture)" "$build/source/libvantel_bc.so" strip 204800
   if [[ -n $armhf_library ]]; then
     measure_size armhf "$armhf_library" arm-linux-gnueabihf-strip 163840

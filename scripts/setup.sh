@@ -2,7 +2,7 @@
 # Installs the Debian packages of the named groups (default: tests), if any is missing.
 #   tests     build the library and its tools, run the tests
 #   demo      build, and run the plug-in with the real daemon
-#   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd
+#   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd, prometheus
 #   armhf     what tests needs, for 32-bit ARM under emulation
 #   bench     what tests needs, and counters for scripts/bench.sh
 #   packages  build Debian packages, check and install them
@@ -10,20 +10,23 @@ set -euo pipefail
 
 # GCC optimises across files with make, and warns without it.
 build=(cmake ninja-build g++ make pkg-config libcjson-dev libsystemd-dev libboost-dev nlohmann-json3-dev
-  libcli11-dev libfmt-dev systemtap-sdt-dev)
+  libcli11-dev libfmt-dev prometheus-cpp-dev systemtap-sdt-dev)
 daemon=(linuxptp iproute2 mount util-linux procps)
 tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
   gnuplot-nox libxml2-utils mandoc groff-base)
-# chrony would take the place of another time daemon, so nobody gets it who only wants to build.
-checks=(clang libclang-rt-dev gcovr shellcheck valgrind chrony)
+# chrony would take the place of another time daemon, and prometheus serves at once: nobody gets them who only
+# wants to build.
+checks=(clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
 # Another version formats and finds otherwise. Debian 12 alone has this one; elsewhere scripts/format.sh and
 # scripts/tidy.sh say SKIPPED.
 if [[ $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release) == bookworm ]]; then
   checks+=(clang-format-14 clang-tidy-14)
 fi
+# Of prometheus-cpp the libraries alone: what it is developed with would bring curl's, and with that the C
+# library's. Its headers are those of any architecture.
 armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
   libcjson-dev:armhf libsystemd-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
-  libbenchmark-dev:armhf)
+  libbenchmark-dev:armhf libprometheus-cpp-core1.0:armhf libprometheus-cpp-pull1.0:armhf)
 bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap uidmap)
 

@@ -111,7 +111,7 @@ std::vector<std::string> manualExamples() {
 
 /// Blocks without a language are commands.
 std::set<std::string> shownCommands() {
-    static const std::set<std::string> others = {"c", "hex", "json", "text"};
+    static const std::set<std::string> others = {"c", "hex", "json", "text", "yaml"};
     std::set<std::string> shown;
     for (const std::string& example : manualExamples()) {
         for (const std::string& command : commandsIn(example)) {

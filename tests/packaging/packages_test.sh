@@ -103,8 +103,11 @@ usr/share/doc/libvantel-bc-dev/wire-format.md" "$(files libvantel-bc-dev)"
 
 HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
   local expected=(usr/bin/simptp4l usr/bin/vantel-host) file
-  for file in configuration host-interface oddities operations security simptp4l vantel-host; do
+  for file in configuration host-interface metrics oddities operations security simptp4l vantel-host; do
     expected+=("usr/share/doc/vantel-host/$file.md")
+  done
+  for file in "$here"/../../monitoring/*; do
+    expected+=("usr/share/doc/vantel-host/monitoring/${file##*/}")
   done
   for file in "$here"/../../tools/simptp4l/examples/*.sim; do
     expected+=("usr/share/doc/vantel-host/examples/${file##*/}")
@@ -166,9 +169,10 @@ DependenciesNameTheLibrariesInUse() {
   names() { field "$1" Depends | sed 's/ ([^)]*)//g'; }
   expect_equal "libraries of the library" "libc6, libcjson1, libgcc-s1, libstdc++6" \
     "$(names libvantel-bc19)"
-  # Each release of Debian has its own fmt.
-  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libstdc++6, libvantel-bc19" \
-    "$(names vantel-host | sed 's/libfmt[0-9]*/libfmtN/')"
+  # Each release of Debian has its own fmt and prometheus-cpp.
+  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libprometheus-cpp-pullN,\
+ libstdc++6, libvantel-bc19" \
+    "$(names vantel-host | sed -E 's/(libfmt|libprometheus-cpp-[a-z]+)[0-9.]+/\1N/g')"
 }
 
 # Scripts of the packages, as "package: script".

@@ -29,6 +29,9 @@ public:
     /// Whether there were pairs, and none was taken.
     bool tookNone() const { return sent_ == 0 && failed_ > 0; }
 
+    std::uint64_t sent() const { return sent_; }
+    std::uint64_t failed() const { return failed_; }
+
     /// How it stands.
     Event state() const;
 

@@ -172,6 +172,16 @@ Event lostEvent(const std::string& output, std::uint64_t events, double seconds,
             {{"output", output}, {"events", events}, {"seconds", seconds}, {"problem", problem}}};
 }
 
+Event metricsEvent(const std::string& address, const std::string& problem) {
+    const bool listening = problem.empty();
+    std::string text = listening
+                           ? "served at " + address
+                           : fmt::format("not served at {}: {}; tried again", address, problem);
+    return {"metrics",
+            std::move(text),
+            {{"listening", listening}, {"address", address}, {"problem", problem}}};
+}
+
 Event folderEvent(const std::string& path) {
     return {"folder", fmt::format("{} made", path), Json{{"path", path}}};
 }

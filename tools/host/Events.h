@@ -51,6 +51,7 @@ Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& p
 
 /// Nobody can ask how the run stands.
 Event statusSocketEvent(const std::string& path, const std::string& problem);
+
 /// The record can be written again.
 /// @param output  the record
 /// @param events  that are not in it
@@ -58,6 +59,11 @@ Event statusSocketEvent(const std::string& path, const std::string& problem);
 /// @param problem why
 Event lostEvent(const std::string& output, std::uint64_t events, double seconds,
                 const std::string& problem);
+
+/// Whether metrics are served.
+/// @param address where
+/// @param problem why they are not; empty when they are.
+Event metricsEvent(const std::string& address, const std::string& problem);
 
 /// The host made a folder that was missing.
 Event folderEvent(const std::string& path);

@@ -49,11 +49,7 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
     if (!options_.chronySocket.empty()) {
         chrony_.emplace(options_.chronySocket);
         journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
-            auto news = chrony_->take(reference, local);
-            if (statusPage_) {
-                statusPage_->takeChrony(chrony_->sent(), chrony_->failed());
-            }
-            return news;
+            return handToChrony(reference, local);
         });
     }
     if (!options_.statusSocket.empty()) {
@@ -61,6 +57,9 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
         statusSocket_.emplace(options_.statusSocket, [this] {
             return toAscii(statusPage_->at(Moment::now(begin_).seconds)) + "\n";
         });
+    }
+    if (options_.metrics) {
+        metrics_.emplace(*options_.metrics, begin_);
     }
 }
 
@@ -75,6 +74,17 @@ EventSink Run::output() {
     return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };
 }
 
+std::optional<Event> Run::handToChrony(std::uint64_t reference, std::uint64_t local) {
+    auto news = chrony_->take(reference, local);
+    if (metrics_) {
+        metrics_->takeChrony(chrony_->sent(), chrony_->failed());
+    }
+    if (statusPage_) {
+        statusPage_->takeChrony(chrony_->sent(), chrony_->failed());
+    }
+    return news;
+}
+
 int Run::execute() {
     const PlugIn plugIn(options_.pluginPath);
     journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
@@ -82,7 +92,7 @@ int Run::execute() {
     if (journal_.isClean() && readSchema(plugIn, schema)) {
         keepSessions(plugIn, completedSettings(schema));
     } else {
-        beginRecord();
+        beginOutputs();
     }
     if (chrony_) {
         journal_.note(chrony_->state());
@@ -132,13 +142,11 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
         fifo.emplace(options_.fifo,
                      options_.createFifo ? EpochFifo::Absent::create : EpochFifo::Absent::refuse);
     }
-    beginRecord();
+    beginOutputs();
     // Nothing is begun when the output or the record is lost already.
     if (!journal_.isClean()) {
         return;
     }
-    // Who asks is answered from the beginning.
-    turn();
     keeper.run();
     facts_ = keeper.facts();
     healedErrors_ = keeper.healedErrors();
@@ -152,7 +160,7 @@ void Run::keepSessions(const PlugIn& plugIn, Json settings) {
     }
 }
 
-void Run::beginRecord() {
+void Run::beginOutputs() {
     if (record_) {
         record_->begin();
         journal_.addOutput([this](const Event& event, const Moment& moment) {
@@ -165,18 +173,36 @@ void Run::beginRecord() {
             return true;
         });
     }
+    if (metrics_) {
+        journal_.addOutput("metrics", [this](const Event& event, const Moment& moment) {
+            metrics_->take(event, moment);
+            return true;
+        });
+    }
     journal_.outputsAreComplete();
+    attend();
+}
+
+void Run::attend() {
+    if (metrics_) {
+        tell(metrics_->attend());
+    }
+    if (statusSocket_) {
+        tell(statusSocket_->attend());
+    }
+}
+
+void Run::tell(const std::optional<Event>& news) {
+    if (news) {
+        journal_.note(*news);
+    }
 }
 
 void Run::turn() {
     if (view_) {
         view_->refresh();
     }
-    if (statusSocket_) {
-        if (const auto news = statusSocket_->attend()) {
-            journal_.note(*news);
-        }
-    }
+    attend();
 }
 
 void Run::tellFailure() {

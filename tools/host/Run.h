@@ -10,6 +10,7 @@
 #include "Journal.h"
 #include "Json.h"
 #include "LiveView.h"
+#include "Metrics/Metrics.h"
 #include "PlugIn.h"
 #include "Record.h"
 #include "RunOptions.h"
@@ -40,8 +41,15 @@ private:
     Json completedSettings(const Schema& schema) const;
     void keepSessions(const PlugIn& plugIn, Json settings);
 
-    /// Mistakes are refused before: an old record is then left as it was.
-    void beginRecord();
+    /// @return an event, if there is something to tell.
+    std::optional<Event> handToChrony(std::uint64_t reference, std::uint64_t local);
+
+    /// Mistakes are refused before: an old record is then left as it was, and no address is taken.
+    void beginOutputs();
+
+    /// Answers who asks how the run stands.
+    void attend();
+    void tell(const std::optional<Event>& news);
 
     /// Sees to what depends on time alone.
     void turn();
@@ -56,6 +64,7 @@ private:
     std::optional<ChronyClock> chrony_;
     std::optional<StatusPage> statusPage_;
     std::optional<StatusSocket> statusSocket_;
+    std::optional<Metrics> metrics_;
     Journal journal_;
     RunFacts facts_;
     std::uint64_t healedErrors_ = 0;

@@ -110,6 +110,17 @@ void addOutput(CLI::App& command, RunOptions& options) {
         .add_option("--status-socket", options.statusSocket,
                     "Answer \"vantel-host status\" here, who may write to it: mode 0660")
         ->type_name("PATH");
+    command
+        .add_option_function<std::string>(
+            "--metrics",
+            [&options](const std::string& text) {
+                options.metrics = parseListenAddress(text);
+                if (!options.metrics) {
+                    refuse("--metrics", "ADDRESS:PORT or [IPV6]:PORT, in numbers", text);
+                }
+            },
+            "Serve metrics to Prometheus here, over HTTP; port 0 is any that is free")
+        ->type_name("ADDRESS:PORT");
 }
 
 void addFifo(CLI::App& command, RunOptions& options) {

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "BuiltPaths.h"
+#include "Metrics/ListenAddress.h"
 #include "Record.h"
 #include "SettingsOptions.h"
 
@@ -31,6 +32,7 @@ struct RunOptions : SettingsOptions {
     RecordRules recordRules;
     std::string chronySocket; ///< empty when chronyd gets nothing
     std::string statusSocket; ///< empty when nobody may ask
+    std::optional<ListenAddress> metrics; ///< where they are served
     bool useFifo = false;
     bool createFifo = false;
     std::string fifo = builtEpochFifo;

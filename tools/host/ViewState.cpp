@@ -97,6 +97,8 @@ void update(ViewState& state, const Event& event, double seconds) {
     } else if (event.name == "daemon-ended") {
         state.daemonEnd = event.text;
         addProblem(state, seconds, event.text);
+    } else if (event.name == "metrics" && !members["listening"].get<bool>()) {
+        addProblem(state, seconds, "metrics " + event.text);
     } else if (event.name == "error" || event.name == "warning" || event.name == "refused") {
         addProblem(state, seconds, event.text);
     }

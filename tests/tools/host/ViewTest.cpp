@@ -115,6 +115,14 @@ TEST(View, InvalidMetadataIsAProblemAndLeavesTheGrandmaster) {
     EXPECT_THAT(viewLines(state, 8, roomy)[2], StartsWith("grandmaster   00:1B:21"));
 }
 
+TEST(View, MetricsThatAreNotServedAreAProblem) {
+    ViewState state = following();
+    update(state, metricsEvent("127.0.0.1:9993", "Address already in use"), 8);
+    update(state, metricsEvent("127.0.0.1:9993", ""), 9);
+    EXPECT_EQ(state.problems.back().text,
+              "metrics not served at 127.0.0.1:9993: Address already in use; tried again");
+}
+
 TEST(View, PhasesAndChronydAreNamed) {
     ViewState state = following();
     update(state, chronyEvent(3, 0, ""), 8);
