@@ -3,9 +3,11 @@
 #include <memory>
 #include <utility>
 
+#include <CLI/CLI.hpp>
+
 #include "Run.h"
+#include "RunConfig.h"
 #include "RunOptions.h"
-#include "SettingsOptions.h"
 #include "Signals.h"
 
 namespace vantelhost {
@@ -13,10 +15,11 @@ namespace vantelhost {
 namespace {
 
 /// Reads the settings before the signals are blocked: Ctrl-C still ends a wait for typed ones.
-int run(const RunOptions& options) {
-    auto configText = readConfig(options);
+int run(const Words& commandLine) {
+    RunConfig config = readRunConfig(commandLine);
+    refuseBadFile(config.errors);
     Signals signals;
-    return Run(options, std::move(configText), signals).execute();
+    return Run(config.options, std::move(config.json), signals).execute();
 }
 
 } // namespace
@@ -24,7 +27,7 @@ int run(const RunOptions& options) {
 std::function<int()> prepareRun(CLI::App& command) {
     const auto options = std::make_shared<RunOptions>();
     addRunOptions(command, *options);
-    return [options] { return run(*options); };
+    return [options, &command] { return run(wordsOf(command)); };
 }
 
 } // namespace vantelhost
