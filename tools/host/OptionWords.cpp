@@ -81,6 +81,16 @@ std::string complaintAbout(const ConfigEntry& entry, const CLI::App& command,
 
 } // namespace
 
+OptionValues valuesOf(const CLI::App& command) {
+    OptionValues values;
+    for (const auto* option : command.get_options()) {
+        if (option->count() > 0 && !option->get_lnames().empty()) {
+            values[option->get_lnames().at(0)] = option->results();
+        }
+    }
+    return values;
+}
+
 Words wordsOf(const CLI::App& command) {
     Words words;
     for (const auto* option : command.get_options()) {

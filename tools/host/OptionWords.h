@@ -3,6 +3,7 @@
 #pragma once
 
 #include <functional>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -13,6 +14,11 @@
 namespace vantelhost {
 
 using Words = std::vector<std::string>;
+
+/// The texts of each option that is given, by its long name.
+using OptionValues = std::map<std::string, std::vector<std::string>>;
+
+OptionValues valuesOf(const CLI::App& command);
 
 /// The options that a command got.
 Words wordsOf(const CLI::App& command);

@@ -11,30 +11,41 @@
 
 namespace vantelhost {
 
-RunConfig readRunConfig(const Words& commandLine) {
-    RunOptions given;
-    CLI::App command;
-    addRunOptions(command, given);
-    parseWords(command, commandLine);
-    Config config = readConfig(given);
+namespace {
 
-    RunConfig result{given, std::move(config.json), complaintsAbout(config.file)};
+/// Options of words.
+struct ParsedRun {
+    explicit ParsedRun(const Words& words) {
+        addRunOptions(command, options);
+        parseWords(command, words);
+    }
+
+    RunOptions options;
+    CLI::App command;
+};
+
+} // namespace
+
+RunConfig readRunConfig(const Words& commandLine) {
+    const ParsedRun given(commandLine);
+    Config config = readConfig(given.options);
+    RunConfig result{given.options, {}, std::move(config.json), complaintsAbout(config.file)};
     if (result.errors.empty()) {
         Words words = commandLine;
-        const Words more = wordsToAdd(command, config.file.options);
+        const Words more = wordsToAdd(given.command, config.file.options);
         words.insert(words.end(), more.begin(), more.end());
-        result.options = optionsOf(words, addRunOptions);
+        const ParsedRun all(words);
+        result.options = all.options;
         result.options.fileSettings = std::move(config.file.settings);
+        result.values = valuesOf(all.command);
     }
     return result;
 }
 
 std::vector<std::string> complaintsAbout(const ConfigFile& file) {
-    RunOptions unused;
-    CLI::App command;
-    addRunOptions(command, unused);
-    const auto parse = [](const Words& words) { optionsOf(words, addRunOptions); };
-    std::vector<ConfigError> errors = complaintsAbout(file.options, command, parse);
+    const ParsedRun none({});
+    std::vector<ConfigError> errors =
+        complaintsAbout(file.options, none.command, [](const Words& words) { ParsedRun{words}; });
     errors.insert(errors.end(), file.errors.begin(), file.errors.end());
     std::stable_sort(errors.begin(), errors.end(),
                      [](const auto& a, const auto& b) { return a.line < b.line; });

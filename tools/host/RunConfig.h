@@ -13,6 +13,7 @@ namespace vantelhost {
 /// What the command line and the configuration file say of a run. The command line wins.
 struct RunConfig {
     RunOptions options;
+    OptionValues values;             ///< the same as texts
     std::optional<std::string> json; ///< the settings, if the file is a JSON object
     std::vector<std::string> errors; ///< of the file, each with its line
 };
