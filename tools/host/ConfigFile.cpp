@@ -34,7 +34,7 @@ bool isName(const std::string& text) {
 
 bool hasControlCharacter(const std::string& text) {
     return std::any_of(text.begin(), text.end(), [](char each) {
-        return (each >= '\0' && each < ' ' && each != '\t') || each == '\x7F';
+        return (static_cast<unsigned char>(each) < ' ' && each != '\t') || each == '\x7F';
     });
 }
 
