@@ -50,6 +50,7 @@ std::vector<std::string> complaintsAbout(const ConfigFile& file) {
     std::stable_sort(errors.begin(), errors.end(),
                      [](const auto& a, const auto& b) { return a.line < b.line; });
     std::vector<std::string> texts;
+    texts.reserve(errors.size());
     for (auto& error : errors) {
         texts.push_back(std::move(error.text));
     }
