@@ -1,10 +1,10 @@
 #include "RunCommand.h"
 
 #include <memory>
-#include <utility>
 
 #include <CLI/CLI.hpp>
 
+#include "ConfigReload.h"
 #include "Run.h"
 #include "RunConfig.h"
 #include "RunOptions.h"
@@ -16,10 +16,13 @@ namespace {
 
 /// Reads the settings before the signals are blocked: Ctrl-C still ends a wait for typed ones.
 int run(const Words& commandLine) {
-    RunConfig config = readRunConfig(commandLine);
+    const RunConfig config = readRunConfig(commandLine);
     refuseBadFile(config.errors);
-    Signals signals;
-    return Run(config.options, std::move(config.json), signals).execute();
+    Signals signals(canReread(config.options) ? Hangup::reread : Hangup::stop);
+    const auto reread = [&](const Schema& schema, const Json& settings) {
+        return rereadConfig(commandLine, config, schema, settings);
+    };
+    return Run(config.options, config.json, signals, reread).execute();
 }
 
 } // namespace
