@@ -5,6 +5,7 @@
 #include <set>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 
@@ -107,10 +108,22 @@ TEST(ManualPagesTest, TheyAreOfThisVersion) {
     const std::string build = projectFile("CMakeLists.txt");
     std::smatch found;
     ASSERT_TRUE(std::regex_search(build, found, version));
-    for (const char* name : {"vantel-host.1", "simptp4l.1"}) {
+    for (const char* name : {"vantel-host.1", "vantel-host.toml.5", "simptp4l.1"}) {
         EXPECT_NE(page(name).find("\"vantel_bc " + found[1].str() + "\""), std::string::npos)
             << name;
     }
+}
+
+TEST(ManualPagesTest, TheFileOfTheExampleIsGood) {
+    static const std::regex example(R"(\n\.nf\n([^]*?)\.fi\n)");
+    const std::string text = page("vantel-host.toml.5");
+    std::smatch found;
+    ASSERT_TRUE(std::regex_search(text, found, example));
+    const std::string checked =
+        outputOf("printf '%s' '" + found[1].str() +
+                 "' | " VANTEL_HOST " check --config - --library " VANTEL_BC_LIBRARY " 2>&1");
+    EXPECT_NE(checked.find("ok    settings "), std::string::npos) << checked;
+    EXPECT_NE(checked.find("2, each named once"), std::string::npos) << checked;
 }
 
 /// A program that complains about pages.
@@ -133,9 +146,12 @@ TEST_P(ManualPagesLintTest, GroffFindsNothing) {
     expectNoComplaint("groff", "-ww -z -man -Tutf8");
 }
 
-INSTANTIATE_TEST_SUITE_P(Pages, ManualPagesLintTest, testing::Values("vantel-host.1", "simptp4l.1"),
-                         [](const testing::TestParamInfo<const char*>& name) {
-                             return std::string(name.index == 0 ? "host" : "simulator");
-                         });
+std::string nameOfPage(const testing::TestParamInfo<const char*>& page) {
+    return std::vector<std::string>{"host", "simulator", "file"}.at(page.index);
+}
+
+INSTANTIATE_TEST_SUITE_P(Pages, ManualPagesLintTest,
+                         testing::Values("vantel-host.1", "simptp4l.1", "vantel-host.toml.5"),
+                         nameOfPage);
 
 } // namespace

@@ -74,9 +74,9 @@ check_tools() {
   local page
   expect_output priority1 /usr/bin/vantel-host schema
   expect_output 'usage: simptp4l' /usr/bin/simptp4l --help
-  for page in "$here"/../../docs/man/*.1; do
+  for page in "$here"/../../docs/man/*.[1-8]; do
     if [[ -e $page ]]; then
-      gzip -dc "$root/usr/share/man/man1/${page##*/}.gz" | cmp - "$page"
+      gzip -dc "$root/usr/share/man/man${page##*.}/${page##*/}.gz" | cmp - "$page"
     fi
   done
 }

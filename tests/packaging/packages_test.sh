@@ -102,7 +102,8 @@ usr/share/doc/libvantel-bc-dev/wire-format.md" "$(files libvantel-bc-dev)"
 }
 
 HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
-  local expected=(usr/bin/simptp4l usr/bin/vantel-host) file
+  local expected=(usr/bin/simptp4l usr/bin/vantel-host
+    usr/share/bash-completion/completions/vantel-host) file
   for file in configuration host-interface metrics oddities operations security simptp4l vantel-host; do
     expected+=("usr/share/doc/vantel-host/$file.md")
   done
@@ -112,8 +113,8 @@ HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
   for file in "$here"/../../tools/simptp4l/examples/*.sim; do
     expected+=("usr/share/doc/vantel-host/examples/${file##*/}")
   done
-  for file in "$here"/../../docs/man/*.1; do
-    [[ -e $file ]] && expected+=("usr/share/man/man1/${file##*/}.gz")
+  for file in "$here"/../../docs/man/*.[1-8]; do
+    [[ -e $file ]] && expected+=("usr/share/man/man${file##*.}/${file##*/}.gz")
   done
   files vantel-host >"$scratch/files"
   for file in "${expected[@]}"; do

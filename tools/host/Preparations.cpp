@@ -41,4 +41,13 @@ std::optional<std::string> makeConfigFolder(const Json& settings) {
     return folder.string();
 }
 
+std::optional<std::string> prepareChange(const Json& settings, const Json& before, bool force) {
+    constexpr char socket[] = "udsAddress";
+    const bool isOther = settings.value(socket, Json()) != before.value(socket, Json());
+    if (isOther && !force) {
+        refuseSocketInUse(settings);
+    }
+    return makeConfigFolder(settings);
+}
+
 } // namespace vantelhost

@@ -18,4 +18,9 @@ void refuseSocketInUse(const Json& settings);
 /// Throws UsageError when it cannot be made.
 std::optional<std::string> makeConfigFolder(const Json& settings);
 
+/// The same for settings that are to follow others, whose ptp4l still listens.
+/// @param force as --force
+/// @return as makeConfigFolder().
+std::optional<std::string> prepareChange(const Json& settings, const Json& before, bool force);
+
 } // namespace vantelhost

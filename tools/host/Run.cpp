@@ -10,6 +10,7 @@
 
 #include "EventPrinter.h"
 #include "PlainPrinter.h"
+#include "Preparations.h"
 #include "SessionKeeper.h"
 #include "Settings.h"
 #include "SettingsOptions.h"
@@ -38,10 +39,12 @@ void onLostOutput(const std::string& reason) {
 
 } // namespace
 
-Run::Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals)
+Run::Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals,
+         Reread reread)
     : options_(options),
       configText_(std::move(configText)),
       signals_(signals),
+      reread_(std::move(reread)),
       journal_(output(), onLostOutput, begin_) {
     if (!options_.recordFile.empty()) {
         record_.emplace(options_.recordFile, options_.recordRules);
@@ -90,7 +93,7 @@ int Run::execute() {
     journal_.note(loadedEvent(options_.pluginPath, plugIn.name(), plugIn.apiVersion()));
     Schema schema;
     if (journal_.isClean() && readSchema(plugIn, schema)) {
-        keepSessions(plugIn, completedSettings(schema));
+        keepSessions(plugIn, schema);
     } else {
         beginOutputs();
     }
@@ -131,12 +134,32 @@ Json Run::completedSettings(const Schema& schema) const {
     return settings.values;
 }
 
-void Run::keepSessions(const PlugIn& plugIn, Json settings) {
+std::optional<Json> Run::newSettings(const Schema& schema, const Json& settings) {
+    ConfigChange change = reread_(schema, settings);
+    if (change.settings) {
+        try {
+            const auto folder = prepareChange(*change.settings, settings, options_.force);
+            if (folder) {
+                journal_.note(folderEvent(*folder));
+            }
+        } catch (const UsageError& error) {
+            change = {{error.what()}, {}, std::nullopt, {}};
+        }
+    }
+    for (const auto& warning : change.warnings) {
+        complain("warning: " + warning);
+    }
+    journal_.note(rereadEvent(change));
+    return change.settings;
+}
+
+void Run::keepSessions(const PlugIn& plugIn, const Schema& schema) {
     std::optional<EpochFifo> fifo;
     const bool terminalIsShared = view_ && ::isatty(STDERR_FILENO) == 1;
     SessionKeeper keeper({plugIn, options_, journal_, signals_, fifo,
-                          terminalIsShared ? -1 : STDERR_FILENO, [this] { turn(); }},
-                         std::move(settings));
+                          terminalIsShared ? -1 : STDERR_FILENO, [this] { turn(); },
+                          [&](const Json& inUse) { return newSettings(schema, inUse); }},
+                         completedSettings(schema));
     keeper.prepare();
     if (options_.useFifo) {
         fifo.emplace(options_.fifo,

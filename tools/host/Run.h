@@ -2,10 +2,12 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 
 #include "ChronyClock.h"
+#include "ConfigReload.h"
 #include "Failure.h"
 #include "Journal.h"
 #include "Json.h"
@@ -24,10 +26,14 @@ namespace vantelhost {
 /// A run of the program: the plug-in from loading to unloading, and where its news go. Single use.
 class Run {
 public:
-    /// @param configText the content of the configuration file, if there is one
+    /// Reads the configuration again: see rereadConfig().
+    using Reread = std::function<ConfigChange(const Schema& schema, const Json& settings)>;
+
+    /// @param configText the content of the configuration file, if it is a JSON object
     /// @param signals    made before any thread
     /// Throws UsageError.
-    Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals);
+    Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals,
+        Reread reread);
 
     /// Throws UsageError.
     /// @return the exit status.
@@ -39,7 +45,11 @@ private:
     /// @return false when there is none; the journal then knows why.
     bool readSchema(const PlugIn& plugIn, Schema& schema);
     Json completedSettings(const Schema& schema) const;
-    void keepSessions(const PlugIn& plugIn, Json settings);
+    void keepSessions(const PlugIn& plugIn, const Schema& schema);
+
+    /// Reads the configuration again, and tells what it says.
+    /// @return new settings, if there are some.
+    std::optional<Json> newSettings(const Schema& schema, const Json& settings);
 
     /// @return an event, if there is something to tell.
     std::optional<Event> handToChrony(std::uint64_t reference, std::uint64_t local);
@@ -58,6 +68,7 @@ private:
     const RunOptions& options_;
     std::optional<std::string> configText_;
     Signals& signals_;
+    const Reread reread_;
     const Moment::Clock::time_point begin_ = Moment::Clock::now();
     std::optional<LiveView> view_;
     std::optional<Record> record_;

@@ -1,11 +1,13 @@
 #include "RunCommand.h"
 
 #include <memory>
-#include <utility>
 
+#include <CLI/CLI.hpp>
+
+#include "ConfigReload.h"
 #include "Run.h"
+#include "RunConfig.h"
 #include "RunOptions.h"
-#include "SettingsOptions.h"
 #include "Signals.h"
 
 namespace vantelhost {
@@ -13,10 +15,14 @@ namespace vantelhost {
 namespace {
 
 /// Reads the settings before the signals are blocked: Ctrl-C still ends a wait for typed ones.
-int run(const RunOptions& options) {
-    auto configText = readConfig(options);
-    Signals signals;
-    return Run(options, std::move(configText), signals).execute();
+int run(const Words& commandLine) {
+    const RunConfig config = readRunConfig(commandLine);
+    refuseBadFile(config.errors);
+    Signals signals(canReread(config.options) ? Hangup::reread : Hangup::stop);
+    const auto reread = [&](const Schema& schema, const Json& settings) {
+        return rereadConfig(commandLine, config, schema, settings);
+    };
+    return Run(config.options, config.json, signals, reread).execute();
 }
 
 } // namespace
@@ -24,7 +30,7 @@ int run(const RunOptions& options) {
 std::function<int()> prepareRun(CLI::App& command) {
     const auto options = std::make_shared<RunOptions>();
     addRunOptions(command, *options);
-    return [options] { return run(*options); };
+    return [options, &command] { return run(wordsOf(command)); };
 }
 
 } // namespace vantelhost

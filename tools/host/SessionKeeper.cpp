@@ -66,7 +66,7 @@ void SessionKeeper::prepare() {
 
 void SessionKeeper::run() {
     End end = session();
-    while (end.isRestart && restart(end.cause)) {
+    while (end.isRestart && restart(end)) {
         end = session();
     }
     if (begin_) {
@@ -86,8 +86,9 @@ SessionKeeper::End SessionKeeper::session() {
                                          [this] { return with_.signals.stopHasCome(); },
                                          with_.passWordsOn});
         if (!session_->initialise(settings_)) {
-            return {"initialise failed", restarts_ > 0};
+            return settingsRefused();
         }
+        settingsBefore_.reset();
         const End end = startAndAttend();
         session_->stop(end.isRestart ? restartCause : end.cause);
         noteFacts();
@@ -118,16 +119,19 @@ SessionKeeper::End SessionKeeper::startAndAttend() {
     return end;
 }
 
-bool SessionKeeper::restart(const std::string& cause) {
+bool SessionKeeper::restart(const End& end) {
     session_.reset();
-    healedErrors_ = with_.journal.tally().errors;
-    const double seconds = delay_.next();
-    with_.journal.note(restartEvent(cause, seconds, ++restarts_));
-    const auto end = attend(after(Clock::now(), seconds));
-    if (end) {
-        with_.journal.note(stoppingEvent(end->cause));
+    double seconds = 0;
+    if (end.isFailure) {
+        healedErrors_ = with_.journal.tally().errors;
+        seconds = delay_.next();
     }
-    return !end;
+    with_.journal.note(restartEvent(end.cause, seconds, ++restarts_));
+    const auto runEnd = attend(after(Clock::now(), seconds));
+    if (runEnd) {
+        with_.journal.note(stoppingEvent(runEnd->cause));
+    }
+    return !runEnd;
 }
 
 std::optional<SessionKeeper::End> SessionKeeper::attend(std::optional<TimePoint> until) {
@@ -136,6 +140,9 @@ std::optional<SessionKeeper::End> SessionKeeper::attend(std::optional<TimePoint>
                      nextTurn(until));
         if (auto signal = takeNews()) {
             return End{std::move(*signal), false};
+        }
+        if (auto end = reread()) {
+            return end;
         }
         writeDueOffsets();
         if (const auto end = endTime(); end && Clock::now() >= *end) {
@@ -204,12 +211,38 @@ std::optional<std::string> SessionKeeper::takeNews() {
         if (!news->stop.empty()) {
             return news->stop;
         }
+        rereadIsDue_ = rereadIsDue_ || news->reread;
         // Without a session it is the one that was stopped.
         if (news->childEnd && session_) {
             session_->take(*news->childEnd);
         }
     }
     return std::nullopt;
+}
+
+std::optional<SessionKeeper::End> SessionKeeper::reread() {
+    if (!std::exchange(rereadIsDue_, false)) {
+        return std::nullopt;
+    }
+    auto settings = with_.reread(settings_);
+    if (!settings) {
+        return std::nullopt;
+    }
+    // The plug-in has taken the oldest ones.
+    auto before = std::exchange(settings_, std::move(*settings));
+    if (!settingsBefore_) {
+        settingsBefore_ = std::move(before);
+    }
+    return session_ ? std::optional(End{"new settings", true, false}) : std::nullopt;
+}
+
+SessionKeeper::End SessionKeeper::settingsRefused() {
+    if (!settingsBefore_) {
+        return {"initialise failed", restarts_ > 0 && with_.options.restart};
+    }
+    settings_ = std::move(*settingsBefore_);
+    settingsBefore_.reset();
+    return {"the plug-in refused the new settings: back to those before", true, false};
 }
 
 void SessionKeeper::noteFacts() {

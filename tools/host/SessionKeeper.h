@@ -23,7 +23,8 @@
 namespace vantelhost {
 
 /// Keeps a session of the plug-in at work until a signal, the end of the time or, without
-/// --restart, the end of ptp4l ends the run; with it, one session after the other. Single use.
+/// --restart, the end of ptp4l ends the run; with it, one session after the other. New settings,
+/// too, get a session of their own. Single use.
 class SessionKeeper {
 public:
     struct Surroundings {
@@ -34,6 +35,10 @@ public:
         std::optional<EpochFifo>& fifo; ///< there when this host writes epoch offsets
         int passWordsOn;                ///< as LastWords has it
         std::function<void()> onTurn;   ///< called several times a second, by the same thread
+
+        /// Reads the configuration again, and gets the settings in use.
+        /// @return others, if there are some and they may be used; may throw UsageError.
+        std::function<std::optional<Json>(const Json& settings)> reread;
     };
 
     SessionKeeper(Surroundings surroundings, Json settings);
@@ -59,6 +64,7 @@ private:
     struct End {
         std::string cause;
         bool isRestart;
+        bool isFailure = true; ///< of a session; restarts then take their time
     };
 
     End session();
@@ -66,7 +72,7 @@ private:
 
     /// Prepares the next session.
     /// @return false when the run ends instead.
-    bool restart(const std::string& cause);
+    bool restart(const End& end);
 
     /// @return how the session ends; nothing when the time has come.
     std::optional<End> attend(std::optional<TimePoint> until = std::nullopt);
@@ -81,12 +87,21 @@ private:
 
     /// @return the name of a signal that ends the run.
     std::optional<std::string> takeNews();
+
+    /// Reads the configuration again when that is asked for.
+    /// @return the end of a session whose settings are other ones now.
+    std::optional<End> reread();
+
+    /// When the plug-in has refused the settings: back to those before, if there were some.
+    End settingsRefused();
     void noteFacts();
     void writeDueOffsets();
     void writeOffset(std::int64_t nanoseconds);
 
     const Surroundings with_;
-    const Json settings_;
+    Json settings_;
+    std::optional<Json> settingsBefore_; ///< while it is not known whether the plug-in takes them
+    bool rereadIsDue_ = false;
     ServiceManager manager_;
     RestartDelay delay_;
     RunFacts facts_;

@@ -31,6 +31,9 @@ public:
         if (user_.text && !readText(*user_.text)) {
             return std::move(settings_);
         }
+        for (const auto& entry : user_.entries) {
+            take(entry);
+        }
         for (const auto& assignment : user_.assignments) {
             assign(assignment);
         }
@@ -50,8 +53,8 @@ private:
 
     /// File and line of a key's value; empty when it is not from the file.
     std::string placeOf(const std::string& key) const {
-        const auto line = lines_.find(key);
-        return line == lines_.end() ? "" : fmt::format("{}:{}: ", user_.textName, line->second);
+        const auto place = places_.find(key);
+        return place == places_.end() ? "" : place->second + ": ";
     }
 
     /// @return false when the text has no settings to go on with.
@@ -63,7 +66,8 @@ private:
         const auto watchKeys = [&](int depth, Json::parse_event_t event, Json& value) {
             if (event == Json::parse_event_t::key && depth == 1) {
                 const auto key = value.get<std::string>();
-                if (!lines_.insert_or_assign(key, line()).second) {
+                const auto place = fmt::format("{}:{}", user_.textName, line());
+                if (!places_.insert_or_assign(key, place).second) {
                     error(key, "is given twice");
                 }
             }
@@ -83,6 +87,24 @@ private:
         return given_.is_object();
     }
 
+    /// A file that can say all is wrong where it says what nobody knows.
+    void take(const ConfigEntry& entry) {
+        const std::string& key = entry.key;
+        const auto* parameter = find(schema_, key);
+        const bool isNew = places_.insert_or_assign(key, entry.place).second;
+        if (key == interfaceKey) {
+            error(key, "is no setting but an option, and stands above [settings]");
+        } else if (parameter == nullptr) {
+            error(key, "is unknown to the plug-in" + hint(key));
+        } else if (!isNew) {
+            error(key, "is given twice");
+        } else if (entry.isArray) {
+            given_[key] = entry.values;
+        } else {
+            given_[key] = valueFromText(*parameter, entry.values.at(0));
+        }
+    }
+
     void assign(const std::string& assignment) {
         const auto equals = assignment.find('=');
         const std::string key = assignment.substr(0, equals);
@@ -91,7 +113,7 @@ private:
             return;
         }
         const std::string value = assignment.substr(equals + 1);
-        lines_.erase(key);
+        places_.erase(key);
         if (!isUtf8(assignment)) {
             error(toAscii(key), "is not UTF-8 text");
         } else if (key == interfaceKey) {
@@ -108,7 +130,7 @@ private:
         if (!std::all_of(user_.interfaces.begin(), user_.interfaces.end(), isUtf8)) {
             error(interfaceKey, "is not UTF-8 text");
         } else if (!user_.interfaces.empty()) {
-            lines_.erase(interfaceKey);
+            places_.erase(interfaceKey);
             given_[interfaceKey] = user_.interfaces;
         }
     }
@@ -166,7 +188,7 @@ private:
     const Schema& schema_;
     const UserSettings& user_;
     Json given_ = Json::object();
-    std::map<std::string, std::size_t> lines_; ///< in the text, of the keys whose value is from it
+    std::map<std::string, std::string> places_; ///< of the keys whose value is from the file
     std::set<std::string> bad_;
     Settings settings_;
 };

@@ -6,15 +6,17 @@
 #include <string>
 #include <vector>
 
+#include "ConfigFile.h"
 #include "Json.h"
 #include "Schema.h"
 
 namespace vantelhost {
 
-/// What the user gave. Later sources win: text, assignments, interfaces.
+/// What the user gave. Later sources win: text or entries, assignments, interfaces.
 struct UserSettings {
     std::optional<std::string> text;      ///< a JSON object
     std::string textName;                 ///< the file that it is from
+    std::vector<ConfigEntry> entries;     ///< of a file that is no JSON
     std::vector<std::string> assignments; ///< each "key=value"
     std::vector<std::string> interfaces;
     bool interfacesRequired = true;

@@ -1,5 +1,6 @@
 #include "SettingsOptions.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <fstream>
 #include <iostream>
@@ -30,6 +31,41 @@ std::string readAll(std::istream& stream, const std::string& name) {
     }
 }
 
+std::string readFile(const std::string& name) {
+    std::ifstream file(name, std::ios::binary);
+    if (!file) {
+        refuseToRead(name);
+    }
+    return readAll(file, name);
+}
+
+std::string nameOf(const SettingsOptions& options) {
+    return options.configFile == "-" ? standardInput : options.configFile;
+}
+
+/// What stands behind --set in a file becomes settings, that keep their line.
+void moveAssignments(ConfigFile& file) {
+    const auto isAssignment = [](const auto& entry) { return entry.key == "set"; };
+    for (const auto& entry : file.options) {
+        for (const auto& value : isAssignment(entry) ? entry.values : std::vector<std::string>()) {
+            const auto equals = value.find('=');
+            if (equals == std::string::npos || equals == 0) {
+                file.errors.push_back(
+                    {entry.line, fmt::format("{}: set: must be \"key=value\", not {}", entry.place,
+                                             shown(value))});
+            } else {
+                file.settings.push_back({value.substr(0, equals),
+                                         {value.substr(equals + 1)},
+                                         false,
+                                         entry.line,
+                                         entry.place});
+            }
+        }
+    }
+    file.options.erase(std::remove_if(file.options.begin(), file.options.end(), isAssignment),
+                       file.options.end());
+}
+
 } // namespace
 
 void addSettingsOptions(CLI::App& command, SettingsOptions& options) {
@@ -38,8 +74,9 @@ void addSettingsOptions(CLI::App& command, SettingsOptions& options) {
         ->capture_default_str();
     command
         .add_option("--config", options.configFile,
-                    "File with the settings, a JSON object; - "
-                    "is the standard input")
+                    "File with options and settings, see vantel-host.toml(5), or with settings "
+                    "alone, a JSON object; - is the standard input")
+        ->configurable(false)
         ->type_name("FILE");
     command.add_option("--set", options.assignments, "One setting, typed by the plug-in's schema")
         ->type_name("KEY=VALUE")
@@ -54,23 +91,22 @@ void addSettingsOptions(CLI::App& command, SettingsOptions& options) {
         ->excludes(interfaces);
 }
 
-std::optional<std::string> readConfig(const SettingsOptions& options) {
-    const std::string& name = options.configFile;
-    if (name.empty()) {
-        return std::nullopt;
+Config readConfig(const SettingsOptions& options) {
+    if (options.configFile.empty()) {
+        return {};
     }
-    if (name == "-") {
-        return readAll(std::cin, standardInput);
+    const std::string name = nameOf(options);
+    std::string text = options.configFile == "-" ? readAll(std::cin, name) : readFile(name);
+    if (isJsonText(text)) {
+        return {std::move(text), {}};
     }
-    std::ifstream file(name, std::ios::binary);
-    if (!file) {
-        refuseToRead(name);
-    }
-    return readAll(file, name);
+    Config config{std::nullopt, readConfigFile(text, name)};
+    moveAssignments(config.file);
+    return config;
 }
 
-UserSettings userSettings(const SettingsOptions& options, std::optional<std::string> configText) {
-    return {std::move(configText), options.configFile == "-" ? standardInput : options.configFile,
+UserSettings userSettings(const SettingsOptions& options, std::optional<std::string> json) {
+    return {std::move(json),     nameOf(options),    options.fileSettings,
             options.assignments, options.interfaces, !options.noInterfaces};
 }
 

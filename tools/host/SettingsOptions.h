@@ -20,15 +20,22 @@ struct SettingsOptions {
     std::vector<std::string> assignments;
     std::vector<std::string> interfaces;
     bool noInterfaces = false;
+    std::vector<ConfigEntry> fileSettings; ///< of the configuration file, when it is no JSON
 };
 
 /// Adds the options to a command. They are filled when the command line is read.
 void addSettingsOptions(CLI::App& command, SettingsOptions& options);
 
-/// The content of the configuration file; nothing when there is none. Throws UsageError.
-std::optional<std::string> readConfig(const SettingsOptions& options);
+/// What stands in a configuration file: a JSON object, or else options and settings.
+struct Config {
+    std::optional<std::string> json;
+    ConfigFile file;
+};
 
-/// @param configText as readConfig gave it
-UserSettings userSettings(const SettingsOptions& options, std::optional<std::string> configText);
+/// Reads the configuration file, if there is one. Throws UsageError.
+Config readConfig(const SettingsOptions& options);
+
+/// @param json that of the configuration file, if it is one
+UserSettings userSettings(const SettingsOptions& options, std::optional<std::string> json);
 
 } // namespace vantelhost

@@ -47,7 +47,7 @@ void wantChildEnds() {
 
 } // namespace
 
-Signals::Signals() {
+Signals::Signals(Hangup hangup) : hangup_(hangup) {
     sigemptyset(&stops_);
     for (const auto& each : stopSignals) {
         const bool mayBeIgnored = each.number == SIGHUP || each.number == SIGQUIT;
@@ -57,6 +57,9 @@ Signals::Signals() {
     }
     wantChildEnds();
     sigset_t awaited = stops_;
+    if (hangup_ == Hangup::reread) {
+        sigdelset(&stops_, SIGHUP);
+    }
     sigaddset(&awaited, SIGCHLD);
     sigaddset(&awaited, SIGWINCH);
     sigset_t blocked = awaited;
@@ -85,7 +88,12 @@ std::optional<Signals::News> Signals::take() {
         }
         fail(errno, "waiting for signals");
     }
-    News news{stopName(info.ssi_signo), std::nullopt};
+    News news;
+    if (info.ssi_signo == SIGHUP && hangup_ == Hangup::reread) {
+        news.reread = true;
+    } else {
+        news.stop = stopName(info.ssi_signo);
+    }
     taken_ = taken_ || !news.stop.empty();
     if (info.ssi_signo == SIGCHLD) {
         news.childEnd = {static_cast<pid_t>(info.ssi_pid), info.ssi_code != CLD_EXITED,

@@ -7,6 +7,7 @@
 
 #include "CheckCommand.h"
 #include "CommandLine.h"
+#include "CompletionCommand.h"
 #include "ReportCommand.h"
 #include "RunCommand.h"
 #include "SchemaCommand.h"
@@ -21,7 +22,8 @@ int main(int argc, char** argv) {
                         {"check", "Say what would keep the plug-in from working", prepareCheck},
                         {"report", "Make a page of a recording", prepareReport},
                         {"schema", "Show the plug-in's parameters", prepareSchema},
-                        {"status", "Ask a run how it stands", prepareStatus}},
+                        {"status", "Ask a run how it stands", prepareStatus},
+                        {"completion", "Show the completion for bash", prepareCompletion}},
                        argc, argv);
     } catch (const UsageError& error) {
         fmt::print(stderr, "vantel-host: {}\n", onOneLine(error.what()));

@@ -82,3 +82,28 @@ TEST_F(SignalsTest, ANewSizeOfTheTerminalIsNoStop) {
     EXPECT_FALSE(news.childEnd.has_value());
     EXPECT_FALSE(signals.stopHasCome());
 }
+
+TEST_F(SignalsTest, AHangupIsAStopUnlessItAsksToReadAgain) {
+    ::kill(::getpid(), SIGHUP);
+    EXPECT_TRUE(signals.stopHasCome());
+    const auto stop = waitForNews();
+    EXPECT_EQ(stop.stop, "SIGHUP");
+    EXPECT_FALSE(stop.reread);
+}
+
+TEST(RereadingSignals, AHangupIsNoStop) {
+    sigset_t before;
+    pthread_sigmask(SIG_SETMASK, nullptr, &before);
+    {
+        Signals signals(Hangup::reread);
+        ::kill(::getpid(), SIGHUP);
+        EXPECT_FALSE(signals.stopHasCome());
+        const auto news = signals.take().value();
+        EXPECT_TRUE(news.reread);
+        EXPECT_EQ(news.stop, "");
+        ::kill(::getpid(), SIGTERM);
+        EXPECT_TRUE(signals.stopHasCome());
+        EXPECT_EQ(signals.take().value().stop, "SIGTERM");
+    }
+    pthread_sigmask(SIG_SETMASK, &before, nullptr);
+}
