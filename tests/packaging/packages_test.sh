@@ -202,7 +202,7 @@ DependenciesNameTheLibrariesInUse() {
   expect_equal "libraries of the library" "libc6, libcjson1, libgcc-s1, libstdc++6" \
     "$(names libvantel-bc19)"
   # Each release of Debian has its own fmt.
-  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libstdc++6, libvantel-bc19" \
+  expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libstdc++6, libsystemd0, libvantel-bc19" \
     "$(names vantel-host | sed 's/libfmt[0-9]*/libfmtN/')"
 }
 
