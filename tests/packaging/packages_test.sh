@@ -12,18 +12,21 @@ trap 'rm -rf "$scratch"' EXIT
 
 for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
   if ! command -v "$tool" >/dev/null; then
-    echo "SKIPPED: $tool is missing; run scripts/setup.sh packages"
-    exit 77
+    skip "$tool is missing; run scripts/setup.sh packages"
   fi
 done
 if [[ ! -e $build/CPackConfig.cmake ]]; then
-  echo "SKIPPED: dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
-  exit 77
+  skip "dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
 fi
 
 fail() {
   echo "FAILED: $*" >&2
   exit 1
+}
+
+skip() {
+  echo "SKIPPED: $*"
+  exit 77
 }
 
 make_packages() { # folder
@@ -104,7 +107,7 @@ usr/share/doc/libvantel-bc-dev/wire-format.md" "$(files libvantel-bc-dev)"
 HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
   local expected=(usr/bin/simptp4l usr/bin/vantel-host
     usr/share/bash-completion/completions/vantel-host) file
-  for file in configuration host-interface metrics oddities operations security simptp4l vantel-host; do
+  for file in configuration host-interface metrics oddities operations security service simptp4l vantel-host; do
     expected+=("usr/share/doc/vantel-host/$file.md")
   done
   for file in "$here"/../../monitoring/*; do
@@ -120,9 +123,41 @@ HostPackageHoldsBothToolsWithManualPagesDocumentsAndScripts() {
   for file in "${expected[@]}"; do
     grep -qxF "$file" "$scratch/files" || fail "$file is missing"
   done
-  if grep -E '^usr/(lib|include)' "$scratch/files"; then
+  if grep -E '^usr/(lib/TRIPLET|include)' "$scratch/files"; then
     fail "these belong to another package"
   fi
+}
+
+HostPackageHoldsAServiceWithItsUserFifoAndConfiguration() {
+  expect_equal "files" "etc/vantel-host/vantel-host.toml
+usr/lib/systemd/system/vantel-host.service
+usr/lib/sysusers.d/vantel-host.conf
+usr/lib/tmpfiles.d/vantel-host.conf
+usr/libexec/vantel-host/ptp4l-software
+usr/share/vantel-host/chrony-socket.conf
+usr/share/vantel-host/software-time-stamps.conf" \
+    "$(files vantel-host | grep -E '^etc/|^usr/(lib|libexec|share/vantel-host)/')"
+  expect_equal "configuration files" /etc/vantel-host/vantel-host.toml \
+    "$(dpkg-deb --info "$(deb vantel-host)" conffiles)"
+}
+
+unpack_service() {
+  command -v systemd-analyze >/dev/null || skip "systemd-analyze is missing (package systemd)"
+  dpkg-deb -x "$(deb vantel-host)" "$scratch/root"
+  service=$scratch/root/usr/lib/systemd/system/vantel-host.service
+}
+
+# The scale goes from 0 to 10; the threshold is in tenths.
+ServiceHasFewRights() {
+  unpack_service
+  systemd-analyze security --no-pager --offline=true --threshold=40 "$service"
+}
+
+# It would also say that the program is not installed.
+ServiceIsUnderstoodBySystemd() {
+  unpack_service
+  sed -i 's,=/usr/bin/vantel-host ,=/bin/true ,' "$service"
+  expect_equal "what systemd-analyze says" "" "$(systemd-analyze verify --man=no "$service" 2>&1)"
 }
 
 # Links to other places, without the headings there, as "document link".
@@ -172,7 +207,7 @@ DependenciesNameTheLibrariesInUse() {
     "$(names libvantel-bc19)"
   # Each release of Debian has its own fmt and prometheus-cpp.
   expect_equal "libraries of the tools" "libc6, libfmtN, libgcc-s1, libprometheus-cpp-pullN,\
- libstdc++6, libvantel-bc19" \
+ libstdc++6, libsystemd0, libvantel-bc19" \
     "$(names vantel-host | sed -E 's/(libfmt|libprometheus-cpp-[a-z]+)[0-9.]+/\1N/g')"
 }
 
@@ -182,12 +217,15 @@ scripts() {
   for package in libvantel-bc19 libvantel-bc-dev vantel-host; do
     rm -rf "$scratch/control"
     dpkg-deb --control "$(deb $package)" "$scratch/control"
-    find "$scratch/control" -name 'p*' -printf "$package: %f\n"
+    find "$scratch/control" -name 'p*' -printf "$package: %f\n" | sort
   done
 }
 
-LibraryPackageAloneRunsAScript() {
-  expect_equal "scripts" "libvantel-bc19: postinst" "$(scripts)"
+OnlyTheLibraryAndTheServiceRunScripts() {
+  expect_equal "scripts" "libvantel-bc19: postinst
+vantel-host: postinst
+vantel-host: postrm
+vantel-host: prerm" "$(scripts)"
 }
 
 LibraryPackageMakesTheFolderOfTheDefaultConfigurationFile() {

@@ -7,7 +7,7 @@
 namespace vantelhost {
 
 bool PlainPrinter::operator()(const Event& event, const Moment& moment) {
-    if (event.name == "expected") {
+    if (isLeftOut(event.name)) {
         return true;
     }
     if (event.name == "stopping" && !tellAllRepetitions(moment)) {
@@ -23,6 +23,11 @@ bool PlainPrinter::operator()(const Event& event, const Moment& moment) {
     }
     last->second.text = event.text;
     return print_(event, moment);
+}
+
+bool PlainPrinter::isLeftOut(const std::string& name) const {
+    return name == "expected" ||
+           (detail_ == Detail::quiet && (name == "pair" || name == "metadata"));
 }
 
 bool PlainPrinter::tellRepetitions(const std::string& name, Last& last,

@@ -14,8 +14,11 @@ namespace vantelhost {
 /// is expected of a run that a signal ends is left out. Not thread-safe.
 class PlainPrinter {
 public:
+    enum class Detail { all, quiet }; ///< quiet: neither time pairs nor metadata
+
     /// @param descriptor not owned.
-    explicit PlainPrinter(int descriptor) : print_(descriptor, Format::readable) {}
+    explicit PlainPrinter(int descriptor, Detail detail = Detail::all)
+        : print_(descriptor, Format::readable), detail_(detail) {}
 
     /// @return false when a line could not be written; errno says why.
     bool operator()(const Event& event, const Moment& moment);
@@ -26,10 +29,12 @@ private:
         std::uint64_t repetitions = 0;
     };
 
+    bool isLeftOut(const std::string& name) const;
     bool tellRepetitions(const std::string& name, Last& last, const Moment& moment) const;
     bool tellAllRepetitions(const Moment& moment);
 
     EventPrinter print_;
+    Detail detail_;
     std::map<std::string, Last> last_; ///< by the event's name
 };
 

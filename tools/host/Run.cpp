@@ -71,7 +71,8 @@ EventSink Run::output() {
         return EventPrinter(STDOUT_FILENO, Format::jsonLines);
     }
     if (!showsLive(options_)) {
-        return PlainPrinter(STDOUT_FILENO);
+        using Detail = PlainPrinter::Detail;
+        return PlainPrinter(STDOUT_FILENO, options_.quiet ? Detail::quiet : Detail::all);
     }
     view_.emplace(STDOUT_FILENO, begin_);
     return [this](const Event& event, const Moment& moment) { return view_->take(event, moment); };

@@ -101,6 +101,8 @@ void addOutput(CLI::App& command, RunOptions& options) {
         .add_flag("--plain", options.plain,
                   "Print a line per event also on a terminal, not the live view")
         ->excludes(json);
+    command.add_flag("--quiet", options.quiet, "Print no lines for time pairs and metadata")
+        ->excludes(json);
     addRecord(command, options);
     command
         .add_option("--chrony", options.chronySocket,

@@ -28,6 +28,7 @@ struct RunOptions : SettingsOptions {
     std::optional<double> seconds;
     bool jsonLines = false;
     bool plain = false;     ///< lines also on a terminal
+    bool quiet = false;     ///< no lines for pairs and metadata
     std::string recordFile; ///< empty when nothing is recorded
     RecordRules recordRules;
     std::string chronySocket; ///< empty when chronyd gets nothing

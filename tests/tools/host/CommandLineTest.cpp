@@ -181,6 +181,7 @@ TEST(CommandLine, MistakesGiveTheStatusOfUsageErrors) {
              {"run", "--epoch-offset-at", "1:"},
              {"run", "--no-interfaces", "--interface", "eth0"},
              {"run", "--json", "--plain"},
+             {"run", "--json", "--quiet"},
              {"run", "--record"},
              {"run", "--chrony"},
          }) {

@@ -67,6 +67,14 @@ TEST_F(PlainPrinterTest, WhatIsExpectedIsLeftOut) {
     EXPECT_EQ(contentOf(path), "");
 }
 
+TEST_F(PlainPrinterTest, QuietlyNeitherPairsNorMetadataAreTold) {
+    PlainPrinter quiet(file, PlainPrinter::Detail::quiet);
+    EXPECT_TRUE(quiet(pairEvent(5, 7, 2), {1.5, 0}));
+    EXPECT_TRUE(quiet(metadataEvent(Json::object()), {1.5, 0}));
+    EXPECT_TRUE(quiet(qualityEvent(usable.data(), "a"), {1.5, 0}));
+    EXPECT_EQ(contentOf(path), "     1.500 quality      usable [2.5e-08, 1e-06, -1] a\n");
+}
+
 TEST_F(PlainPrinterTest, AFullDiskIsTold) {
     const int full = ::open("/dev/full", O_WRONLY | O_CLOEXEC);
     PlainPrinter lossy(full);
