@@ -72,11 +72,11 @@ private:
 class MeasuredHost {
 public:
     MeasuredHost() : callbacks_(journal_, false) {
-        journal_.addOutput("metrics", [this](const Event& event, const Moment& moment) {
+        journal_.addOutput([this](const Event& event, const Moment& moment) {
             if (hasMetrics) {
                 metrics_.take(event, moment);
             }
-            return true;
+            return std::nullopt;
         });
         journal_.outputsAreComplete();
     }

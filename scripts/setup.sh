@@ -99,6 +99,11 @@ if [[ $foreign == yes ]]; then
   "${as_root[@]}" dpkg --add-architecture armhf
 fi
 apt update || echo "setup: warning: some package lists could not be fetched" >&2
+# libsystemd's own library must have the same version for both, and the lists of an architecture lag behind at times.
+if [[ "${missing[*]}" == *libsystemd-dev:armhf* ]]; then
+  version=$(apt-cache policy liblzma5:armhf | sed -n 's/^ *Candidate: //p')
+  missing+=("liblzma5=$version" "liblzma5:armhf=$version")
+fi
 apt install -y --no-install-recommends "${missing[@]}" || true
 
 find_missing

@@ -23,9 +23,6 @@ public:
     /// @return an event when handing over begins to work or to fail.
     std::optional<Event> take(std::uint64_t reference, std::uint64_t local);
 
-    std::uint64_t sent() const { return sent_; }
-    std::uint64_t failed() const { return failed_; }
-
     /// Whether there were pairs, and none was taken.
     bool tookNone() const { return sent_ == 0 && failed_ > 0; }
 

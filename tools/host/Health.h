@@ -57,7 +57,7 @@ Health healthOf(const HealthFacts& facts, double now);
 /// A health that has lasted for so many seconds.
 struct Standing {
     Health health;
-    double seconds;
+    double seconds = 0;
 };
 
 /// Gathers the facts of a run from its events. Knows nothing of threads.

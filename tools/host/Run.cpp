@@ -192,15 +192,15 @@ void Run::beginOutputs() {
         });
     }
     if (statusPage_) {
-        journal_.addOutput("status", [this](const Event& event, const Moment& moment) {
+        journal_.addOutput([this](const Event& event, const Moment& moment) {
             statusPage_->take(event, moment);
-            return true;
+            return std::nullopt;
         });
     }
     if (metrics_) {
-        journal_.addOutput("metrics", [this](const Event& event, const Moment& moment) {
+        journal_.addOutput([this](const Event& event, const Moment& moment) {
             metrics_->take(event, moment);
-            return true;
+            return std::nullopt;
         });
     }
     journal_.outputsAreComplete();

@@ -89,7 +89,7 @@ SessionKeeper::End SessionKeeper::session() {
             return settingsRefused();
         }
         settingsBefore_.reset();
-        const End end = startAndAttend();
+        End end = startAndAttend();
         session_->stop(end.isRestart ? restartCause : end.cause);
         noteFacts();
         return end;
@@ -112,7 +112,7 @@ SessionKeeper::End SessionKeeper::startAndAttend() {
         begin_ = Clock::now();
         manager_.isReady();
     }
-    const End end = *attend();
+    End end = *attend();
     if (!end.isRestart) {
         manager_.isStopping();
     }
