@@ -172,12 +172,12 @@ TEST_F(HealthTest, AChangeIsAnEventWithTheTimeSpentBefore) {
     EXPECT_EQ(first->members["before"], "starting");
     EXPECT_EQ(first->members["spent"], 105.1);
     EXPECT_FALSE(watch.change(105.2));
-    const auto second = watch.change(107.5);
+    const auto second = watch.change(108.5);
     ASSERT_TRUE(second);
     EXPECT_EQ(second->members["state"], "stale");
     EXPECT_EQ(second->members["before"], "locked");
-    EXPECT_EQ(second->members["spent"], 2.4);
-    EXPECT_EQ(watch.standing(108).seconds, 0.5);
+    EXPECT_EQ(second->members["spent"], 3.4);
+    EXPECT_EQ(watch.standing(109).seconds, 0.5);
 }
 
 TEST_F(HealthTest, TheSyncIntervalIsLearntFromThePairs) {
