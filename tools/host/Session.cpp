@@ -1,5 +1,7 @@
 #include "Session.h"
 
+#include <utility>
+
 namespace vantelhost {
 
 namespace {
@@ -24,19 +26,13 @@ Session::Session(const PlugIn& plugIn, Journal& journal, const Manner& manner)
       callbacks_(journal, manner.refuseWhileStopping, manner.endsBySignal),
       words_(manner.passWordsOn) {}
 
-Session::~Session() {
-    if (phase_ == Phase::initialised) {
-        stop("failure");
-    }
-}
-
 bool Session::initialise(const Json& settings) {
     HostStatus status;
     plugIn_.initialise(callbacks_.slot(), settings.dump(), status);
     if (!succeeded(journal_, "initialize", status)) {
         return false;
     }
-    phase_ = Phase::initialised;
+    isInitialised_ = true;
     journal_.note(initialisedEvent(settings));
     return true;
 }
@@ -55,7 +51,9 @@ bool Session::start() {
 }
 
 void Session::stop(const std::string& cause) {
-    phase_ = Phase::stopped;
+    if (!std::exchange(isInitialised_, false)) {
+        return;
+    }
     journal_.note(stoppingEvent(cause));
     callbacks_.stoppingBegins();
     plugIn_.stop(callbacks_.slot());

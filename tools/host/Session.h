@@ -14,7 +14,8 @@
 
 namespace vantelhost {
 
-/// One session of the plug-in, from its initialisation to its end. Single use, and one at a time.
+/// One session of the plug-in, from its initialisation to its end, which stop() is. Single use, and
+/// one at a time.
 class Session {
 public:
     struct Manner {
@@ -24,9 +25,7 @@ public:
     };
 
     Session(const PlugIn& plugIn, Journal& journal, const Manner& manner);
-
-    /// Ends what is not ended yet: the plug-in's child must be stopped whatever happens.
-    ~Session();
+    ~Session() = default;
     Session(const Session&) = delete;
     Session& operator=(const Session&) = delete;
 
@@ -34,7 +33,8 @@ public:
     bool initialise(const Json& settings);
     bool start();
 
-    /// Also after a start that failed: whatever that left running ends here.
+    /// Also after a start that failed: whatever that left running ends here. Does nothing when
+    /// there is no session any more, or yet.
     /// @param cause for the journal
     void stop(const std::string& cause);
 
@@ -50,13 +50,11 @@ public:
     bool daemonWasNotExecuted() const { return notExecuted_; }
 
 private:
-    enum class Phase { created, initialised, stopped };
-
     const PlugIn& plugIn_;
     Journal& journal_;
     Callbacks callbacks_;
     LastWords words_;
-    Phase phase_ = Phase::created;
+    bool isInitialised_ = false;
     std::string daemonEnd_;
     bool notExecuted_ = false;
 };

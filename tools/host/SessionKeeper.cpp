@@ -95,7 +95,10 @@ SessionKeeper::End SessionKeeper::session() {
         return end;
     } catch (const std::exception& error) {
         with_.journal.error(failureEvent("run", error.what()));
-        session_.reset();
+        // The plug-in's child must be stopped whatever happens.
+        if (session_) {
+            session_->stop("failure");
+        }
         return {error.what(), with_.options.restart};
     }
 }
