@@ -97,7 +97,7 @@ SessionKeeper::End SessionKeeper::session() {
         with_.journal.error(failureEvent("run", error.what()));
         // The plug-in's child must be stopped whatever happens.
         if (session_) {
-            session_->stop("failure");
+            session_->stop(with_.options.restart ? restartCause : "failure");
         }
         return {error.what(), with_.options.restart};
     }
