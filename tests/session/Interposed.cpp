@@ -9,6 +9,7 @@
 #include <ctime>
 #include <limits>
 #include <mutex>
+#include <utility>
 
 #include <linux/futex.h>
 #include <pthread.h>
@@ -66,11 +67,18 @@ std::atomic<int> workerSleepCount{0};
 std::atomic<nanoseconds> shortestWorkerSleep{nanoseconds::max()};
 std::atomic<nanoseconds> longestWorkerSleep{nanoseconds::min()};
 
+/// Empty: they are slept.
+std::function<void(nanoseconds)>& sleepTeller() {
+    static std::function<void(nanoseconds)> instance;
+    return instance;
+}
+
 /// The worker alone sleeps less than a second without being the first thread.
+bool isWorkers(nanoseconds duration) {
+    return duration < std::chrono::seconds(1) && gettid() != getpid();
+}
+
 void countWorkersSleep(nanoseconds duration) {
-    if (gettid() == getpid()) {
-        return;
-    }
     shortestWorkerSleep = std::min(shortestWorkerSleep.load(), duration);
     longestWorkerSleep = std::max(longestWorkerSleep.load(), duration);
     ++workerSleepCount;
@@ -126,12 +134,16 @@ extern "C" {
 
 [[gnu::visibility("default")]] int nanosleep(const timespec* duration, timespec* rest) {
     const auto asked = std::chrono::seconds(duration->tv_sec) + nanoseconds(duration->tv_nsec);
-    if (asked < std::chrono::seconds(1)) {
+    if (isWorkers(asked)) {
         countWorkersSleep(asked);
     }
     if (asked == beforeFirstPoll) {
         std::unique_lock<std::mutex> lock(hold().mutex);
         hold().changed.wait(lock, [] { return !hold().isOn; });
+    }
+    if (isWorkers(asked) && sleepTeller()) {
+        sleepTeller()(asked);
+        return 0;
     }
     const nanoseconds end = steady_clock::now().time_since_epoch() + asked;
     return asked < std::chrono::seconds(1) ? sleepBriefly(duration, end, rest)
@@ -199,6 +211,14 @@ ShortSleeps::ShortSleeps() {
 
 ShortSleeps::~ShortSleeps() {
     sleepsAreShort = 0;
+}
+
+ToldSleeps::ToldSleeps(std::function<void(nanoseconds)> teller) {
+    sleepTeller() = std::move(teller);
+}
+
+ToldSleeps::~ToldSleeps() {
+    sleepTeller() = nullptr;
 }
 
 HeldPolls::HeldPolls() {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <chrono>
+#include <functional>
 #include <ostream>
 #include <vector>
 
@@ -53,6 +54,16 @@ public:
     ~ShortSleeps();
     ShortSleeps(const ShortSleeps&) = delete;
     ShortSleeps& operator=(const ShortSleeps&) = delete;
+};
+
+/// While this object lives the worker's sleeps pass at once, and are told instead, by its thread.
+/// Only while there is no worker may this object come and go.
+class ToldSleeps {
+public:
+    explicit ToldSleeps(std::function<void(std::chrono::nanoseconds)> teller);
+    ~ToldSleeps();
+    ToldSleeps(const ToldSleeps&) = delete;
+    ToldSleeps& operator=(const ToldSleeps&) = delete;
 };
 
 /// Lets sleeps of 125 ms begin no sooner than this object goes: the worker's before its first poll.

@@ -31,9 +31,14 @@ Clock::Clock(const Script& script, int logSyncInterval, std::int64_t start)
       start_(start),
       interval_(intervalOf(script, logSyncInterval)),
       present_(script.gmPresent),
-      since_(script.gmAfter) {}
+      since_(script.gmAfter) {
+    if (script.clock == ClockSource::steered) {
+        start_ = (*steered_.emplace(script.steeredFile)).now;
+    }
+}
 
 ClockReading Clock::read(std::int64_t now) {
+    now = elapsed(now);
     const bool present = present_ && now >= since_;
     if (present) {
         const std::int64_t index = (now - since_) / interval_;
@@ -47,6 +52,7 @@ ClockReading Clock::read(std::int64_t now) {
 }
 
 void Clock::setGrandmaster(bool present, std::int64_t now) {
+    now = elapsed(now);
     if (present == present_ && (!present || now >= since_)) {
         return;
     }
@@ -66,13 +72,18 @@ void Clock::step(std::int64_t difference) {
     }
 }
 
+std::int64_t Clock::elapsed(std::int64_t now) const {
+    return steered_ ? (*steered_)->now - start_ : now;
+}
+
 void Clock::measure(std::int64_t arrival, std::uint64_t index) {
     last_ = arrival;
     ingress_ = ingressOf(arrival) + stepped_;
     // Without a delay no offset can be told: the last one stays.
     if (index >= script_.syncsBeforeDelay) {
         const double drift = script_.driftPpb * (static_cast<double>(arrival) / 1e9);
-        offset_ = script_.offset + std::llround(drift) + jitter(index) + stepped_;
+        offset_ = script_.offset + std::llround(drift) + jitter(index) + stepped_ +
+                  steeredOffset(arrival);
     }
 }
 
@@ -82,10 +93,16 @@ std::int64_t Clock::ingressOf(std::int64_t arrival) const {
         return script_.fixedTime;
     case ClockSource::monotonic:
         return start_ + arrival;
+    case ClockSource::steered:
+        return (*steered_)->localAt(start_ + arrival);
     case ClockSource::realtime:
         break;
     }
     return start_ + arrival + readClock(CLOCK_REALTIME) - readClock(CLOCK_MONOTONIC);
+}
+
+std::int64_t Clock::steeredOffset(std::int64_t arrival) const {
+    return steered_ ? ingressOf(arrival) - (start_ + arrival) - (*steered_)->grandmaster : 0;
 }
 
 std::int64_t Clock::jitter(std::uint64_t index) const {

@@ -56,7 +56,7 @@ struct TimedAction {
     Action action;
 };
 
-enum class ClockSource { realtime, monotonic, fixed };
+enum class ClockSource { realtime, monotonic, fixed, steered };
 
 struct Script {
     std::int64_t offset = 0;
@@ -67,6 +67,7 @@ struct Script {
     std::uint64_t syncsBeforeDelay = 1; ///< of each grandmaster
     ClockSource clock = ClockSource::realtime;
     std::int64_t fixedTime = 0;
+    std::string steeredFile; ///< holds a SteeredTime
 
     bool gmPresent = true;
     std::int64_t gmAfter = 0;

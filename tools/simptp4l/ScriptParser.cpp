@@ -62,6 +62,9 @@ void takeClock(ScriptWords& words, Script& script) {
     } else if (source == "fixed") {
         script.fixedTime = words.takeInteger("time", -maxTime, maxTime);
         script.clock = ClockSource::fixed;
+    } else if (source == "steered") {
+        script.steeredFile = words.take("path");
+        script.clock = ClockSource::steered;
     } else {
         throw ScriptError("unknown clock: " + source);
     }

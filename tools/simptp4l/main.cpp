@@ -69,6 +69,9 @@ Script loadScript(const CommandLine& line, const StartRecord& record, Log& log) 
                         std::generic_category().message(errno));
     }
     log.start(record);
+    if (script.clock == ClockSource::steered) {
+        script.steeredFile = besideScript(script.steeredFile, path);
+    }
     if (!texts.empty()) {
         throw Failure{badScript, texts};
     }
