@@ -105,6 +105,7 @@ void Journal::metadata(const std::string& text, bool expected) {
     }
     const Event event = metadataEvent(metadata);
     const std::lock_guard lock(mutex_);
+    lastCall_ = Moment::Clock::now();
     if (expected) {
         print(expectedEvent(event));
         return;

@@ -77,7 +77,7 @@ public:
     /// For how long which health has lasted.
     Standing health() const;
 
-    /// How long ago the plug-in called, whatever it had to say, in seconds.
+    /// How long ago a call of the plug-in was taken, whatever it had to say, in seconds.
     double sinceLastCall() const;
 
     void summary();

@@ -32,11 +32,6 @@ void complain(const std::string& text) {
     std::fputs(fmt::format("vantel-host: {}\n", onOneLine(text)).c_str(), stderr);
 }
 
-void onLostOutput(const std::string& reason) {
-    complain("output: " + reason);
-    Signals::requestStop();
-}
-
 } // namespace
 
 Run::Run(const RunOptions& options, std::optional<std::string> configText, Signals& signals,
@@ -45,7 +40,8 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
       configText_(std::move(configText)),
       signals_(signals),
       reread_(std::move(reread)),
-      journal_(output(), onLostOutput, begin_) {
+      journal_(
+          output(), [this](const std::string& reason) { loseOutput(reason); }, begin_) {
     if (!options_.recordFile.empty()) {
         record_.emplace(options_.recordFile, options_.recordRules);
     }
@@ -103,7 +99,19 @@ int Run::execute() {
     }
     tellFailure();
     journal_.summary();
-    return journal_.tally().errors == healedErrors_ ? exitClean : exitFailed;
+    return endsWell() ? exitClean : exitFailed;
+}
+
+bool Run::endsWell() const {
+    // Whoever runs it for months has seen how it stood, and asks for nothing but its end.
+    const bool isAskedToEnd = options_.restart && signals_.stopHasCome() && !outputIsLost_;
+    return isAskedToEnd || journal_.tally().errors == healedErrors_;
+}
+
+void Run::loseOutput(const std::string& reason) {
+    outputIsLost_ = true;
+    complain("output: " + reason);
+    Signals::requestStop();
 }
 
 bool Run::readSchema(const PlugIn& plugIn, Schema& schema) {
@@ -167,8 +175,7 @@ void Run::keepSessions(const PlugIn& plugIn, const Schema& schema) {
                      options_.createFifo ? EpochFifo::Absent::create : EpochFifo::Absent::refuse);
     }
     beginOutputs();
-    // Nothing is begun when the output or the record is lost already.
-    if (!journal_.isClean()) {
+    if (outputIsLost_) {
         return;
     }
     keeper.run();

@@ -1,6 +1,7 @@
 /// @file
 #pragma once
 
+#include <atomic>
 #include <cstdint>
 #include <functional>
 #include <optional>
@@ -42,6 +43,10 @@ public:
 private:
     EventSink output();
 
+    /// Ends the run. From any thread.
+    void loseOutput(const std::string& reason);
+    bool endsWell() const;
+
     /// @return false when there is none; the journal then knows why.
     bool readSchema(const PlugIn& plugIn, Schema& schema);
     Json completedSettings(const Schema& schema) const;
@@ -76,6 +81,7 @@ private:
     std::optional<StatusPage> statusPage_;
     std::optional<StatusSocket> statusSocket_;
     std::optional<Metrics> metrics_;
+    std::atomic<bool> outputIsLost_{false};
     Journal journal_;
     RunFacts facts_;
     std::uint64_t healedErrors_ = 0;

@@ -9,6 +9,7 @@
 #include <fmt/format.h>
 #include <poll.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 
 #include "Checks/DaemonChecks.h"
 #include "Preparations.h"
@@ -41,6 +42,20 @@ void waitForInput(int one, int other, Clock::time_point deadline) {
     const auto left = std::chrono::ceil<std::chrono::milliseconds>(deadline - Clock::now());
     std::array<pollfd, 2> inputs{{{one, POLLIN, 0}, {other, POLLIN, 0}}};
     ::poll(inputs.data(), inputs.size(), static_cast<int>(std::max(left, left * 0).count()));
+}
+
+/// A ptp4l that the plug-in had to kill is not waited for by it: one that ends late would be taken
+/// for the next session's, and stay a zombie.
+void awaitChildren() {
+    const auto deadline = Clock::now() + std::chrono::seconds(1);
+    for (pid_t ended = 0; (ended = ::waitpid(-1, nullptr, WNOHANG)) >= 0;) {
+        if (ended == 0 && Clock::now() >= deadline) {
+            return;
+        }
+        if (ended == 0) {
+            ::poll(nullptr, 0, 10);
+        }
+    }
 }
 
 bool isThere(const std::string& path) {
@@ -77,6 +92,9 @@ void SessionKeeper::run() {
 }
 
 SessionKeeper::End SessionKeeper::session() {
+    facts_.daemonEnd.clear();
+    facts_.daemonMend.clear();
+    pollsBefore_ = with_.journal.tally().timeRequests;
     try {
         if (restarts_ > 0) {
             prepare();
@@ -86,9 +104,8 @@ SessionKeeper::End SessionKeeper::session() {
                                          [this] { return with_.signals.stopHasCome(); },
                                          with_.passWordsOn});
         if (!session_->initialise(settings_)) {
-            return settingsRefused();
+            return initialiseFailed();
         }
-        settingsBefore_.reset();
         End end = startAndAttend();
         session_->stop(end.isRestart ? restartCause : end.cause);
         noteFacts();
@@ -99,7 +116,7 @@ SessionKeeper::End SessionKeeper::session() {
         if (session_) {
             session_->stop(with_.options.restart ? restartCause : "failure");
         }
-        return {error.what(), with_.options.restart};
+        return failed(error.what());
     }
 }
 
@@ -109,7 +126,7 @@ SessionKeeper::End SessionKeeper::startAndAttend() {
         writeOffset(*epochOffset_);
     }
     if (!session_->start()) {
-        return {"start failed", with_.options.restart};
+        return failed("start failed");
     }
     if (!begin_) {
         begin_ = Clock::now();
@@ -124,11 +141,9 @@ SessionKeeper::End SessionKeeper::startAndAttend() {
 
 bool SessionKeeper::restart(const End& end) {
     session_.reset();
-    double seconds = 0;
-    if (end.isFailure) {
-        healedErrors_ = with_.journal.tally().errors;
-        seconds = delay_.next();
-    }
+    awaitChildren();
+    healedErrors_ = with_.journal.tally().errors;
+    const double seconds = end.isFailure ? delay_.next() : 0;
     with_.journal.note(restartEvent(end.cause, seconds, ++restarts_));
     const auto runEnd = attend(after(Clock::now(), seconds));
     if (runEnd) {
@@ -180,6 +195,10 @@ std::optional<SessionKeeper::TimePoint> SessionKeeper::endTime() const {
 void SessionKeeper::turn() {
     with_.journal.turn();
     with_.onTurn();
+    // ptp4l has answered: it has taken the new settings.
+    if (with_.journal.tally().timeRequests > pollsBefore_) {
+        settingsBefore_.reset();
+    }
     const Standing standing = with_.journal.health();
     if (standing.health.state == HealthState::locked && standing.seconds >= goodTime) {
         delay_.reset();
@@ -190,18 +209,18 @@ void SessionKeeper::turn() {
     }
 }
 
-std::optional<SessionKeeper::End> SessionKeeper::reasonToEnd() const {
+std::optional<SessionKeeper::End> SessionKeeper::reasonToEnd() {
     if (!session_) {
         return std::nullopt;
     }
     const auto& [health, seconds] = with_.journal.health();
     if (health.state == HealthState::dead) {
-        return End{health.reason, with_.options.restart};
+        return failed(health.reason);
     }
     const double patience = with_.options.giveUpAfter;
     if (with_.options.restart && patience > 0 && health.state == HealthState::lost &&
         seconds >= patience) {
-        return End{fmt::format("lost for {:.0f} s: {}", seconds, health.reason), true};
+        return failed(fmt::format("lost for {:.0f} s: {}", seconds, health.reason));
     }
     return std::nullopt;
 }
@@ -239,18 +258,25 @@ std::optional<SessionKeeper::End> SessionKeeper::reread() {
     return session_ ? std::optional(End{"new settings", true, false}) : std::nullopt;
 }
 
-SessionKeeper::End SessionKeeper::settingsRefused() {
+SessionKeeper::End SessionKeeper::initialiseFailed() {
+    // At the very first there is nothing that a new session could heal.
+    if (restarts_ == 0) {
+        return {"initialise failed", false};
+    }
+    return failed("initialise failed");
+}
+
+SessionKeeper::End SessionKeeper::failed(const std::string& cause) {
     if (!settingsBefore_) {
-        return {"initialise failed", restarts_ > 0 && with_.options.restart};
+        return {cause, with_.options.restart};
     }
     settings_ = std::move(*settingsBefore_);
     settingsBefore_.reset();
-    return {"the plug-in refused the new settings: back to those before", true, false};
+    return {cause + ": back to the settings before", true, false};
 }
 
 void SessionKeeper::noteFacts() {
     facts_.daemonEnd = session_->daemonEnd();
-    facts_.daemonMend.clear();
     facts_.fifoIsThere = isThere(with_.options.fifo);
     lastWords_ = facts_.daemonEnd.empty() ? session_->words().lines() : std::deque<std::string>();
     if (!session_->daemonWasNotExecuted()) {

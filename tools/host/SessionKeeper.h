@@ -83,7 +83,7 @@ private:
     void turn();
 
     /// What the health asks for.
-    std::optional<End> reasonToEnd() const;
+    std::optional<End> reasonToEnd();
 
     /// @return the name of a signal that ends the run.
     std::optional<std::string> takeNews();
@@ -92,15 +92,19 @@ private:
     /// @return the end of a session whose settings are other ones now.
     std::optional<End> reread();
 
-    /// When the plug-in has refused the settings: back to those before, if there were some.
-    End settingsRefused();
+    End initialiseFailed();
+
+    /// How a session ends that failed. With new settings that ptp4l has not answered with, those
+    /// before are back.
+    End failed(const std::string& cause);
     void noteFacts();
     void writeDueOffsets();
     void writeOffset(std::int64_t nanoseconds);
 
     const Surroundings with_;
     Json settings_;
-    std::optional<Json> settingsBefore_; ///< while it is not known whether the plug-in takes them
+    std::optional<Json> settingsBefore_; ///< until ptp4l has answered with those that are new
+    std::uint64_t pollsBefore_ = 0;      ///< good ones, before this session
     bool rereadIsDue_ = false;
     ServiceManager manager_;
     RestartDelay delay_;

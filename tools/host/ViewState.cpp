@@ -99,6 +99,10 @@ void update(ViewState& state, const Event& event, double seconds) {
         addProblem(state, seconds, event.text);
     } else if (event.name == "metrics" && !members["listening"].get<bool>()) {
         addProblem(state, seconds, "metrics " + event.text);
+    } else if (event.name == "reread" && !members["problems"].empty()) {
+        addProblem(state, seconds, "configuration: " + event.text);
+    } else if (event.name == "status-socket" || event.name == "lost") {
+        addProblem(state, seconds, event.name + " " + event.text);
     } else if (event.name == "error" || event.name == "warning" || event.name == "refused") {
         addProblem(state, seconds, event.text);
     }

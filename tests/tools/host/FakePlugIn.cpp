@@ -127,7 +127,9 @@ public:
         }
         if (childPid_ > 0) {
             ::kill(childPid_, SIGTERM);
-            ::waitpid(childPid_, nullptr, 0);
+            if (!does("leaves-child")) {
+                ::waitpid(childPid_, nullptr, 0);
+            }
         }
         record("stop");
     }

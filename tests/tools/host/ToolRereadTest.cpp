@@ -5,6 +5,8 @@
 #include "Tool.h"
 #include "support/Child.h"
 
+using testing::AllOf;
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using vantelhost::Json;
@@ -106,11 +108,33 @@ TEST_F(ToolRereadTest, SettingsThatThePlugInRefusesGiveWayToThoseBefore) {
     change(child, "interface = \"a\"\n[settings]\ncount = 2\nscript = \"initialise-fails\"\n");
     ASSERT_TRUE(child.waitForOutput(sessionHasStarted, 2));
     const Result result = end(child);
-    EXPECT_EQ(result.status, 1); // the plug-in told an error
+    EXPECT_EQ(result.status, 0);
     ASSERT_EQ(result.events("initialised").size(), 2U);
     EXPECT_EQ(result.events("initialised")[1]["configuration"]["count"], 1);
     EXPECT_EQ(result.events("restart").at(1)["cause"],
-              "the plug-in refused the new settings: back to those before");
+              "initialise failed: back to the settings before");
+}
+
+TEST_F(ToolRereadTest, SettingsThatEndPtp4lGiveWayToThoseBefore) {
+    Child child(runWith(R"({"interface": ["a"], "child": "exec sleep 1000"})"));
+    ASSERT_TRUE(child.waitForOutput(sessionHasStarted));
+    change(child, R"({"interface": ["a"], "child": "exit 3"})");
+    ASSERT_TRUE(child.waitForOutput(sessionHasStarted, 3));
+    const Result result = end(child);
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.events("initialised").at(2)["configuration"]["child"], "exec sleep 1000");
+    EXPECT_THAT(std::string(result.events("restart").at(1)["cause"]),
+                AllOf(HasSubstr("ended with status 3"), EndsWith(": back to the settings before")));
+    EXPECT_EQ(result.events("restart").at(1)["delay"], 0);
+}
+
+TEST_F(ToolRereadTest, SettingsThatHaveBeenSeenAtWorkStay) {
+    Child child(runWith(R"({"interface": ["a"], "child": "exec sleep 1000"})"));
+    ASSERT_TRUE(child.waitForOutput(sessionHasStarted));
+    change(child, R"({"interface": ["a"], "script": "time", "child": "sleep 1; exit 3"})");
+    EXPECT_EQ(child.wait(), 1);
+    const Result result{1, child.output(), child.errors()};
+    EXPECT_EQ(result.events("initialised").size(), 2U);
 }
 
 TEST_F(ToolRereadTest, SettingsThatCannotBePreparedAreRefused) {

@@ -122,12 +122,27 @@ TEST_F(ToolRestartTest, ASignalEndsTheWaitForTheNextSession) {
     Child child(withChild("exit 3", {"--restart"}));
     ASSERT_TRUE(child.waitForOutput("\"event\":\"restart\"", 2));
     const auto result = end(child);
-    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.status, 0); // it is the end that was asked for
     EXPECT_EQ(result.events("restart").at(1)["delay"], 2.0);
     EXPECT_EQ(result.events("health").back()["state"], "stopping");
     EXPECT_EQ(result.events("stopping").back()["cause"], "SIGTERM");
     EXPECT_THAT(result.events("cause").at(0)["text"].get<std::string>(),
                 HasSubstr("ended with status 3"));
+}
+
+TEST_F(ToolRestartTest, TheEndOfTheTimeTellsOfTheLastSession) {
+    Child child(withChild("exit 3", {"--restart", "--seconds", "0.5"}));
+    EXPECT_EQ(child.wait(), 1);
+}
+
+TEST_F(ToolRestartTest, ADaemonThatNobodyWaitsForLeavesNoZombie) {
+    const std::string pid = folder.path("pid");
+    Child child(
+        withChild("echo $$ >" + pid + "; exec sleep 1000",
+                  {"--restart", "--give-up-after", "0.1", "--set", "script=quality leaves-child"}));
+    ASSERT_TRUE(child.waitForOutput("\"event\":\"restart\""));
+    EXPECT_EQ(::kill(std::stoi(contentOf(pid)), 0), -1);
+    end(child);
 }
 
 TEST_F(ToolRestartTest, AStartThatFailsIsTriedAgain) {

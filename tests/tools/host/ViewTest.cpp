@@ -3,11 +3,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "ConfigReload.h"
 #include "ViewLines.h"
 
 using namespace vantelhost;
 using testing::Contains;
 using testing::ElementsAre;
+using testing::HasSubstr;
 using testing::Not;
 using testing::SizeIs;
 using testing::StartsWith;
@@ -121,6 +123,20 @@ TEST(View, MetricsThatAreNotServedAreAProblem) {
     update(state, metricsEvent("127.0.0.1:9993", ""), 9);
     EXPECT_EQ(state.problems.back().text,
               "metrics not served at 127.0.0.1:9993: Address already in use; tried again");
+}
+
+TEST(View, WhatARereadingAndTheOutputsCannotDoAreProblems) {
+    ViewState state = following();
+    update(state, rereadEvent({{"a.toml:2: nonsense: is unknown"}, {}, std::nullopt, {}}), 8);
+    EXPECT_THAT(state.problems.back().text, StartsWith("configuration: "));
+    EXPECT_THAT(state.problems.back().text, HasSubstr("a.toml:2: nonsense: is unknown"));
+    update(state, lostEvent("record a", 3, 2, "No space left on device"), 9);
+    EXPECT_THAT(state.problems.back().text, StartsWith("lost record a: 3 events in 2.000 s"));
+    update(state, statusSocketEvent("/run/s", "Permission denied"), 10);
+    EXPECT_EQ(state.problems.back().text, "status-socket /run/s: Permission denied; tried again");
+    const std::size_t problems = state.problems.size();
+    update(state, rereadEvent({}), 11);
+    EXPECT_EQ(state.problems.size(), problems);
 }
 
 TEST(View, PhasesAndChronydAreNamed) {
