@@ -8,16 +8,131 @@
 ///         visit(self.clockClass, self.clockAccuracy);
 ///     }
 ///
-/// A field is an integer, in network byte order, or another object with fields of its own.
+/// A field is an integer, in network byte order, octets as they stand, or another object: one with
+/// such a list, too, or one that reads and writes itself.
 #pragma once
 
+#include <array>
 #include <cstdint>
+#include <cstring>
 #include <type_traits>
+#include <utility>
+
+#include <endian.h>
 
 #include "errors/Status.h"
 #include "tMsgBuffer.h"
 
 namespace zekelVantel {
+
+/// Whether an object says how many octets it has only when it is read: it has a member of that
+/// name.
+template <typename Fields, typename = void>
+constexpr bool isVariable = false;
+template <typename Fields>
+constexpr bool isVariable<Fields, std::void_t<decltype(Fields::isVariable)>> = true;
+
+template <typename Integer>
+Integer swappedIfLittleEndian(Integer octets) {
+    if constexpr (sizeof(octets) == 1) {
+        return octets;
+    } else if constexpr (sizeof(octets) == 2) {
+        return static_cast<Integer>(be16toh(static_cast<std::uint16_t>(octets)));
+    } else if constexpr (sizeof(octets) == 4) {
+        return static_cast<Integer>(be32toh(static_cast<std::uint32_t>(octets)));
+    } else {
+        static_assert(sizeof(octets) == 8);
+        return static_cast<Integer>(be64toh(static_cast<std::uint64_t>(octets)));
+    }
+}
+
+/// Reads fields of which every octet is there.
+class tWholeReader {
+public:
+    /// @param octets moves behind what is read.
+    explicit tWholeReader(const std::uint8_t*& octets) : octets_(octets) {}
+
+    template <typename... Fields>
+    void operator()(Fields&... fields) const {
+        (field(fields), ...);
+    }
+
+    void nibbles(std::uint8_t& high, std::uint8_t& low) const {
+        field(low);
+        high = static_cast<std::uint8_t>(low >> 4);
+        low &= 0x0f;
+    }
+
+    void lowNibble(std::uint8_t& low) const {
+        field(low);
+        low &= 0x0f;
+    }
+
+    void reserved(unsigned octets) const { octets_ += octets; }
+
+private:
+    template <typename Field>
+    void field(Field& value) const {
+        if constexpr (std::is_integral_v<Field>) {
+            std::memcpy(&value, octets_, sizeof(value));
+            value = swappedIfLittleEndian(value);
+            octets_ += sizeof(value);
+        } else {
+            Field::visitFields(value, *this);
+        }
+    }
+
+    template <std::size_t size>
+    void field(std::array<std::uint8_t, size>& value) const {
+        std::memcpy(value.data(), octets_, size);
+        octets_ += size;
+    }
+
+    const std::uint8_t*& octets_;
+};
+
+/// Writes fields of which every octet has its room.
+class tWholeWriter {
+public:
+    /// @param octets moves behind what is written.
+    explicit tWholeWriter(std::uint8_t*& octets) : octets_(octets) {}
+
+    template <typename... Fields>
+    void operator()(const Fields&... fields) const {
+        (field(fields), ...);
+    }
+
+    void nibbles(std::uint8_t high, std::uint8_t low) const {
+        field(static_cast<std::uint8_t>(high << 4 | low));
+    }
+
+    void lowNibble(std::uint8_t low) const { field(low); }
+
+    void reserved(unsigned octets) const {
+        std::memset(octets_, 0, octets);
+        octets_ += octets;
+    }
+
+private:
+    template <typename Field>
+    void field(const Field& value) const {
+        if constexpr (std::is_integral_v<Field>) {
+            const Field octets = swappedIfLittleEndian(value);
+            std::memcpy(octets_, &octets, sizeof(octets));
+            octets_ += sizeof(octets);
+        } else {
+            Field::visitFields(value, *this);
+        }
+    }
+
+    template <std::size_t size>
+    void field(const std::array<std::uint8_t, size>& value) const {
+        std::memcpy(octets_, value.data(), size);
+        octets_ += size;
+    }
+
+    std::uint8_t*& octets_;
+};
 
 /// Stores each field as it is read; once the status holds an error, the rest keep their values.
 class tFieldReader {
@@ -137,34 +252,20 @@ private:
     void field(const Field& value) const {
         if constexpr (std::is_integral_v<Field>) {
             octets_ += sizeof(Field);
-        } else {
+        } else if constexpr (isVariable<Field>) {
             octets_ += value.size();
+        } else {
+            Field::visitFields(value, *this);
         }
+    }
+
+    template <std::size_t size>
+    void field(const std::array<std::uint8_t, size>& /*value*/) const {
+        octets_ += size;
     }
 
     std::uint32_t& octets_;
 };
-
-/// Store rule "each field as it is read": what was read before the buffer ended stays read.
-template <typename Fields>
-void readEachField(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
-    Fields::visitFields(fields, tFieldReader(buffer, status));
-}
-
-/// Store rule "all or nothing": an object that could not be read whole keeps all its values.
-template <typename Fields>
-void readAllOrNothing(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
-    Fields whole = fields;
-    readEachField(whole, buffer, status);
-    if (!zeerr::isError(status)) {
-        fields = whole;
-    }
-}
-
-template <typename Fields>
-void writeFields(const Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
-    Fields::visitFields(fields, tFieldWriter(buffer, status));
-}
 
 /// Octets that the fields take on the wire.
 template <typename Fields>
@@ -172,6 +273,50 @@ std::uint32_t sizeOfFields(const Fields& fields) {
     std::uint32_t octets = 0;
     Fields::visitFields(fields, tFieldSizer(octets));
     return octets;
+}
+
+/// Reads all fields, if they are there to the last octet.
+template <typename Fields>
+bool readAtOnce(Fields& fields, tMsgBuffer& buffer, const zeerr::Status& status) {
+    if constexpr (!isVariable<Fields>) {
+        if (const std::uint8_t* octets = buffer.take(sizeOfFields(fields), status)) {
+            Fields::visitFields(fields, tWholeReader(octets));
+            return true;
+        }
+    }
+    return false;
+}
+
+/// Store rule "each field as it is read": what was read before the buffer ended stays read.
+template <typename Fields>
+void readEachField(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
+    if (!readAtOnce(fields, buffer, status)) {
+        Fields::visitFields(fields, tFieldReader(buffer, status));
+    }
+}
+
+/// Store rule "all or nothing": an object that could not be read whole keeps all its values.
+template <typename Fields>
+void readAllOrNothing(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
+    if (readAtOnce(fields, buffer, status)) {
+        return;
+    }
+    Fields whole;
+    Fields::visitFields(whole, tFieldReader(buffer, status));
+    if (!zeerr::isError(status)) {
+        fields = std::move(whole);
+    }
+}
+
+template <typename Fields>
+void writeFields(const Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
+    if constexpr (!isVariable<Fields>) {
+        if (std::uint8_t* octets = buffer.append(sizeOfFields(fields), status)) {
+            Fields::visitFields(fields, tWholeWriter(octets));
+            return;
+        }
+    }
+    Fields::visitFields(fields, tFieldWriter(buffer, status));
 }
 
 } // namespace zekelVantel

@@ -4,16 +4,8 @@
 
 namespace zekelVantel {
 
-void tMsgBuffer::setLength(std::uint32_t n, zeerr::Status& status) {
-    if (zeerr::isError(status)) {
-        return;
-    }
-    if (n > maximumLength) {
-        zeerr::setError(status, zeerr::site::bufferTooSmall);
-        return;
-    }
-    length_ = n;
-    writePos_ = n;
+void tMsgBuffer::reportTooLong(zeerr::Status& status) {
+    zeerr::setError(status, zeerr::site::bufferTooSmall);
 }
 
 void tMsgBuffer::reportReadPastEnd(zeerr::Status& status) {

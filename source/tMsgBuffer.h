@@ -32,10 +32,29 @@ public:
 
     /// The octets themselves. The length and both positions stay as they are.
     const std::uint8_t* data() const { return data_.data(); }
-    std::uint8_t* data() { return data_.data(); }
+    std::uint8_t* data() {
+        touched_ = maximumLength;
+        return data_.data();
+    }
+
+    /// Takes a datagram over whose octets `receive(std::uint8_t* octets, std::uint32_t capacity)`
+    /// writes, and of which it returns the length, or a negative number and has written nothing.
+    /// @return what it returned.
+    template <typename Receive>
+    std::int64_t fill(Receive receive, zeerr::Status& status);
 
     /// Zeroes octets, length and both positions.
     void clear();
+
+    /// Consumes so many octets at once.
+    /// @return where they are; null, and nothing is consumed, when there are less or the status
+    ///         holds an error.
+    const std::uint8_t* take(std::uint32_t octets, const zeerr::Status& status);
+
+    /// Appends so many octets at once, which are the caller's to write.
+    /// @return where they are; null, and nothing is appended, when there is no room for all or the
+    ///         status holds an error.
+    std::uint8_t* append(std::uint32_t octets, const zeerr::Status& status);
 
     std::uint8_t readU8(zeerr::Status& status);
     std::uint16_t readU16(zeerr::Status& status);
@@ -60,6 +79,7 @@ private:
     template <typename Integer>
     bool writeAtOnce(Integer octets, const zeerr::Status& status);
 
+    static void reportTooLong(zeerr::Status& status);
     static void reportReadPastEnd(zeerr::Status& status);
     static void reportWritePastEnd(zeerr::Status& status);
 
@@ -67,16 +87,59 @@ private:
     std::uint32_t length_ = 0;
     std::uint32_t readPos_ = 0;
     std::uint32_t writePos_ = 0;
+    std::uint32_t touched_ = 0; ///< octets behind it are 0, but for those up to the length
 };
 
 // Every octet of every poll goes through these: inline, so that a message costs tens of
 // nanoseconds.
 
 inline void tMsgBuffer::clear() {
-    data_.fill(0);
+    std::memset(data_.data(), 0, std::max(touched_, length_));
     length_ = 0;
     readPos_ = 0;
     writePos_ = 0;
+    touched_ = 0;
+}
+
+inline void tMsgBuffer::setLength(std::uint32_t n, zeerr::Status& status) {
+    if (zeerr::isError(status)) {
+        return;
+    }
+    if (n > maximumLength) {
+        reportTooLong(status);
+        return;
+    }
+    touched_ = std::max(touched_, length_);
+    length_ = n;
+    writePos_ = n;
+}
+
+template <typename Receive>
+std::int64_t tMsgBuffer::fill(Receive receive, zeerr::Status& status) {
+    const std::int64_t received = receive(data_.data(), maximumLength);
+    if (received >= 0) {
+        setLength(static_cast<std::uint32_t>(received), status);
+    }
+    return received;
+}
+
+inline const std::uint8_t* tMsgBuffer::take(std::uint32_t octets, const zeerr::Status& status) {
+    if (zeerr::isError(status) || readPos_ + octets > length_) {
+        return nullptr;
+    }
+    const std::uint8_t* const taken = data_.data() + readPos_;
+    readPos_ += octets;
+    return taken;
+}
+
+inline std::uint8_t* tMsgBuffer::append(std::uint32_t octets, const zeerr::Status& status) {
+    if (zeerr::isError(status) || maximumLength - writePos_ < octets) {
+        return nullptr;
+    }
+    std::uint8_t* const appended = data_.data() + writePos_;
+    writePos_ += octets;
+    length_ += octets;
+    return appended;
 }
 
 inline std::uint8_t tMsgBuffer::readU8(zeerr::Status& status) {
@@ -92,11 +155,11 @@ inline std::uint8_t tMsgBuffer::readU8(zeerr::Status& status) {
 
 template <typename Integer>
 bool tMsgBuffer::readAtOnce(Integer& octets, const zeerr::Status& status) {
-    if (zeerr::isError(status) || readPos_ + sizeof(octets) > length_) {
+    const std::uint8_t* const taken = take(sizeof(octets), status);
+    if (taken == nullptr) {
         return false;
     }
-    std::memcpy(&octets, &data_[readPos_], sizeof(octets));
-    readPos_ += sizeof(octets);
+    std::memcpy(&octets, taken, sizeof(octets));
     return true;
 }
 
@@ -152,12 +215,11 @@ inline void tMsgBuffer::writeU8(std::uint8_t value, zeerr::Status& status) {
 
 template <typename Integer>
 bool tMsgBuffer::writeAtOnce(Integer octets, const zeerr::Status& status) {
-    if (zeerr::isError(status) || maximumLength - writePos_ < sizeof(octets)) {
+    std::uint8_t* const appended = append(sizeof(octets), status);
+    if (appended == nullptr) {
         return false;
     }
-    std::memcpy(&data_[writePos_], &octets, sizeof(octets));
-    writePos_ += sizeof(octets);
-    length_ += sizeof(octets);
+    std::memcpy(appended, &octets, sizeof(octets));
     return true;
 }
 

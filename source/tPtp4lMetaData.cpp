@@ -120,8 +120,7 @@ bool tPortMetaData::operator==(const tPortMetaData& other) const {
 tPtp4lMetaData::~tPtp4lMetaData() = default;
 
 void tPtp4lMetaData::takeGrandmaster(const tParentDataSet& parent) {
-    gmClockId_ = clockIdText(parent.grandmasterIdentity);
-    gmMacAddress_ = macText(parent.grandmasterIdentity);
+    gmClockId_ = parent.grandmasterIdentity;
     gmClockClass_ = parent.grandmasterClockQuality.clockClass();
     gmClockAccuracy_ = accuracyName(parent.grandmasterClockQuality.clockAccuracy());
     gmOffsetLogVariance_ = parent.grandmasterClockQuality.offsetScaledLogVariance();
@@ -130,7 +129,7 @@ void tPtp4lMetaData::takeGrandmaster(const tParentDataSet& parent) {
 }
 
 void tPtp4lMetaData::takeLocalClock(const tDefaultDataSet& local) {
-    localClockId_ = clockIdText(local.clockIdentity);
+    localClockId_ = local.clockIdentity;
     clockClass_ = local.clockQuality.clockClass();
     clockAccuracy_ = accuracyName(local.clockQuality.clockAccuracy());
     offsetLogVariance_ = local.clockQuality.offsetScaledLogVariance();
@@ -154,7 +153,7 @@ void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
     }
     for (std::size_t i = 0; i < portDataSets.size(); ++i) {
         const tPortDataSet& dataSet = portDataSets[i];
-        ports_.insert_or_assign("Port" + std::to_string(dataSet.portIdentity.portNumber()),
+        ports_.insert_or_assign(ports_.end(), dataSet.portIdentity.portNumber(),
                                 tPortMetaData{portStateName(dataSet.portState),
                                               portDataSetsNp[i].asCapable != 0 ? "true" : "false",
                                               dataSet.logAnnounceInterval, dataSet.logSyncInterval,
@@ -166,20 +165,20 @@ void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
 
 bool tPtp4lMetaData::operator==(const tPtp4lMetaData& other) const {
     const auto fields = [](const tPtp4lMetaData& data) {
-        return std::tie(data.gmClockId_, data.gmMacAddress_, data.gmClockClass_,
-                        data.gmClockAccuracy_, data.gmOffsetLogVariance_, data.gmPriority1_,
-                        data.gmPriority2_, data.localClockId_, data.clockClass_,
-                        data.clockAccuracy_, data.offsetLogVariance_, data.priority1_,
-                        data.priority2_, data.domainNumber_, data.ports_);
+        return std::tie(data.gmClockId_.octets(), data.gmClockClass_, data.gmClockAccuracy_,
+                        data.gmOffsetLogVariance_, data.gmPriority1_, data.gmPriority2_,
+                        data.localClockId_.octets(), data.clockClass_, data.clockAccuracy_,
+                        data.offsetLogVariance_, data.priority1_, data.priority2_,
+                        data.domainNumber_, data.ports_);
     };
     return fields(*this) == fields(other);
 }
 
 std::string tPtp4lMetaData::toJson() const {
     tJsonObject json;
-    json.add("gmClockId", gmClockId_);
-    json.add("gmMacAddress", gmMacAddress_);
-    json.add("localClockId", localClockId_);
+    json.add("gmClockId", clockIdText(gmClockId_));
+    json.add("gmMacAddress", macText(gmClockId_));
+    json.add("localClockId", clockIdText(localClockId_));
     json.add("clockClass", clockClass_);
     json.add("clockAccuracy", clockAccuracy_);
     json.add("offsetLogVariance", offsetLogVariance_);
@@ -191,8 +190,13 @@ std::string tPtp4lMetaData::toJson() const {
     json.add("gmOffsetLogVariance", gmOffsetLogVariance_);
     json.add("gmPriority1", gmPriority1_);
     json.add("gmPriority2", gmPriority2_);
-    for (const auto& [name, port] : ports_) {
-        json.addRaw(name, portJson(port));
+    // In the order of the names: Port10 stands before Port2.
+    std::map<std::string, const tPortMetaData*> portsByName;
+    for (const auto& [number, port] : ports_) {
+        portsByName["Port" + std::to_string(number)] = &port;
+    }
+    for (const auto& [name, port] : portsByName) {
+        json.addRaw(name, portJson(*port));
     }
     return std::move(json).finish();
 }

@@ -57,21 +57,20 @@ public:
     std::string toJson() const;
 
 private:
-    std::string gmClockId_ = "00:00:00:00:00:00:00:00";
-    std::string gmMacAddress_ = "00:00:00:00:00:00";
+    tPtpClockIdentity gmClockId_;
     std::uint8_t gmClockClass_ = 0;
     std::string_view gmClockAccuracy_ = "ACCURACY_UNKNOWN";
     std::uint16_t gmOffsetLogVariance_ = 0;
     std::uint8_t gmPriority1_ = 0;
     std::uint8_t gmPriority2_ = 0;
-    std::string localClockId_ = "00:00:00:00:00:00:00:00";
+    tPtpClockIdentity localClockId_;
     std::uint8_t clockClass_ = 0;
     std::string_view clockAccuracy_ = "ACCURACY_UNKNOWN";
     std::uint16_t offsetLogVariance_ = 0;
     std::uint8_t priority1_ = 0;
     std::uint8_t priority2_ = 0;
     std::uint8_t domainNumber_ = 0;
-    std::map<std::string, tPortMetaData> ports_; ///< by "Port" and the portNumber
+    std::map<std::uint16_t, tPortMetaData> ports_; ///< by portNumber
 };
 
 } // namespace zekelVantel

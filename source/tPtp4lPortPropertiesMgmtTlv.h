@@ -16,6 +16,8 @@ struct tPortProperties {
     std::uint8_t timestamping = 0; ///< linuxptp `enum timestamp_type`
     tPtpText interface;
 
+    static constexpr bool isVariable = true;
+
     template <typename Self, typename Visitor>
     static void visitFields(Self& self, Visitor visit) {
         visit(self.portIdentity, self.portState, self.timestamping, self.interface);

@@ -24,6 +24,11 @@ public:
 
     const Octets& octets() const { return identity_; }
 
+    template <typename Self, typename Visitor>
+    static void visitFields(Self& self, Visitor visit) {
+        visit(self.identity_);
+    }
+
 private:
     Octets identity_{};
 };

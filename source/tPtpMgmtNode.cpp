@@ -48,34 +48,32 @@ void tPtpMgmtNode::receiveResponse(iMsgInterface& interface, std::uint32_t timeo
 void tPtpMgmtNode::getSingle(iMsgInterface& interface, const iMsgAddress& remoteAddress,
                              tPtpMgmtTlv& tlv, zeerr::Status& status) {
     tPtpMgmtMsg message;
-    tMsgBuffer buffer;
     const tExchangeProbe exchange(tlv.managementId(), sequenceId_, status);
     const std::uint32_t expected = message.size() + tlv.size();
-    request(interface, remoteAddress, buffer, message, tlv, tPadOctet::uncounted, status);
-    receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);
+    request(interface, remoteAddress, message, tlv, tPadOctet::uncounted, status);
+    receiveResponse(interface, answerTimeoutMs, buffer_, message, tlv, status);
     // [oddity length-only] The length alone decides: a late answer of the same length is as good,
     // and one of another length is dropped.
-    if (!zeerr::isError(status) && buffer.getLength() != expected) {
+    if (!zeerr::isError(status) && buffer_.getLength() != expected) {
         zeerr::setError(status, zeerr::site::answerOfOtherLength);
     }
 }
 
 void tPtpMgmtNode::request(iMsgInterface& interface, const iMsgAddress& remoteAddress,
-                           tMsgBuffer& buffer, tPtpMgmtMsg& message, const tPtpMgmtTlv& tlv,
-                           tPadOctet padOctet, zeerr::Status& status) {
+                           tPtpMgmtMsg& message, const tPtpMgmtTlv& tlv, tPadOctet padOctet,
+                           zeerr::Status& status) {
     const std::uint32_t tlvLength =
         padOctet == tPadOctet::counted ? tlv.lengthField() + tPtpMgmtTlv::uncounted : tlv.size();
     prepareRequest(message, static_cast<std::uint16_t>(message.size() + tlvLength));
-    sendRequest(interface, remoteAddress, buffer, message, tlv, status);
+    sendRequest(interface, remoteAddress, buffer_, message, tlv, status);
 }
 
 bool tPtpMgmtNode::receiveAtLeast(std::uint32_t expected, iMsgInterface& interface,
-                                  tMsgBuffer& buffer, tPtpMgmtMsg& message, tPtpMgmtTlv& tlv,
-                                  zeerr::Status& status) {
-    receiveResponse(interface, answerTimeoutMs, buffer, message, tlv, status);
+                                  tPtpMgmtMsg& message, tPtpMgmtTlv& tlv, zeerr::Status& status) {
+    receiveResponse(interface, answerTimeoutMs, buffer_, message, tlv, status);
     // [oddity minimum-length] A minimum, unlike the single answer's equality: names make the
     // answers of ports longer.
-    if (!zeerr::isError(status) && buffer.getLength() < expected) {
+    if (!zeerr::isError(status) && buffer_.getLength() < expected) {
         zeerr::setError(status, zeerr::site::answerTooShort);
     }
     return zeerr::isClean(status);

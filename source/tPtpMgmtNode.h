@@ -61,17 +61,17 @@ public:
                       zeerr::Status& status, tPadOctet padOctet = tPadOctet::uncounted);
 
 private:
-    void request(iMsgInterface& interface, const iMsgAddress& remoteAddress, tMsgBuffer& buffer,
-                 tPtpMgmtMsg& message, const tPtpMgmtTlv& tlv, tPadOctet padOctet,
-                 zeerr::Status& status);
+    void request(iMsgInterface& interface, const iMsgAddress& remoteAddress, tPtpMgmtMsg& message,
+                 const tPtpMgmtTlv& tlv, tPadOctet padOctet, zeerr::Status& status);
 
     /// @return whether the answer counts: it is long enough and the status is clean.
-    static bool receiveAtLeast(std::uint32_t expected, iMsgInterface& interface, tMsgBuffer& buffer,
-                               tPtpMgmtMsg& message, tPtpMgmtTlv& tlv, zeerr::Status& status);
+    bool receiveAtLeast(std::uint32_t expected, iMsgInterface& interface, tPtpMgmtMsg& message,
+                        tPtpMgmtTlv& tlv, zeerr::Status& status);
 
     tPtpPortIdentity portIdentity_;
     std::uint8_t transportSpecific_;
     std::uint16_t sequenceId_ = 0;
+    tMsgBuffer buffer_; ///< of the exchange that is running
 };
 
 template <typename Tlv>
@@ -79,14 +79,13 @@ void tPtpMgmtNode::getFromPorts(iMsgInterface& interface, const iMsgAddress& rem
                                 std::uint32_t count, std::vector<typename Tlv::Data>& answers,
                                 zeerr::Status& status, tPadOctet padOctet) {
     tPtpMgmtMsg message;
-    tMsgBuffer buffer;
     Tlv tlv;
     const tExchangeProbe exchange(tlv.managementId(), sequenceId_, status);
     const std::uint32_t expected = message.size() + tlv.size();
-    request(interface, remoteAddress, buffer, message, tlv, padOctet, status);
+    request(interface, remoteAddress, message, tlv, padOctet, status);
     answers.reserve(std::min(count, usualPorts));
     for (std::uint32_t answer = 0; answer < count && !zeerr::isError(status); ++answer) {
-        if (receiveAtLeast(expected, interface, buffer, message, tlv, status)) {
+        if (receiveAtLeast(expected, interface, message, tlv, status)) {
             answers.push_back(tlv.data());
         }
     }

@@ -1,16 +1,17 @@
 #include "tPtpText.h"
 
-#include <algorithm>
+#include <cstring>
 
 namespace zekelVantel {
 
 void tPtpText::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
-    char text[256] = {};
     const std::uint8_t length = buffer.readU8(status);
-    std::generate_n(text, length, [&] { return static_cast<char>(buffer.readU8(status)); });
-    if (!zeerr::isError(status)) {
+    if (const std::uint8_t* const octets = buffer.take(length, status)) {
         lengthField_ = length;
-        text_ = text;
+        const auto* const text = reinterpret_cast<const char*>(octets);
+        text_.assign(text, strnlen(text, length));
+    } else {
+        buffer.skip(length, status);
     }
 }
 

@@ -12,6 +12,8 @@ namespace zekelVantel {
 /// all or nothing. A pad octet behind it belongs to whoever holds the text.
 class tPtpText final : public iMsgSerializable {
 public:
+    static constexpr bool isVariable = true;
+
     /// The text is kept up to its first zero octet, the length as received.
     void deserialize(tMsgBuffer& buffer, zeerr::Status& status) override;
 

@@ -84,12 +84,17 @@ void tUdsMsgInterface::send(const tMsgBuffer& buffer, const iMsgAddress& remoteA
 }
 
 void tUdsMsgInterface::receive(tMsgBuffer& buffer, std::uint32_t timeoutMs, zeerr::Status& status) {
-    tUdsMsgAddress ignoredSource;
-    receive(buffer, ignoredSource, timeoutMs, status);
+    receiveFrom(nullptr, nullptr, buffer, timeoutMs, status);
 }
 
 void tUdsMsgInterface::receive(tMsgBuffer& buffer, iMsgAddress& sourceAddress,
                                std::uint32_t timeoutMs, zeerr::Status& status) {
+    socklen_t length = sourceAddress.length();
+    receiveFrom(sourceAddress.receiveAddress(), &length, buffer, timeoutMs, status);
+}
+
+void tUdsMsgInterface::receiveFrom(sockaddr* source, socklen_t* sourceLength, tMsgBuffer& buffer,
+                                   std::uint32_t timeoutMs, zeerr::Status& status) {
     if (zeerr::isError(status)) {
         return;
     }
@@ -101,14 +106,12 @@ void tUdsMsgInterface::receive(tMsgBuffer& buffer, iMsgAddress& sourceAddress,
         zeerr::setError(status, zeerr::site::receiveTimedOut);
         return;
     }
-    socklen_t sourceLength = sourceAddress.length();
-    const ssize_t received = recvfrom(socket_.get(), buffer.data(), tMsgBuffer::capacity(), 0,
-                                      sourceAddress.receiveAddress(), &sourceLength);
-    if (received < 0) {
+    const auto receiveOne = [&](std::uint8_t* octets, std::uint32_t capacity) {
+        return recvfrom(socket_.get(), octets, capacity, 0, source, sourceLength);
+    };
+    if (buffer.fill(receiveOne, status) < 0) {
         zeerr::setError(status, zeerr::site::receiveFailed);
-        return;
     }
-    buffer.setLength(static_cast<std::uint32_t>(received), status);
 }
 
 bool tUdsMsgInterface::waitForDatagram(std::uint32_t timeoutMs) const {

@@ -32,6 +32,9 @@ public:
                  zeerr::Status& status) override;
 
 private:
+    /// @param source,sourceLength both null: it is not asked for.
+    void receiveFrom(sockaddr* source, socklen_t* sourceLength, tMsgBuffer& buffer,
+                     std::uint32_t timeoutMs, zeerr::Status& status);
     bool waitForDatagram(std::uint32_t timeoutMs) const;
 
     tFileDescriptor socket_;

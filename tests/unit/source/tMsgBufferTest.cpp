@@ -1,5 +1,7 @@
 #include "tMsgBuffer.h"
 
+#include <algorithm>
+
 #include <gtest/gtest.h>
 
 #include "errors/Exception.h"
@@ -231,6 +233,66 @@ TEST_F(MsgBufferTest, ClearZeroesOctetsLengthAndPositions) {
     EXPECT_EQ(contentOf(buffer), octets("5A"));
     EXPECT_EQ(buffer.readU8(status), 0x5AU);
     EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(MsgBufferTest, ClearZeroesWhatWasWrittenThroughThePointer) {
+    buffer.data()[1499] = 0xAB;
+    buffer.clear();
+    EXPECT_EQ(Octets(buffer.data(), buffer.data() + 1500), Octets(1500, 0));
+}
+
+TEST_F(MsgBufferTest, ClearZeroesWhatAShorterLengthLeftBehind) {
+    writeOctets(100);
+    buffer.setLength(2, status);
+    buffer.clear();
+    EXPECT_EQ(Octets(buffer.data(), buffer.data() + 1500), Octets(1500, 0));
+}
+
+TEST_F(MsgBufferTest, ClearZeroesADatagramOfAnyLength) {
+    for (const std::uint32_t length : {1U, 104U, 1500U}) {
+        const auto receive = [=](std::uint8_t* octets, std::uint32_t capacity) {
+            EXPECT_EQ(capacity, 1500U);
+            std::fill_n(octets, length, std::uint8_t{0xAB});
+            return static_cast<std::int64_t>(length);
+        };
+        EXPECT_EQ(buffer.fill(receive, status), length);
+        EXPECT_EQ(contentOf(buffer), Octets(length, 0xAB));
+        buffer.clear();
+        EXPECT_EQ(Octets(buffer.data(), buffer.data() + 1500), Octets(1500, 0));
+    }
+}
+
+TEST_F(MsgBufferTest, ADatagramThatDidNotComeChangesNothing) {
+    writeOctets(3);
+    EXPECT_EQ(buffer.fill([](auto&&...) { return -1; }, status), -1);
+    EXPECT_EQ(contentOf(buffer), octets("01 02 03"));
+    EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(MsgBufferTest, OctetsAreTakenAtOnceOrNotAtAll) {
+    writeOctets(5);
+    const std::uint8_t* const taken = buffer.take(3, status);
+    ASSERT_NE(taken, nullptr);
+    EXPECT_EQ(Octets(taken, taken + 3), octets("01 02 03"));
+    EXPECT_EQ(buffer.take(3, status), nullptr);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(buffer.readU16(status), 0x0405U);
+    EXPECT_NE(buffer.take(0, status), nullptr);
+    status.code = -1;
+    EXPECT_EQ(buffer.take(0, status), nullptr);
+}
+
+TEST_F(MsgBufferTest, OctetsAreAppendedAtOnceOrNotAtAll) {
+    writeOctets(1498);
+    std::uint8_t* const appended = buffer.append(1, status);
+    ASSERT_NE(appended, nullptr);
+    *appended = 0xAB;
+    EXPECT_EQ(buffer.append(2, status), nullptr);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(behind(1498, contentOf(buffer)), octets("AB"));
+    status.code = -1;
+    EXPECT_EQ(buffer.append(1, status), nullptr);
+    EXPECT_EQ(buffer.getLength(), 1499U);
 }
 
 TEST_F(MsgBufferTest, ErrorMakesEveryOperationDoNothing) {
