@@ -149,7 +149,9 @@ namespace {
 
 using testing::Contains;
 using testing::ElementsAre;
+using testing::IsSupersetOf;
 using testing::SizeIs;
+using testing::Value;
 
 constexpr char noMemory[] = "Unable to call into KEL in vantel, got error: -52000";
 
@@ -267,30 +269,41 @@ TEST_F(MemoryFaultTest, InAnyPlaceOfAPollFailsThatPoll) {
     EXPECT_EQ(living, before);
 }
 
-// No poll begins: what it fills needs memory. The watchdog needs none.
-TEST_F(MemoryFaultTest, ForGoodShowsInTheLogUntilTheDaemonDies) {
-    begin("clock fixed 1000\n");
+// Ports need memory, and so do the metadata of a poll that failed. Qualities and the watchdog need
+// none.
+TEST_F(MemoryFaultTest, ForGoodFailsEveryPollUntilTheDaemonDies) {
+    begin("clock fixed 1000\n", R"(["eth0"])");
     ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
     const pid_t child = daemonPid();
     refuse(0, true);
     ASSERT_TRUE(waitForLog(noMemory, 3));
     EXPECT_THAT(log.lines(), Contains(SyslogCapture::Line{LOG_ERR, noMemory}));
-    EXPECT_THAT(qualities(), ElementsAre(waiting, usable));
+    EXPECT_THAT(log.lines(), Contains(SyslogCapture::Line{LOG_INFO, failureLine(-52000)}));
+    EXPECT_THAT(qualities(), IsSupersetOf({waiting, usable, unreachable}));
     ASSERT_EQ(kill(child, SIGKILL), 0);
-    ASSERT_TRUE(waitForCalls(Function::setTRQuality, 3));
-    EXPECT_THAT(qualities(), ElementsAre(waiting, usable, died));
+    EXPECT_TRUE(waitUntil([this] { return Value(qualities(), Contains(died)); }));
     EXPECT_THAT(metaData(), SizeIs(2));
     expectStopWithin({});
 }
 
 TEST_F(MemoryFaultTest, ThatComesBackLetsPollsGoOn) {
-    begin("clock fixed 1000\n");
+    begin("clock fixed 1000\n", R"(["eth0"])");
     ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
     refuse(0, true);
     ASSERT_TRUE(waitForLog(noMemory, 2));
     const std::size_t polls = host.calls(Function::getTime).size();
     allowance = unlimited;
     EXPECT_TRUE(waitForCalls(Function::getTime, polls + 2));
+    EXPECT_EQ(qualities().back(), unreachable);
+    expectStopWithin({});
+}
+
+TEST_F(MemoryFaultTest, APollWithoutPortsNeedsNone) {
+    begin("clock fixed 1000\n");
+    ASSERT_TRUE(waitForCalls(Function::updateMetaData, 2));
+    refuse(0, true);
+    const std::size_t polls = host.calls(Function::getTime).size();
+    EXPECT_TRUE(waitForCalls(Function::getTime, polls + 3));
     EXPECT_THAT(qualities(), ElementsAre(waiting, usable));
     expectStopWithin({});
 }
