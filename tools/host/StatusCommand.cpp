@@ -2,6 +2,7 @@
 
 #include <array>
 #include <cerrno>
+#include <chrono>
 #include <cstdio>
 #include <memory>
 #include <string>
@@ -29,14 +30,15 @@ struct StatusOptions {
 };
 
 /// Longer than a run takes to stop a session.
-constexpr int patience = 20000; // ms
+constexpr std::chrono::seconds patience(20);
 
 /// What a run says; empty when it says nothing.
 std::string answerOf(const UnixSocket& socket) {
     std::string answer;
     std::array<char, 4096> buffer{};
     pollfd input{socket.descriptor(), POLLIN, 0};
-    while (::poll(&input, 1, patience) == 1) {
+    constexpr int timeout = std::chrono::milliseconds(patience).count();
+    while (::poll(&input, 1, timeout) == 1) {
         const ssize_t count = ::read(socket.descriptor(), buffer.data(), buffer.size());
         if (count <= 0) {
             break;
@@ -51,21 +53,43 @@ int complain(int status, const std::string& text) {
     return status;
 }
 
+int complainAboutSilence(const std::string& path) {
+    return complain(exitFailed, fmt::format("{}: the run there does not answer", path));
+}
+
+/// @param error errno of the connection that was not made
+int complainAboutPath(const std::string& path, int error) {
+    const char* const hint =
+        error == EACCES ? "" : "; no run listens there: vantel-host run --status-socket";
+    return complain(exitUsage, fmt::format("{}: {}{}", path, errorText(error), hint));
+}
+
+/// @return the exit status. Throws Json::exception when the answer is not that of a run.
+int show(const std::string& answer, bool asJson) {
+    const Json status = Json::parse(answer);
+    const std::string health = status.at("health");
+    writeOutput(asJson ? answer : statusText(status));
+    return health == "locked" ? exitClean : exitFailed;
+}
+
 int showStatus(const StatusOptions& options) {
-    const UnixSocket socket;
+    const UnixSocket socket(patience);
     if (socket.connectTo(options.socket) != 0) {
-        const char* const hint =
-            errno == EACCES ? "" : "; no run listens there: vantel-host run --status-socket";
-        return complain(exitUsage, fmt::format("{}: {}{}", options.socket, errorText(errno), hint));
+        return errno == EAGAIN ? complainAboutSilence(options.socket)
+                               : complainAboutPath(options.socket, errno);
     }
     const std::string answer = answerOf(socket);
-    const Json status = Json::parse(answer, nullptr, false);
-    if (!status.is_object()) {
-        return complain(exitFailed,
-                        fmt::format("{}: the run there does not answer", options.socket));
+    if (answer.empty()) {
+        return complainAboutSilence(options.socket);
     }
-    writeOutput(options.json ? answer : statusText(status));
-    return status["health"] == "locked" ? exitClean : exitFailed;
+    try {
+        return show(answer, options.json);
+    } catch (const Json::exception&) {
+        return complain(exitFailed,
+                        fmt::format("{}: the answer is not understood: it is not that of a run of "
+                                    "this version",
+                                    options.socket));
+    }
 }
 
 } // namespace

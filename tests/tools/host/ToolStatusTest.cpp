@@ -2,14 +2,22 @@
 
 #include <csignal>
 #include <cstring>
+#include <filesystem>
+#include <list>
+#include <stdexcept>
 
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "Checks/OrdinaryUser.h"
+#include "Status/StatusPage.h"
 #include "Status/StatusSocket.h"
 #include "Status/UnixSocket.h"
+#include "Text.h"
 #include "Tool.h"
 #include "support/Child.h"
+#include "support/Processes.h"
+#include "support/SimulatedRun.h"
 
 using testing::HasSubstr;
 using testing::StartsWith;
@@ -44,10 +52,62 @@ protected:
         return result;
     }
 
+    /// Asks one who says this.
+    Result askWhoSays(const std::string& text, const Words& options = {}) const {
+        StatusSocket status(socket, [&] { return text; });
+        status.attend();
+        Words words{HOST_TOOL, "status", "--socket", socket};
+        words.insert(words.end(), options.begin(), options.end());
+        Child child(words);
+        EXPECT_TRUE(waitUntil([&] {
+            status.attend();
+            return !child.isRunning();
+        }));
+        const int result = child.wait();
+        return {result, child.output(), child.errors()};
+    }
+
     const std::string socket = folder.path("status.sock");
 };
 
+/// Whether the process has ended, or waits with a socket open.
+bool hasEndedOrWaits(const Child& child) {
+    const std::string folder = "/proc/" + std::to_string(child.pid());
+    if (!child.isRunning() || contentOf(folder + "/stat").find(") S ") == std::string::npos) {
+        return !child.isRunning();
+    }
+    std::error_code ignored;
+    for (std::filesystem::directory_iterator file(folder + "/fd", ignored), end; file != end;
+         file.increment(ignored)) {
+        if (std::filesystem::read_symlink(*file, ignored).string().rfind("socket:", 0) == 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+/// Clients, as many as make who listens there too busy for one more.
+std::list<UnixSocket> fillQueueOf(const std::string& path) {
+    std::list<UnixSocket> clients;
+    while (clients.emplace_back().connectTo(path) == 0) {
+    }
+    EXPECT_EQ(errno, EAGAIN);
+    return clients;
+}
+
 } // namespace
+
+TEST_F(ToolStatusTest, AClockThatIsLockedIsStatus0) {
+    SimulatedRun run(folder.path(""), "offset 250\n", {"--status-socket", socket});
+    ASSERT_TRUE(run.host().waitForOutput("\"state\":\"locked\"")) << run.host().errors();
+    const auto result = ask();
+    EXPECT_EQ(result.status, 0) << result.errors;
+    EXPECT_THAT(result.output, StartsWith("Health          : locked for 0:00:0"));
+    EXPECT_THAT(result.output, HasSubstr("\nLast offset     : 250 ns, "));
+    EXPECT_EQ(result.errors, "");
+    run.host().signal(SIGTERM);
+    EXPECT_EQ(run.host().wait(), 0);
+}
 
 TEST_F(ToolStatusTest, AClockThatIsNotLockedIsStatus1) {
     Child run(host({"--set", "script=quality pairs metadata"}));
@@ -77,6 +137,53 @@ TEST_F(ToolStatusTest, WhereNobodyRunsItIsStatus2) {
     EXPECT_EQ(result.errors, "vantel-host: " + socket +
                                  ": No such file or directory; no run listens there: vantel-host "
                                  "run --status-socket\n");
+}
+
+TEST_F(ToolStatusTest, AnAnswerThatIsNotThatOfARunIsStatus1) {
+    const std::string complaint = "vantel-host: " + socket +
+                                  ": the answer is not understood: it is not that of a run of "
+                                  "this version\n";
+    for (const std::string text : {"{}", "[\"health\"]", "{\"health\": \"locked\"}",
+                                   "{\"health\": 1, \"since\": {}}", "220 ready\r\n"}) {
+        const auto result = askWhoSays(text);
+        EXPECT_EQ(result.status, 1) << text;
+        EXPECT_EQ(result.output, "") << text;
+        EXPECT_EQ(result.errors, complaint) << text;
+    }
+    const auto result = askWhoSays("{}", {"--json"});
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output + result.errors, complaint);
+}
+
+TEST_F(ToolStatusTest, NoAnswerIsStatus1) {
+    const auto result = askWhoSays("");
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.errors, "vantel-host: " + socket + ": the run there does not answer\n");
+}
+
+TEST_F(ToolStatusTest, ABusyRunIsWaitedFor) {
+    const vantelhost::StatusPage page;
+    StatusSocket status(socket, [&] { return vantelhost::toAscii(page.at(0)); });
+    status.attend();
+    const auto clients = fillQueueOf(socket);
+    Child child({HOST_TOOL, "status", "--socket", socket});
+    EXPECT_TRUE(waitUntil([&] { return hasEndedOrWaits(child); }));
+    EXPECT_TRUE(waitUntil([&] {
+        status.attend();
+        return !child.isRunning();
+    }));
+    EXPECT_EQ(child.wait(), 1) << child.errors();
+    EXPECT_THAT(child.output(), StartsWith("Health          : starting for "));
+}
+
+TEST_F(ToolStatusTest, ABusyRunIsGivenUpWhenPatienceIsOver) {
+    StatusSocket status(socket, [] { return ""; });
+    status.attend();
+    const auto clients = fillQueueOf(socket);
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_NE(UnixSocket(std::chrono::seconds(1)).connectTo(socket), 0);
+    EXPECT_EQ(errno, EAGAIN);
+    EXPECT_GE(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(900));
 }
 
 TEST_F(ToolStatusTest, APathThatIsTooLongIsRefused) {
@@ -131,6 +238,54 @@ TEST_F(ToolStatusTest, TheSocketOfAnotherRunIsLeftAlone) {
     ASSERT_TRUE(news);
     EXPECT_EQ(news->members["problem"], "another run listens there");
     EXPECT_FALSE(second.attend(now + std::chrono::seconds(10))) << "told again";
+}
+
+TEST_F(ToolStatusTest, TheSocketOfARunThatIsBusyIsLeftAlone) {
+    StatusSocket first(socket, [] { return "first"; });
+    EXPECT_FALSE(first.attend());
+    const auto clients = fillQueueOf(socket);
+    StatusSocket second(socket, [] { return "second"; });
+    const auto news = second.attend();
+    ASSERT_TRUE(news);
+    EXPECT_EQ(news->members["problem"], "another run listens there");
+    EXPECT_EQ(::access(socket.c_str(), F_OK), 0);
+}
+
+TEST_F(ToolStatusTest, ASocketThatMayNotBeAskedIsLeftAlone) {
+    StatusSocket first(socket, [] { return "first"; });
+    EXPECT_FALSE(first.attend());
+    ::chmod(socket.c_str(), 0);
+    ::chmod(folder.path("").c_str(), 0777);
+    const OrdinaryUser user;
+    if (!user.isOne()) {
+        GTEST_SKIP() << "SKIPPED: the user cannot be changed";
+    }
+    StatusSocket second(socket, [] { return "second"; });
+    const auto news = second.attend();
+    ASSERT_TRUE(news);
+    EXPECT_EQ(news->members["problem"], "Permission denied");
+    EXPECT_EQ(::access(socket.c_str(), F_OK), 0);
+}
+
+TEST_F(ToolStatusTest, ASocketThatReplacedItsOwnIsLeftAtTheEnd) {
+    StatusSocket second(socket, [] { return "second"; });
+    {
+        StatusSocket first(socket, [] { return "first"; });
+        EXPECT_FALSE(first.attend());
+        ::unlink(socket.c_str());
+        EXPECT_FALSE(second.attend());
+    }
+    EXPECT_EQ(UnixSocket().connectTo(socket), 0);
+}
+
+TEST_F(ToolStatusTest, AClientIsLetGoWhenThereIsNoAnswer) {
+    StatusSocket status(socket, []() -> std::string { throw std::runtime_error("no answer"); });
+    EXPECT_FALSE(status.attend());
+    const UnixSocket client;
+    ASSERT_EQ(client.connectTo(socket), 0);
+    EXPECT_THROW(status.attend(), std::runtime_error);
+    char octet = 0;
+    EXPECT_EQ(::read(client.descriptor(), &octet, 1), 0);
 }
 
 TEST_F(ToolStatusTest, AFileThatIsNoSocketIsLeftAlone) {

@@ -5,8 +5,11 @@
 #include <optional>
 #include <string>
 
+#include <sys/types.h>
+
 #include "Events.h"
 #include "Moment.h"
+#include "Status/UnixSocket.h"
 
 namespace vantelhost {
 
@@ -22,7 +25,7 @@ public:
     /// @param answer made for each client. Throws UsageError when the path is too long.
     StatusSocket(std::string path, std::function<std::string()> answer);
 
-    /// Removes the socket.
+    /// Removes the socket, unless another one is in its place.
     ~StatusSocket();
     StatusSocket(const StatusSocket&) = delete;
     StatusSocket& operator=(const StatusSocket&) = delete;
@@ -35,11 +38,15 @@ public:
 private:
     /// @return why it does not work; empty when it does.
     std::string listen();
+    bool begin();
+    void remove() const;
     void serve() const;
 
     const std::string path_;
     const std::function<std::string()> answer_;
-    int descriptor_ = -1;
+    std::optional<UnixSocket> socket_; ///< while it listens
+    dev_t device_ = 0;                 ///< of the socket's name, as the next
+    ino_t inode_ = 0;
     Clock::time_point nextTry_ = Clock::time_point::min();
     std::string problem_; ///< of the last try
 };

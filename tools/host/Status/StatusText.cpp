@@ -20,8 +20,8 @@ std::string row(const std::string& name, const std::string& text) {
 std::string lastText(const Json& last) {
     return last.is_null()
                ? "none"
-               : fmt::format("{}, {:.1f} s ago", shownOffset(last["offset"].get<double>()),
-                             last["age"].get<double>());
+               : fmt::format("{}, {:.1f} s ago", shownOffset(last.at("offset").get<double>()),
+                             last.at("age").get<double>());
 }
 
 /// Of |offset|, as whoever asks wants to know how far off it was.
@@ -29,23 +29,23 @@ std::string windowText(const Json& window) {
     if (window.is_null()) {
         return "none";
     }
-    const double largest =
-        std::max(std::abs(window["min"].get<double>()), std::abs(window["max"].get<double>()));
-    return fmt::format("rms {}, max {} in {} pairs", shownOffset(window["rms"].get<double>()),
-                       shownOffset(largest), window["pairs"].get<std::uint64_t>());
+    const double largest = std::max(std::abs(window.at("min").get<double>()),
+                                    std::abs(window.at("max").get<double>()));
+    return fmt::format("rms {}, max {} in {} pairs", shownOffset(window.at("rms").get<double>()),
+                       shownOffset(largest), window.at("pairs").get<std::uint64_t>());
 }
 
 std::string qualityText(const Json& status) {
-    const std::string quality = status["quality"];
+    const std::string quality = status.at("quality");
     return quality.empty()
                ? "none yet"
-               : fmt::format("{} ({})", quality, status["qualityReason"].get<std::string>());
+               : fmt::format("{} ({})", quality, status.at("qualityReason").get<std::string>());
 }
 
 std::string healthText(const Json& status) {
-    const std::string reason = status["reason"];
-    return fmt::format("{} for {}{}", status["health"].get<std::string>(),
-                       shownHours(status["since"].get<double>()),
+    const std::string reason = status.at("reason");
+    return fmt::format("{} for {}{}", status.at("health").get<std::string>(),
+                       shownHours(status.at("since").get<double>()),
                        reason.empty() ? "" : fmt::format(" ({})", reason));
 }
 
@@ -59,28 +59,29 @@ std::string portRows(const Json& ports) {
 }
 
 std::string chronyText(const Json& chrony) {
-    return chrony.is_null() ? "gets no pairs"
-                            : chronyEvent(chrony["sent"], chrony["failed"], chrony["problem"]).text;
+    return chrony.is_null()
+               ? "gets no pairs"
+               : chronyEvent(chrony.at("sent"), chrony.at("failed"), chrony.at("problem")).text;
 }
 
 } // namespace
 
 std::string statusText(const Json& status) {
-    const Json& clocks = status["clocks"];
+    const Json& clocks = status.at("clocks");
     return row("Health", healthText(status)) + row("Quality", qualityText(status)) +
            row("Grandmaster", shownClock(clocks, "gmClockId", "gmClockClass", "gmClockAccuracy")) +
            row("This clock", shownClock(clocks, "localClockId", "clockClass", "clockAccuracy")) +
-           row("Last offset", lastText(status["last"])) +
-           row("Last minute", windowText(status["minute"])) +
-           row("Last hour", windowText(status["hour"])) +
+           row("Last offset", lastText(status.at("last"))) +
+           row("Last minute", windowText(status.at("minute"))) +
+           row("Last hour", windowText(status.at("hour"))) +
            row("Pairs",
-               fmt::format("{}, {} of them no measurement", status["pairs"].get<std::uint64_t>(),
-                           status["leftOut"].get<std::uint64_t>())) +
-           portRows(status["ports"]) + row("chronyd", chronyText(status["chrony"])) +
+               fmt::format("{}, {} of them no measurement", status.at("pairs").get<std::uint64_t>(),
+                           status.at("leftOut").get<std::uint64_t>())) +
+           portRows(status.at("ports")) + row("chronyd", chronyText(status.at("chrony"))) +
            row("Running",
-               fmt::format("{}, {} restarts, {}", shownHours(status["uptime"].get<double>()),
-                           status["restarts"].get<std::uint64_t>(),
-                           status["plugIn"].get<std::string>()));
+               fmt::format("{}, {} restarts, {}", shownHours(status.at("uptime").get<double>()),
+                           status.at("restarts").get<std::uint64_t>(),
+                           status.at("plugIn").get<std::string>()));
 }
 
 } // namespace vantelhost

@@ -8,7 +8,7 @@
 namespace vantelhost {
 
 /// The answer of a run, on one screen for people.
-/// @param status as StatusPage gives it
+/// @param status as StatusPage gives it. Throws Json::exception when it is something else.
 std::string statusText(const Json& status);
 
 } // namespace vantelhost

@@ -3,7 +3,6 @@
 #include <cerrno>
 #include <cstring>
 #include <system_error>
-#include <utility>
 
 #include <fmt/format.h>
 #include <sys/socket.h>
@@ -12,6 +11,18 @@
 #include "UsageError.h"
 
 namespace vantelhost {
+
+namespace {
+
+int newSocket(int flags) {
+    const int descriptor = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | flags, 0);
+    if (descriptor < 0) {
+        throw std::system_error(errno, std::system_category(), "a Unix-domain socket");
+    }
+    return descriptor;
+}
+
+} // namespace
 
 sockaddr_un unixAddress(const std::string& path) {
     sockaddr_un address{};
@@ -23,17 +34,18 @@ sockaddr_un unixAddress(const std::string& path) {
     return address;
 }
 
-UnixSocket::UnixSocket()
-    : descriptor_(::socket(AF_UNIX, SOCK_STREAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0)) {
-    if (descriptor_ < 0) {
+UnixSocket::UnixSocket() : UnixSocket(newSocket(SOCK_NONBLOCK)) {}
+
+UnixSocket::UnixSocket(std::chrono::seconds patience) : UnixSocket(newSocket(0)) {
+    timeval time{};
+    time.tv_sec = patience.count();
+    if (::setsockopt(descriptor_, SOL_SOCKET, SO_SNDTIMEO, &time, sizeof(time)) != 0) {
         throw std::system_error(errno, std::system_category(), "a Unix-domain socket");
     }
 }
 
 UnixSocket::~UnixSocket() {
-    if (descriptor_ >= 0) {
-        ::close(descriptor_);
-    }
+    ::close(descriptor_);
 }
 
 int UnixSocket::connectTo(const std::string& path) const {
@@ -44,10 +56,6 @@ int UnixSocket::connectTo(const std::string& path) const {
 int UnixSocket::bindTo(const std::string& path) const {
     const sockaddr_un address = unixAddress(path);
     return ::bind(descriptor_, reinterpret_cast<const sockaddr*>(&address), sizeof(address));
-}
-
-int UnixSocket::release() {
-    return std::exchange(descriptor_, -1);
 }
 
 } // namespace vantelhost
