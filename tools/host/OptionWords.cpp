@@ -1,6 +1,7 @@
 #include "OptionWords.h"
 
 #include <algorithm>
+#include <set>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -52,9 +53,9 @@ std::string withoutName(const std::string& problem, const std::string& key) {
     return problem.compare(0, name.size(), name) == 0 ? problem.substr(name.size()) : problem;
 }
 
-/// @param words those of the entries before; gets those of this one if nothing is wrong with it.
+/// What is wrong with an entry that stands alone.
 std::string complaintAbout(const ConfigEntry& entry, const CLI::App& command,
-                           const std::function<void(const Words&)>& parse, Words& words) {
+                           const std::function<void(const Words&)>& parse) {
     const auto* option = optionNamed(command, entry.key);
     if (option == nullptr) {
         return "is unknown: no option of \"run\"; settings stand below [settings]";
@@ -66,17 +67,46 @@ std::string complaintAbout(const ConfigEntry& entry, const CLI::App& command,
     if (!problem.empty()) {
         return problem;
     }
-    Words all = words;
-    for (auto& word : wordsFor(*option, entry.values)) {
-        all.push_back(std::move(word));
-    }
     try {
-        parse(all);
-        words = std::move(all);
-        return {};
+        parse(wordsFor(*option, entry.values));
+    } catch (const CLI::RequiresError&) {
+        // Of all entries together only.
     } catch (const CLI::ParseError& error) {
         return withoutName(error.what(), entry.key);
     }
+    return {};
+}
+
+/// Those options that are there with the entries.
+std::set<const CLI::Option*> optionsThere(const CLI::App& command,
+                                          const std::vector<ConfigEntry>& entries) {
+    std::set<const CLI::Option*> options;
+    for (const auto& entry : entries) {
+        const auto* option = optionNamed(command, entry.key);
+        if (option != nullptr && !wordsFor(*option, entry.values).empty()) {
+            options.insert(option);
+        }
+    }
+    return options;
+}
+
+/// What is wrong with an entry beside the others.
+/// @param before the options of the entries before it
+/// @param all    those of all
+std::string complaintAboutOthers(const CLI::Option& option,
+                                 const std::set<const CLI::Option*>& before,
+                                 const std::set<const CLI::Option*>& all) {
+    for (const auto* needed : option.get_needs()) {
+        if (needed->count() == 0 && all.count(needed) == 0) {
+            return fmt::format("needs {}", needed->get_lnames().at(0));
+        }
+    }
+    for (const auto* excluded : option.get_excludes()) {
+        if (before.count(excluded) > 0) {
+            return fmt::format("excludes {}", excluded->get_lnames().at(0));
+        }
+    }
+    return {};
 }
 
 } // namespace
@@ -126,10 +156,16 @@ Words wordsToAdd(const CLI::App& command, const std::vector<ConfigEntry>& entrie
 std::vector<ConfigError> complaintsAbout(const std::vector<ConfigEntry>& entries,
                                          const CLI::App& command,
                                          const std::function<void(const Words&)>& parse) {
+    const auto all = optionsThere(command, entries);
+    std::set<const CLI::Option*> before;
     std::vector<ConfigError> complaints;
-    Words words;
     for (const auto& entry : entries) {
-        const std::string problem = complaintAbout(entry, command, parse, words);
+        std::string problem = complaintAbout(entry, command, parse);
+        const auto* option = optionNamed(command, entry.key);
+        if (problem.empty() && all.count(option) > 0) {
+            problem = complaintAboutOthers(*option, before, all);
+            before.insert(option);
+        }
         if (!problem.empty()) {
             complaints.push_back(
                 {entry.line, fmt::format("{}: {}: {}", entry.place, entry.key, problem)});

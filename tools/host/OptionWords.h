@@ -27,8 +27,10 @@ Words wordsOf(const CLI::App& command);
 /// command line neither gives nor excludes.
 Words wordsToAdd(const CLI::App& command, const std::vector<ConfigEntry>& entries);
 
-/// What is wrong with the entries as options of a command: one for each that is.
-/// @param parse reads words as a new command with options of its own, and throws CLI::ParseError
+/// What is wrong with the entries as options of a command: one for each that is. What an entry
+/// needs may stand anywhere among them, or on the command line.
+/// @param command has read the command line
+/// @param parse   reads words as a new command with options of its own, and throws CLI::ParseError
 std::vector<ConfigError> complaintsAbout(const std::vector<ConfigEntry>& entries,
                                          const CLI::App& command,
                                          const std::function<void(const Words&)>& parse);

@@ -29,7 +29,8 @@ struct ParsedRun {
 RunConfig readRunConfig(const Words& commandLine) {
     const ParsedRun given(commandLine);
     Config config = readConfig(given.options);
-    RunConfig result{given.options, {}, std::move(config.json), complaintsAbout(config.file)};
+    RunConfig result{
+        given.options, {}, std::move(config.json), complaintsAbout(config.file, commandLine)};
     if (result.errors.empty()) {
         Words words = commandLine;
         const Words more = wordsToAdd(given.command, config.file.options);
@@ -42,10 +43,10 @@ RunConfig readRunConfig(const Words& commandLine) {
     return result;
 }
 
-std::vector<std::string> complaintsAbout(const ConfigFile& file) {
-    const ParsedRun none({});
+std::vector<std::string> complaintsAbout(const ConfigFile& file, const Words& commandLine) {
+    const ParsedRun given(commandLine);
     std::vector<ConfigError> errors =
-        complaintsAbout(file.options, none.command, [](const Words& words) { ParsedRun{words}; });
+        complaintsAbout(file.options, given.command, [](const Words& words) { ParsedRun{words}; });
     errors.insert(errors.end(), file.errors.begin(), file.errors.end());
     std::stable_sort(errors.begin(), errors.end(),
                      [](const auto& a, const auto& b) { return a.line < b.line; });

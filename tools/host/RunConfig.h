@@ -25,7 +25,8 @@ RunConfig readRunConfig(const Words& commandLine);
 
 /// What is wrong with a configuration file, but for the plug-in's settings. All commands that take
 /// it judge it alike, by the options of "run". In the order of its lines.
-std::vector<std::string> complaintsAbout(const ConfigFile& file);
+/// @param commandLine what stands beside it: the words of "run"
+std::vector<std::string> complaintsAbout(const ConfigFile& file, const Words& commandLine = {});
 
 /// Tells the errors, and throws UsageError if there are any.
 void refuseBadFile(const std::vector<std::string>& errors);

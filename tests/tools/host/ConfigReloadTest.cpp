@@ -75,6 +75,14 @@ TEST_F(ConfigReloadTest, WhatTheCommandLineSaysStays) {
     expectNothing(reread("seconds = 7\ninterface = \"b\"\n[settings]\ncount = 3\n"));
 }
 
+TEST_F(ConfigReloadTest, WhatAnOptionNeedsMayStandBelowItOrOnTheCommandLine) {
+    begin("interface = \"a\"\nrecord-append = true\nrecord = \"r\"\n");
+    expectNothing(reread());
+    words.insert(words.end(), {"--record", "mine"});
+    begin("interface = \"a\"\nrecord-append = true\n");
+    expectNothing(reread());
+}
+
 TEST_F(ConfigReloadTest, OtherOptionsNeedANewStart) {
     begin("interface = \"a\"\nseconds = 5\nrecord = \"r\"\njson = true\n");
     const auto change = reread("interface = \"a\"\nseconds = 6\nchrony = \"c\"\njson = true\n");

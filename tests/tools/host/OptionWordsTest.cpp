@@ -16,6 +16,8 @@ struct Sample {
     bool flag = false;
     bool other = false;
     bool kept = false;
+    std::string needed;
+    int needing = 0;
 };
 
 void addSample(CLI::App& command, Sample& sample) {
@@ -25,6 +27,8 @@ void addSample(CLI::App& command, Sample& sample) {
     auto* flag = command.add_flag("--flag", sample.flag, "");
     command.add_flag("--other", sample.other, "")->excludes(flag);
     command.add_flag("--kept", sample.kept, "")->configurable(false);
+    auto* needed = command.add_option("--needed", sample.needed, "");
+    command.add_option("--needing", sample.needing, "")->needs(needed);
 }
 
 /// A command with the words read.
@@ -46,8 +50,9 @@ ConfigEntry several(const std::string& key, const std::vector<std::string>& valu
     return {key, values, true, 4, "a.toml:4"};
 }
 
-std::vector<std::string> complaintsOf(const std::vector<ConfigEntry>& entries) {
-    const Read read({});
+std::vector<std::string> complaintsOf(const std::vector<ConfigEntry>& entries,
+                                      const Words& commandLine = {}) {
+    const Read read(commandLine);
     std::vector<std::string> texts;
     for (const auto& complaint : complaintsAbout(
              entries, read.command, [](const Words& words) { optionsOf(words, addSample); })) {
@@ -117,5 +122,21 @@ TEST(OptionWords, BadEntriesAreNamedWithTheirPlace) {
     EXPECT_THAT(complaintsOf({single("number", "many")}),
                 ElementsAre(testing::StartsWith("a.toml:3: number: ")));
     EXPECT_THAT(complaintsOf({single("flag", "true"), single("other", "true")}),
-                ElementsAre(testing::StartsWith("a.toml:3: other: ")));
+                ElementsAre("a.toml:3: other: excludes flag"));
+    EXPECT_THAT(complaintsOf({single("other", "true"), single("flag", "true")}),
+                ElementsAre("a.toml:3: flag: excludes other"));
+}
+
+TEST(OptionWords, WhatAnEntryNeedsMayStandAnywhere) {
+    const auto needing = single("needing", "5");
+    const auto needed = single("needed", "x");
+    EXPECT_THAT(complaintsOf({needed, needing}), IsEmpty());
+    EXPECT_THAT(complaintsOf({needing, needed}), IsEmpty());
+    EXPECT_THAT(complaintsOf({needing}, {"--needed", "y"}), IsEmpty());
+    EXPECT_THAT(complaintsOf({needing}), ElementsAre("a.toml:3: needing: needs needed"));
+    EXPECT_THAT(complaintsOf({needing, several("needed", {"x"})}),
+                ElementsAre("a.toml:4: needed: must be one value, not an array"));
+    EXPECT_THAT(complaintsOf({single("needing", "many")}),
+                ElementsAre(testing::AllOf(testing::StartsWith("a.toml:3: needing: "),
+                                           testing::Not(testing::HasSubstr("needs")))));
 }

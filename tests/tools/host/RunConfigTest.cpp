@@ -54,6 +54,26 @@ TEST_F(RunConfigTest, TheCommandLineWins) {
     EXPECT_FALSE(config.options.jsonLines);
 }
 
+TEST_F(RunConfigTest, TheOrderOfOptionsThatNeedEachOtherIsOfNoAccount) {
+    const auto config =
+        read("record-keep = 3\nrecord-size = \"1K\"\nrecord-append = true\nrecord = \"r\"\n");
+    EXPECT_THAT(config.errors, IsEmpty());
+    EXPECT_EQ(config.options.recordFile, "r");
+    EXPECT_TRUE(config.options.recordRules.append);
+    EXPECT_EQ(config.options.recordRules.size, 1024U);
+    EXPECT_EQ(config.options.recordRules.keep, 3U);
+}
+
+TEST_F(RunConfigTest, WhatAFileNeedsMayStandOnTheCommandLine) {
+    const std::string text = "record-append = true\nrecord-size = 100\n";
+    const auto config = read(text, {"--record", "mine"});
+    EXPECT_THAT(config.errors, IsEmpty());
+    EXPECT_EQ(config.options.recordFile, "mine");
+    EXPECT_TRUE(config.options.recordRules.append);
+    EXPECT_THAT(read(text).errors, ElementsAre(path + ":1: record-append: needs record",
+                                               path + ":2: record-size: needs record"));
+}
+
 TEST_F(RunConfigTest, AFileThatTheCommandLineOverridesMustBeGoodToo) {
     EXPECT_THAT(read("seconds = soon", {"--seconds", "3"}).errors,
                 ElementsAre(path + ":1: seconds: must be a number of seconds, not \"soon\""));
