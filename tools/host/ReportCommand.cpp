@@ -28,21 +28,21 @@ struct ReportOptions {
     std::string page;
 };
 
-/// Each file is closed when it has been read.
-Recording readRecords(std::vector<RecordSource>& sources) {
+/// One file is open at a time: there may be more of them than descriptors.
+Recording readRecords(const std::vector<std::string>& paths) {
     RecordingReader reader;
-    for (auto& [path, stream] : sources) {
-        reader.read(*stream, path);
-        stream.reset();
+    for (const auto& path : paths) {
+        std::ifstream stream = openRecord(path);
+        reader.read(stream, path);
     }
     return reader.finish();
 }
 
-void refuseToReplace(const std::vector<RecordSource>& sources, const std::string& page) {
-    for (const auto& source : sources) {
+void refuseToReplace(const std::vector<std::string>& paths, const std::string& page) {
+    for (const auto& path : paths) {
         std::error_code ignored;
-        if (std::filesystem::equivalent(source.path, page, ignored)) {
-            throw UsageError("the page would replace the recording " + source.path);
+        if (std::filesystem::equivalent(path, page, ignored)) {
+            throw UsageError("the page would replace the recording " + path);
         }
     }
 }
@@ -72,11 +72,11 @@ void writePage(const std::string& path, const std::string& page) {
 
 /// The page is complete before the file is touched.
 int makeReport(const ReportOptions& options) {
-    auto sources = openRecords(options.recordings);
+    const auto paths = findRecords(options.recordings);
     if (options.page != standardOutput) {
-        refuseToReplace(sources, options.page);
+        refuseToReplace(paths, options.page);
     }
-    const auto recording = readRecords(sources);
+    const auto recording = readRecords(paths);
     writePage(options.page, reportPage(recording, nameOf(options.recordings)));
     return exitClean;
 }

@@ -12,6 +12,7 @@
 #include <utility>
 
 #include <fmt/format.h>
+#include <unistd.h>
 
 #include "Json.h"
 #include "Moment.h"
@@ -29,7 +30,7 @@ namespace fs = std::filesystem;
 using Key = std::pair<std::uint64_t, double>;
 
 struct File {
-    RecordSource source;
+    std::string path;
     unsigned number = 0; ///< of the rotation
     std::string firstLine;
     std::optional<Key> key; ///< none when the first line is no event
@@ -52,27 +53,32 @@ std::optional<Key> keyOf(const std::string& text) {
     }
 }
 
+[[noreturn]] void refuse(const std::string& path, int error) {
+    throw UsageError(fmt::format("cannot read {}: {}", path, errorText(error)));
+}
+
 /// The first line; nothing of a file that can be read only once, and of a line that is none.
+/// Throws UsageError when the file cannot be read.
 std::string firstLineOf(const std::string& path) {
     constexpr std::streamsize longest = 1 << 20;
-    if (!fs::is_regular_file(path)) {
+    std::error_code ignored;
+    if (!fs::is_regular_file(path, ignored)) {
+        if (::access(path.c_str(), R_OK) != 0) {
+            refuse(path, errno);
+        }
         return "";
     }
     std::string line(static_cast<std::size_t>(longest), '\0');
-    std::ifstream stream(path, std::ios::binary);
+    std::ifstream stream = openRecord(path);
     stream.getline(line.data(), longest);
     line.resize(stream.good() ? static_cast<std::size_t>(stream.gcount()) - 1 : 0);
     return line;
 }
 
-File opened(const std::string& path, unsigned number) {
-    auto stream = std::make_unique<std::ifstream>(path, std::ios::binary);
-    if (!*stream) {
-        throw UsageError(fmt::format("cannot read {}: {}", path, errorText(errno)));
-    }
+File lookedAt(const std::string& path, unsigned number) {
     auto line = firstLineOf(path);
     auto key = keyOf(line);
-    return {{path, std::move(stream)}, number, std::move(line), key};
+    return {path, number, std::move(line), key};
 }
 
 bool hasKey(const Family& family) {
@@ -88,12 +94,12 @@ Key firstKey(const Family& family) {
 
 bool isSame(const File& a, const File& b) {
     std::error_code ignored;
-    return fs::equivalent(a.source.path, b.source.path, ignored);
+    return fs::equivalent(a.path, b.path, ignored);
 }
 
 void add(Families& families, const std::string& path) {
     const auto [base, number] = rotatedName(path);
-    families[base].push_back(opened(path, number));
+    families[base].push_back(lookedAt(path, number));
 }
 
 std::vector<std::string> filesIn(const std::string& folder) {
@@ -143,8 +149,8 @@ void refuseTwice(const std::vector<File>& files) {
         const auto [place, isNew] = seen.emplace(file.firstLine, &file);
         const bool isAgain = !isNew && file.key;
         if (isAgain) {
-            throw UsageError(fmt::format("{} and {} hold the same record",
-                                         place->second->source.path, file.source.path));
+            throw UsageError(
+                fmt::format("{} and {} hold the same record", place->second->path, file.path));
         }
     }
 }
@@ -171,10 +177,11 @@ std::vector<File> inOrder(Families& families) {
 
 } // namespace
 
-std::vector<RecordSource> openRecords(const std::vector<std::string>& paths) {
+std::vector<std::string> findRecords(const std::vector<std::string>& paths) {
     Families families;
     for (const auto& path : paths) {
-        if (fs::is_directory(path)) {
+        std::error_code ignored;
+        if (fs::is_directory(path, ignored)) {
             addFolder(families, path);
         } else {
             add(families, path);
@@ -182,12 +189,20 @@ std::vector<RecordSource> openRecords(const std::vector<std::string>& paths) {
     }
     auto files = inOrder(families);
     refuseTwice(files);
-    std::vector<RecordSource> sources;
-    sources.reserve(files.size());
+    std::vector<std::string> found;
+    found.reserve(files.size());
     for (auto& file : files) {
-        sources.push_back(std::move(file.source));
+        found.push_back(std::move(file.path));
     }
-    return sources;
+    return found;
+}
+
+std::ifstream openRecord(const std::string& path) {
+    std::ifstream stream(path, std::ios::binary);
+    if (!stream) {
+        refuse(path, errno);
+    }
+    return stream;
 }
 
 } // namespace vantelhost

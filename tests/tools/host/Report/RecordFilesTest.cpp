@@ -7,6 +7,7 @@
 
 #include "Tool.h"
 #include "UsageError.h"
+#include "support/Descriptors.h"
 
 using namespace vantelhost;
 using testing::ElementsAre;
@@ -27,8 +28,8 @@ protected:
 
     std::vector<std::string> names(const std::vector<std::string>& paths) const {
         std::vector<std::string> names;
-        for (const auto& source : openRecords(paths)) {
-            names.push_back(std::filesystem::path(source.path).filename());
+        for (const auto& path : findRecords(paths)) {
+            names.push_back(std::filesystem::path(path).filename());
         }
         return names;
     }
@@ -37,7 +38,7 @@ protected:
 
     std::string complaint(const std::vector<std::string>& paths) const {
         try {
-            openRecords(paths);
+            findRecords(paths);
         } catch (const UsageError& error) {
             return error.what();
         }
@@ -112,6 +113,20 @@ TEST_F(RecordFilesTest, SeveralEmptyFilesAreNoRecordTwice) {
     writeFile(folder.path("a"), "");
     writeFile(folder.path("b"), "");
     EXPECT_THAT(names({folder.path("b"), folder.path("a")}).size(), 2U);
+}
+
+TEST_F(RecordFilesTest, ThereMayBeMoreFilesThanDescriptors) {
+    for (int i = 1; i <= 100; ++i) {
+        add("run.jsonl." + std::to_string(i), i);
+    }
+    const DescriptorLimit limit(static_cast<rlim_t>(openDescriptors()) + 10);
+    EXPECT_EQ(namesOfFolder().size(), 100U);
+}
+
+TEST_F(RecordFilesTest, WhatCannotBeLookedAtIsAMistake) {
+    const auto loop = folder.path("loop");
+    std::filesystem::create_symlink(loop, loop);
+    EXPECT_EQ(complaint({loop}), "cannot read " + loop + ": Too many levels of symbolic links");
 }
 
 TEST_F(RecordFilesTest, AFolderWithoutARecordIsAMistake) {
