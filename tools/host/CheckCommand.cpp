@@ -1,5 +1,6 @@
 #include "CheckCommand.h"
 
+#include <algorithm>
 #include <memory>
 #include <string>
 
@@ -63,6 +64,13 @@ CheckOptions withFile(const CLI::App& command, const ConfigFile& file) {
     return options;
 }
 
+/// Whether the file has the run write epoch offsets.
+bool writesFifo(const ConfigFile& file) {
+    return std::any_of(file.options.begin(), file.options.end(), [](const ConfigEntry& entry) {
+        return entry.key == "epoch-offset" || entry.key == "epoch-offset-at";
+    });
+}
+
 int check(const CLI::App& command, const CheckOptions& given) {
     Config config = readConfig(given);
     refuseBadFile(complaintsAbout(config.file));
@@ -70,6 +78,7 @@ int check(const CLI::App& command, const CheckOptions& given) {
     PlugInTrial trial(options.pluginPath, userSettings(options, std::move(config.json)));
     CheckResults results = trial.run();
     Subject subject = options.subject;
+    subject.writeFifo = writesFifo(config.file);
     subject.settings = trial.settings();
     subject.rendered = trial.rendered();
     subject.interfaces = subject.settings

@@ -26,10 +26,10 @@ namespace {
 
 } // namespace
 
-EpochFifo::EpochFifo(std::string path, Absent absent)
+EpochFifo::EpochFifo(std::string path, Absent absent, Use use)
     : path_(std::move(path)), created_(absent == Absent::create && create()) {
     try {
-        descriptor_ = open();
+        descriptor_ = open(use);
     } catch (...) {
         if (created_) {
             ::unlink(path_.c_str());
@@ -62,7 +62,7 @@ bool EpochFifo::create() const {
     return false;
 }
 
-int EpochFifo::open() const {
+int EpochFifo::open(Use use) const {
     struct stat named {};
     if (::lstat(path_.c_str(), &named) != 0) {
         refuse("open", path_, errno);
@@ -71,7 +71,7 @@ int EpochFifo::open() const {
     if (!S_ISFIFO(named.st_mode)) {
         refuseNoFifo(path_);
     }
-    const int descriptor = ::open(path_.c_str(), O_RDWR | O_NONBLOCK | O_CLOEXEC | O_NOFOLLOW);
+    const int descriptor = openFor(use);
     if (descriptor < 0) {
         refuse("open", path_, errno);
     }
@@ -81,6 +81,16 @@ int EpochFifo::open() const {
         refuseNoFifo(path_);
     }
     return descriptor;
+}
+
+/// As open() answers.
+int EpochFifo::openFor(Use use) const {
+    constexpr int flags = O_NONBLOCK | O_CLOEXEC | O_NOFOLLOW;
+    const int descriptor = ::open(path_.c_str(), O_RDWR | flags);
+    if (descriptor >= 0 || errno != EACCES || use == Use::write) {
+        return descriptor;
+    }
+    return ::open(path_.c_str(), O_RDONLY | flags);
 }
 
 void EpochFifo::remove() const {

@@ -14,9 +14,12 @@ class EpochFifo {
 public:
     enum class Absent { refuse, create };
 
+    /// What for: one that is only held, and that another party writes, need not be writable.
+    enum class Use { hold, write };
+
     /// Opens the FIFO; one that it creates has mode 0600. Throws UsageError, also when something
     /// else than a FIFO has that name.
-    EpochFifo(std::string path, Absent absent);
+    EpochFifo(std::string path, Absent absent, Use use = Use::write);
 
     /// Closes the FIFO, and removes it if this object created it and nobody has replaced it.
     ~EpochFifo();
@@ -29,7 +32,8 @@ public:
 
 private:
     bool create() const;
-    int open() const;
+    int open(Use use) const;
+    int openFor(Use use) const;
     void remove() const;
 
     std::string path_;

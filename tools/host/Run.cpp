@@ -172,7 +172,8 @@ void Run::keepSessions(const PlugIn& plugIn, const Schema& schema) {
     keeper.prepare();
     if (options_.useFifo) {
         fifo.emplace(options_.fifo,
-                     options_.createFifo ? EpochFifo::Absent::create : EpochFifo::Absent::refuse);
+                     options_.createFifo ? EpochFifo::Absent::create : EpochFifo::Absent::refuse,
+                     options_.writesFifo() ? EpochFifo::Use::write : EpochFifo::Use::hold);
     }
     beginOutputs();
     if (outputIsLost_) {

@@ -154,8 +154,7 @@ void addFifo(CLI::App& command, RunOptions& options) {
 }
 
 void finish(RunOptions& options, bool fifoNamed) {
-    options.useFifo =
-        fifoNamed || options.createFifo || options.epochOffset || !options.timedOffsets.empty();
+    options.useFifo = fifoNamed || options.createFifo || options.writesFifo();
     std::stable_sort(options.timedOffsets.begin(), options.timedOffsets.end(),
                      [](const auto& a, const auto& b) { return a.seconds < b.seconds; });
 }

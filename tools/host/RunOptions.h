@@ -43,6 +43,9 @@ struct RunOptions : SettingsOptions {
     double giveUpAfter = 60; ///< so many seconds lost are a session that failed; 0: never
     bool refuseWhileStopping = false;
     bool force = false; ///< also when somebody listens at "udsAddress"
+
+    /// Whether this host writes epoch offsets into the FIFO.
+    bool writesFifo() const { return epochOffset || !timedOffsets.empty(); }
 };
 
 /// Adds the options to a command. They are filled when the command line is read.

@@ -8,6 +8,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "Checks/OrdinaryUser.h"
 #include "Tool.h"
 #include "UsageError.h"
 
@@ -59,6 +60,20 @@ TEST_F(EpochFifoTest, ALinkToAFifoIsRefused) {
     ASSERT_EQ(::mkfifo(target.c_str(), 0600), 0);
     ASSERT_EQ(::symlink(target.c_str(), path.c_str()), 0);
     EXPECT_THROW(EpochFifo(path, EpochFifo::Absent::create), UsageError);
+}
+
+TEST_F(EpochFifoTest, AFifoThatMayOnlyBeReadIsHeldAndNotWritten) {
+    ASSERT_EQ(::mkfifo(path.c_str(), 0444), 0);
+    ::chmod(folder.path("").c_str(), 0755);
+    const OrdinaryUser user;
+    if (!user.isOne()) {
+        GTEST_SKIP() << "SKIPPED: the user cannot be changed";
+    }
+    for (const auto absent : {EpochFifo::Absent::refuse, EpochFifo::Absent::create}) {
+        EXPECT_NO_THROW(EpochFifo(path, absent, EpochFifo::Use::hold));
+        EXPECT_THROW(EpochFifo(path, absent, EpochFifo::Use::write), UsageError);
+    }
+    EXPECT_TRUE(S_ISFIFO(mode()));
 }
 
 TEST_F(EpochFifoTest, AFifoThatReplacedItIsLeft) {

@@ -54,6 +54,10 @@ Finding checkFifo(const Subject& subject) {
         return bad(fmt::format("{}: {}", path, errorText(errno)),
                    "give the host's user the right to read it");
     }
+    if (subject.writeFifo && !isAllowed(path, W_OK)) {
+        return bad(fmt::format("{}: {}", path, errorText(errno)),
+                   "give the host's user the right to write it, or leave epoch offsets to others");
+    }
     const std::string problem = strangers(state);
     if (!problem.empty()) {
         return doubtful(fmt::format("{} {}", path, problem),

@@ -19,6 +19,7 @@ struct Subject {
     std::string fifo = builtEpochFifo;
     std::string usualDaemon = "/usr/sbin/ptp4l"; ///< where Debian has it
     bool createFifo = false;                     ///< by whoever will run the plug-in
+    bool writeFifo = false;                      ///< the same
     bool software = false;                       ///< the daemon will take time stamps in software
 
     std::vector<std::string> interfaces;

@@ -49,6 +49,18 @@ TEST_F(CheckTest, AFifoThatMayNotBeReadFails) {
     EXPECT_THAT(checkFifo(subject), says(Verdict::fail, "Permission denied"));
 }
 
+TEST_F(CheckTest, AFifoThatMayOnlyBeReadFailsWhereOffsetsWillBeWritten) {
+    ::mkfifo(subject.fifo.c_str(), 0444);
+    ::chmod(folder.path("").c_str(), 0755);
+    const OrdinaryUser user;
+    if (!user.isOne()) {
+        GTEST_SKIP() << "SKIPPED: the user cannot be changed";
+    }
+    EXPECT_THAT(checkFifo(subject), says(Verdict::ok, "its writer is not to be seen"));
+    subject.writeFifo = true;
+    EXPECT_THAT(checkFifo(subject), says(Verdict::fail, "Permission denied", "write it"));
+}
+
 TEST_F(CheckTest, AFifoThatOthersMayWriteIsAWarning) {
     ::mkfifo(subject.fifo.c_str(), 0600);
     ::chmod(subject.fifo.c_str(), 0620);
