@@ -10,10 +10,6 @@ void ServiceManager::isReady() const {
     ::sd_notify(0, "READY=1");
 }
 
-void ServiceManager::isReloading() const {
-    ::sd_notify(0, "RELOADING=1");
-}
-
 void ServiceManager::isStopping() const {
     ::sd_notify(0, "STOPPING=1");
 }

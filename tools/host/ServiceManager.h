@@ -9,8 +9,10 @@ namespace vantelhost {
 /// does nothing.
 class ServiceManager {
 public:
+    /// The clock runs.
     void isReady() const;
-    void isReloading() const;
+
+    /// The run ends. What it still does takes no longer than a stop may.
     void isStopping() const;
 
     /// One line for people; only a new one is sent.
