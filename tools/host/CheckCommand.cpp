@@ -59,7 +59,7 @@ CheckOptions withFile(const CLI::App& command, const ConfigFile& file) {
     Words words = wordsOf(command);
     const Words more = wordsToAdd(command, file.options);
     words.insert(words.end(), more.begin(), more.end());
-    auto options = optionsOf(words, addCheckOptions);
+    auto options = ParsedOptions(words, addCheckOptions).options;
     options.fileSettings = file.settings;
     return options;
 }

@@ -1,26 +1,23 @@
 #include "ChronyClock.h"
 
 #include <cerrno>
-#include <cstring>
 #include <system_error>
 #include <utility>
 
 #include <fmt/format.h>
 #include <sys/socket.h>
-#include <sys/un.h>
 #include <unistd.h>
 
 #include "SockSample.h"
+#include "Status/UnixSocket.h"
 #include "Text.h"
-#include "UsageError.h"
 
 namespace vantelhost {
 
-ChronyClock::ChronyClock(std::string path) : path_(std::move(path)) {
-    if (path_.size() >= sizeof(sockaddr_un::sun_path)) {
-        throw UsageError(fmt::format("the path of chronyd's socket is too long: {}", path_));
-    }
-    descriptor_ = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0);
+ChronyClock::ChronyClock(std::string path)
+    : path_(std::move(path)),
+      address_(unixAddress(path_)),
+      descriptor_(::socket(AF_UNIX, SOCK_DGRAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0)) {
     if (descriptor_ < 0) {
         throw std::system_error(errno, std::system_category(), "a socket for chronyd");
     }
@@ -49,11 +46,8 @@ Event ChronyClock::state() const {
 /// To the path each time: chronyd may come later, and makes a new socket when it is restarted.
 /// @return 0 or an errno.
 int ChronyClock::send(const std::string& datagram) const {
-    sockaddr_un address{};
-    address.sun_family = AF_UNIX;
-    std::memcpy(address.sun_path, path_.data(), path_.size());
     const ssize_t sent = ::sendto(descriptor_, datagram.data(), datagram.size(), MSG_NOSIGNAL,
-                                  reinterpret_cast<const sockaddr*>(&address), sizeof(address));
+                                  reinterpret_cast<const sockaddr*>(&address_), sizeof(address_));
     return sent < 0 ? errno : 0;
 }
 

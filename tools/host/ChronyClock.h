@@ -5,6 +5,8 @@
 #include <optional>
 #include <string>
 
+#include <sys/un.h>
+
 #include "Events.h"
 
 namespace vantelhost {
@@ -36,6 +38,7 @@ private:
     int send(const std::string& datagram) const;
 
     const std::string path_;
+    const sockaddr_un address_;
     int descriptor_ = -1;
     std::uint64_t sent_ = 0;
     std::uint64_t failed_ = 0;

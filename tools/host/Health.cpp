@@ -7,15 +7,11 @@
 #include <fmt/format.h>
 
 #include "Failure.h"
+#include "QualityReasons.h"
 
 namespace vantelhost {
 
 namespace {
-
-constexpr char roleHasChanged[] = "PTP role has changed.";
-constexpr char pollHasFailed[] =
-    "Unable to communicate with PTP sub process while attempting to retrieve time data";
-constexpr char daemonHasDied[] = "PTP sub process has died unexpectedly";
 
 /// For how long no pair may come, in seconds.
 double staleAfter(const HealthFacts& facts) {

@@ -38,15 +38,18 @@ std::vector<ConfigError> complaintsAbout(const std::vector<ConfigEntry>& entries
 /// Lets a command read words. Throws CLI::ParseError.
 void parseWords(CLI::App& command, const Words& words);
 
-/// Reads words as options of a type, such as RunOptions. Throws CLI::ParseError.
-/// @param add adds the options to a command
+/// Options of a type, such as RunOptions, and the command that has read them.
 template <class Options>
-Options optionsOf(const Words& words, void (*add)(CLI::App&, Options&)) {
+struct ParsedOptions {
+    /// Throws CLI::ParseError.
+    /// @param add adds the options to a command
+    ParsedOptions(const Words& words, void (*add)(CLI::App&, Options&)) {
+        add(command, options);
+        parseWords(command, words);
+    }
+
     Options options;
     CLI::App command;
-    add(command, options);
-    parseWords(command, words);
-    return options;
-}
+};
 
 } // namespace vantelhost

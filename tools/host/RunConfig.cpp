@@ -11,23 +11,8 @@
 
 namespace vantelhost {
 
-namespace {
-
-/// Options of words.
-struct ParsedRun {
-    explicit ParsedRun(const Words& words) {
-        addRunOptions(command, options);
-        parseWords(command, words);
-    }
-
-    RunOptions options;
-    CLI::App command;
-};
-
-} // namespace
-
 RunConfig readRunConfig(const Words& commandLine) {
-    const ParsedRun given(commandLine);
+    const ParsedOptions given(commandLine, addRunOptions);
     Config config = readConfig(given.options);
     RunConfig result{
         given.options, {}, std::move(config.json), complaintsAbout(config.file, commandLine)};
@@ -35,7 +20,7 @@ RunConfig readRunConfig(const Words& commandLine) {
         Words words = commandLine;
         const Words more = wordsToAdd(given.command, config.file.options);
         words.insert(words.end(), more.begin(), more.end());
-        const ParsedRun all(words);
+        const ParsedOptions all(words, addRunOptions);
         result.options = all.options;
         result.options.fileSettings = std::move(config.file.settings);
         result.values = valuesOf(all.command);
@@ -44,9 +29,10 @@ RunConfig readRunConfig(const Words& commandLine) {
 }
 
 std::vector<std::string> complaintsAbout(const ConfigFile& file, const Words& commandLine) {
-    const ParsedRun given(commandLine);
+    const ParsedOptions given(commandLine, addRunOptions);
     std::vector<ConfigError> errors =
-        complaintsAbout(file.options, given.command, [](const Words& words) { ParsedRun{words}; });
+        complaintsAbout(file.options, given.command,
+                        [](const Words& words) { ParsedOptions(words, addRunOptions); });
     errors.insert(errors.end(), file.errors.begin(), file.errors.end());
     std::stable_sort(errors.begin(), errors.end(),
                      [](const auto& a, const auto& b) { return a.line < b.line; });

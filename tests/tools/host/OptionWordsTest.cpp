@@ -32,14 +32,8 @@ void addSample(CLI::App& command, Sample& sample) {
 }
 
 /// A command with the words read.
-struct Read {
-    explicit Read(const Words& words) {
-        addSample(command, sample);
-        parseWords(command, words);
-    }
-
-    Sample sample;
-    CLI::App command;
+struct Read : ParsedOptions<Sample> {
+    explicit Read(const Words& words) : ParsedOptions(words, addSample) {}
 };
 
 ConfigEntry single(const std::string& key, const std::string& value) {
@@ -54,8 +48,8 @@ std::vector<std::string> complaintsOf(const std::vector<ConfigEntry>& entries,
                                       const Words& commandLine = {}) {
     const Read read(commandLine);
     std::vector<std::string> texts;
-    for (const auto& complaint : complaintsAbout(
-             entries, read.command, [](const Words& words) { optionsOf(words, addSample); })) {
+    for (const auto& complaint :
+         complaintsAbout(entries, read.command, [](const Words& words) { Read{words}; })) {
         texts.push_back(complaint.text);
     }
     return texts;
@@ -72,7 +66,7 @@ TEST(OptionWords, SayWhatACommandGot) {
 
 TEST(OptionWords, ReadAgainGiveTheSame) {
     const Words words = wordsOf(Read({"--list=--b", "--text=-x", "--number=-5", "--flag"}).command);
-    const Sample sample = optionsOf(words, addSample);
+    const Sample sample = Read(words).options;
     EXPECT_THAT(sample.list, ElementsAre("--b"));
     EXPECT_EQ(sample.text, "-x");
     EXPECT_EQ(sample.number, -5);

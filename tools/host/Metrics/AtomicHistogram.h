@@ -4,7 +4,6 @@
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
-#include <memory>
 #include <vector>
 
 #include <prometheus/client_metric.h>
@@ -18,8 +17,10 @@ public:
     ///               what is above.
     explicit AtomicHistogram(std::vector<double> bounds);
 
+    /// Never waits.
     void count(double value);
 
+    /// The buckets as Prometheus wants them: each with all below it.
     prometheus::ClientMetric::Histogram read() const;
 
 private:

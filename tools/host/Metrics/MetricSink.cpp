@@ -7,14 +7,12 @@
 #include <unordered_map>
 #include <utility>
 
+#include "QualityReasons.h"
 #include "Text.h"
 
 namespace vantelhost {
 
 namespace {
-
-constexpr char unableToCommunicate[] =
-    "Unable to communicate with PTP sub process while attempting to retrieve time data";
 
 /// In the order of their numbers.
 constexpr std::array<std::string_view, 11> portStates = {
@@ -128,7 +126,7 @@ void MetricSink::takeEpochOffset(const Event& event, const Moment& /*moment*/) {
 void MetricSink::takeQuality(const Event& event, const Moment& /*moment*/) {
     const auto& quality = event.members["quality"].get_ref<const std::string&>();
     const auto& reason = event.members["reason"].get_ref<const std::string&>();
-    if (reason == unableToCommunicate) {
+    if (reason == pollHasFailed) {
         increase(values_.failedPolls);
     }
     if (quality == quality_ && reason == reason_) {

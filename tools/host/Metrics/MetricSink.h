@@ -18,6 +18,7 @@ public:
     /// @param values outlive this.
     explicit MetricSink(MetricValues& values) : values_(values) {}
 
+    /// Events that no metric tells of are passed over.
     void take(const Event& event, const Moment& moment);
 
 private:

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <prometheus/metric_family.h>
@@ -20,8 +21,11 @@ public:
 
     /// @param labels their values, in the order of the metric's labels
     void add(double value, const std::vector<std::string>& labels = {});
+
+    /// Of a metric that is a histogram, and has no labels.
     void add(prometheus::ClientMetric::Histogram histogram);
 
+    /// All of them; there are none then.
     std::vector<prometheus::ClientMetric> take() { return std::move(samples_); }
 
 private:
@@ -29,6 +33,7 @@ private:
     std::vector<prometheus::ClientMetric> samples_;
 };
 
+/// A metric: what Prometheus is told of it, and where its samples come from.
 struct MetricRow {
     const char* name;
     prometheus::MetricType type;
@@ -39,6 +44,7 @@ struct MetricRow {
     void (*sample)(Samples& samples, const MetricValues& values, double seconds);
 };
 
+/// All metrics of a run, in the order in which they are served.
 const std::vector<MetricRow>& metricTable();
 
 } // namespace vantelhost

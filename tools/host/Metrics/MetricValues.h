@@ -32,12 +32,14 @@ struct GrandmasterLabels {
     std::string priority2;
 };
 
+/// A port, as the metadata have it.
 struct PortLabels {
     std::string port; ///< its number
     std::string interface;
     int state; ///< linuxptp's number, which is that of IEEE 1588; 0 when unknown
 };
 
+/// The clocks and ports of the last metadata.
 struct ClockLabels {
     GrandmasterLabels grandmaster;
     std::vector<PortLabels> ports;
