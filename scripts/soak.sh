@@ -5,9 +5,9 @@
 #   scripts/soak.sh [--seed N] [--plan] [MINUTES]
 #   scripts/soak.sh --service [--seed N] [MINUTES]
 # MINUTES is 10 by default. --plan only prints what would go wrong. Ctrl-C ends with a report.
-# With --service the host runs as its service does, in front of a real ptp4l and a grandmaster: daemons are killed,
-# grandmasters lost, metrics scraped. It must be locked in all minutes between; for an hour these are 30. 3 minutes
-# are the least.
+# With --service the host runs as its service does, in front of a real ptp4l and a grandmaster: daemons are killed or
+# hang, grandmasters are lost, settings change, metrics are scraped. It must be locked in all minutes between; for an
+# hour these are 25 at least. 3 minutes are the least.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 

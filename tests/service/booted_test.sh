@@ -121,6 +121,26 @@ RestartsADaemonThatWasKilled() {
   expect_equal "the host" "$host" "$(property MainPID)"
 }
 
+GivesUpADaemonThatHangs() {
+  local host daemon
+  sed -i '/^restart = /a give-up-after = 3' $configuration
+  systemctl restart $unit
+  await 30 is_locked
+  host=$(property MainPID)
+  daemon=$(daemons)
+  kill -STOP "$daemon"
+  await 20 is_not_locked
+  await 40 is_another "$daemon" daemons
+  await 30 is_locked
+  expect_equal "the host" "$host" "$(property MainPID)"
+  journalctl --unit $unit | grep -q 'lost for [0-9]* s' || fail "it was not given up"
+  [[ ! -e /proc/$daemon ]] || fail "the daemon that hung is still there"
+  expect_equal "zombies" "" "$(pgrep --parent "$host" --runstates Z || true)"
+  sed -i '/^give-up-after = /d' $configuration
+  systemctl restart $unit
+  await 30 is_locked
+}
+
 StartsAnewWhenTheHostWasKilled() {
   local host daemon
   host=$(property MainPID)
@@ -247,7 +267,7 @@ if [[ ! -e booted ]]; then
   # The document is in a package that is not installed yet.
   dpkg-deb --fsys-tarfile vantel-host_*.deb | tar -x --to-stdout ./usr/share/doc/vantel-host/service.md >service.md
   run TenCommandsGiveALockedClock ChronydFollowsIt AnswersPtp4lsOwnClient HasTheRightsOfItsUserAndThreeMore \
-    RestartsADaemonThatWasKilled StartsAnewWhenTheHostWasKilled StartsAnewWhenBothWereKilled \
+    RestartsADaemonThatWasKilled GivesUpADaemonThatHangs StartsAnewWhenTheHostWasKilled StartsAnewWhenBothWereKilled \
     WatchdogEndsAHostThatHangs ReloadTakesNewSettings ReloadOfABadFileChangesNothing \
     TellsThatTheGrandmasterIsGone UpgradeKeepsTheConfigurationAndStartsIt StopLeavesNothing
   finished=yes
