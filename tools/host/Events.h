@@ -7,7 +7,7 @@
 #include <string>
 
 #include "Json.h"
-#include "PairFilter.h"
+#include "PairKind.h"
 #include "Signals.h"
 #include "Tally.h"
 

@@ -272,6 +272,15 @@ TEST(View, ARestartForgetsTheSessionAndKeepsThePairs) {
               "quality       unusable for 0:00:00: PTP sub process has died unexpectedly");
 }
 
+TEST(View, PairsThatWereLeftOutAreCountedByTheirReason) {
+    ViewState state = following();
+    update(state, pairEvent(3000, 3000, 0, PairKind::of1970), 8);
+    update(state, pairEvent(3000, 3004, 4, PairKind::jump), 9);
+    update(state, pairEvent(3000, 3005, 5, PairKind::jump), 9);
+    EXPECT_THAT(viewLines(state, 9, roomy),
+                Contains("pairs         5, 3 left out: 1970 1, jump 2"));
+}
+
 TEST(View, AUsableQualityWithoutPairsGetsAHint) {
     ViewState state = running();
     update(state, qualityEvent(usable.data(), "PTP role has changed."), 5);

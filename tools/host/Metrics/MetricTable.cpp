@@ -48,8 +48,9 @@ void sampleOffset(Samples& samples, const MetricValues& values, double /*seconds
 }
 
 void samplePairsLeftOut(Samples& samples, const MetricValues& values, double /*seconds*/) {
-    samples.add(number(values.pairsOf1970), {"1970"});
-    samples.add(number(values.pairsWithoutDelay), {"no-delay"});
+    for (std::size_t i = 0; i < values.pairsLeftOut.size(); ++i) {
+        samples.add(number(values.pairsLeftOut.at(i)), {leftOutWord(leftOutKinds[i])});
+    }
 }
 
 void sampleChrony(Samples& samples, const MetricValues& values, double /*seconds*/) {
@@ -146,12 +147,12 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_pairs_total",
          MetricType::Counter,
          {},
-         "Time pairs, those that are no measurements included.",
+         "Time pairs, those left out included.",
          sampleCount<&Values::pairs>},
         {"vantel_pairs_left_out_total",
          MetricType::Counter,
          {"reason"},
-         "Time pairs that are no measurements.",
+         "Time pairs that no clock may follow.",
          samplePairsLeftOut},
         {"vantel_pair_age_seconds",
          MetricType::Gauge,
@@ -161,12 +162,12 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_offset_seconds",
          MetricType::Gauge,
          {},
-         "Offset of the last time pair that is a measurement, local minus reference.",
+         "Offset of the last time pair that was not left out, local minus reference.",
          sampleOffset},
         {"vantel_offset_magnitude_seconds",
          MetricType::Histogram,
          {},
-         "Offsets of the measurements, without their sign.",
+         "Offsets of time pairs that were not left out, without their sign.",
          sampleHistogram<&Values::offsets>},
         {"vantel_poll_delay_seconds",
          MetricType::Histogram,

@@ -6,12 +6,14 @@
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <string>
 #include <vector>
 
 #include "Health.h"
 #include "Metrics/AtomicHistogram.h"
 #include "Metrics/Published.h"
+#include "PairKind.h"
 
 namespace vantelhost {
 
@@ -51,9 +53,8 @@ struct MetricValues {
     Count healthChanges{0};
     Count restarts{0};
     Count failedPolls{0};
-    Count pairs{0}; ///< those left out, too
-    Count pairsOf1970{0};
-    Count pairsWithoutDelay{0};
+    Count pairs{0};                                            ///< those left out, too
+    std::array<Count, std::size(leftOutKinds)> pairsLeftOut{}; ///< in the order of those
     std::atomic<double> lastPair{
         -1}; ///< seconds since the beginning of the run; below 0 when none came
     std::atomic<bool> hasOffset{false};

@@ -55,7 +55,6 @@ void StatusPage::take(const Event& event, const Moment& moment) {
         return;
     }
     if (event.members.contains("leftOut")) {
-        ++state_.leftOut;
         return;
     }
     const std::int64_t offset = event.members["offset"];
@@ -99,7 +98,7 @@ Json StatusPage::at(double now) const {
             {"minute", statisticsOf(state.minute, now)},
             {"hour", statisticsOf(state.hour, now)},
             {"pairs", view.allOffsets.count},
-            {"leftOut", state.leftOut},
+            {"leftOut", view.leftOut},
             {"chrony", chrony}};
 }
 

@@ -28,9 +28,8 @@ public:
 private:
     struct State {
         ViewState view;
-        OffsetWindow minute{60}; ///< of measurements alone, as the next
+        OffsetWindow minute{60}; ///< without those left out, as the next
         OffsetWindow hour{3600};
-        std::uint64_t leftOut = 0; ///< pairs that are no measurement
         bool hasChrony = false;
         std::string chronyProblem; ///< empty while chronyd takes the pairs
         std::uint64_t sent = 0;

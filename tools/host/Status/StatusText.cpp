@@ -73,9 +73,7 @@ std::string statusText(const Json& status) {
            row("Last offset", lastText(status["last"])) +
            row("Last minute", windowText(status["minute"])) +
            row("Last hour", windowText(status["hour"])) +
-           row("Pairs",
-               fmt::format("{}, {} of them no measurement", status["pairs"].get<std::uint64_t>(),
-                           status["leftOut"].get<std::uint64_t>())) +
+           row("Pairs", shownPairs(status["pairs"], status["leftOut"])) +
            portRows(status["ports"]) + row("chronyd", chronyText(status["chrony"])) +
            row("Running",
                fmt::format("{}, {} restarts, {}", shownHours(status["uptime"].get<double>()),
