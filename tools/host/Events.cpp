@@ -157,13 +157,18 @@ Event refusedEvent(const std::string& function) {
     return {"refused", function + ": the host is stopping", Json{{"function", function}}};
 }
 
-Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem) {
+Event chronyEvent(const ChronyCounts& counts, const std::string& problem) {
     const bool reachable = problem.empty();
     std::string text = reachable ? "takes the pairs" : "does not take the pairs: " + problem;
-    text += fmt::format("; {} sent, {} failed", sent, failed);
+    text += fmt::format("; {} sent, {} failed", counts.sent, counts.failed);
+    text += counts.withheld == 0 ? "" : fmt::format(", {} withheld", counts.withheld);
     return {"chrony",
             std::move(text),
-            {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
+            {{"reachable", reachable},
+             {"sent", counts.sent},
+             {"failed", counts.failed},
+             {"withheld", counts.withheld},
+             {"problem", problem}}};
 }
 
 Event statusSocketEvent(const std::string& path, const std::string& problem) {

@@ -86,6 +86,14 @@ TEST_F(ChronyClockTest, AMissingChronydIsToldOnceAndCounted) {
     EXPECT_EQ(clock.state().members["failed"], 2);
 }
 
+TEST_F(ChronyClockTest, WhatIsWithheldIsCounted) {
+    const ListeningChronyd chronyd(path);
+    clock.withhold();
+    EXPECT_FALSE(clock.tookNone());
+    EXPECT_EQ(clock.take(reference, local).value().text,
+              "takes the pairs; 1 sent, 0 failed, 1 withheld");
+}
+
 TEST_F(ChronyClockTest, ARestartedChronydGetsPairsAgain) {
     {
         const ListeningChronyd chronyd(path);

@@ -76,11 +76,13 @@ TEST(Events, MetadataWithoutTheUsualMembersIsSummedUpToo) {
 }
 
 TEST(Events, ChronydTakesThePairsOrNot) {
-    EXPECT_EQ(chronyEvent(7, 2, "").text, "takes the pairs; 7 sent, 2 failed");
-    EXPECT_EQ(chronyEvent(7, 2, "").members.dump(),
-              R"({"reachable":true,"sent":7,"failed":2,"problem":""})");
-    EXPECT_EQ(chronyEvent(0, 1, "gone").text, "does not take the pairs: gone; 0 sent, 1 failed");
-    EXPECT_EQ(chronyEvent(0, 1, "gone").members["reachable"], false);
+    EXPECT_EQ(chronyEvent({7, 2, 0}, "").text, "takes the pairs; 7 sent, 2 failed");
+    EXPECT_EQ(chronyEvent({7, 2, 3}, "").text, "takes the pairs; 7 sent, 2 failed, 3 withheld");
+    EXPECT_EQ(chronyEvent({7, 2, 3}, "").members.dump(),
+              R"({"reachable":true,"sent":7,"failed":2,"withheld":3,"problem":""})");
+    EXPECT_EQ(chronyEvent({0, 1, 0}, "gone").text,
+              "does not take the pairs: gone; 0 sent, 1 failed");
+    EXPECT_EQ(chronyEvent({0, 1, 0}, "gone").members["reachable"], false);
 }
 
 TEST(Events, APairThatIsLeftOutSaysWhy) {

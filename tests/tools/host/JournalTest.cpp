@@ -212,7 +212,7 @@ TEST_F(JournalTest, EveryOutputGetsTheSameMoment) {
 
 TEST_F(JournalTest, WhatThePairTakerTellsFollowsThePair) {
     journal.handPairsTo([](std::uint64_t reference, std::uint64_t local) {
-        return local == 3 ? std::optional(chronyEvent(reference, local, "")) : std::nullopt;
+        return local == 3 ? std::optional(chronyEvent({reference, local, 0}, "")) : std::nullopt;
     });
     becomeUsable();
     journal.pair(0, 1);

@@ -141,7 +141,7 @@ TEST(View, WhatARereadingAndTheOutputsCannotDoAreProblems) {
 
 TEST(View, PhasesAndChronydAreNamed) {
     ViewState state = following();
-    update(state, chronyEvent(3, 0, ""), 8);
+    update(state, chronyEvent({3, 0, 0}, ""), 8);
     update(state, stoppingEvent("SIGINT"), 9);
     const auto lines = viewLines(state, 9, roomy);
     EXPECT_EQ(lines[0], "IEEE 1588-2008 BC, stopping (SIGINT), up 0:00:09");

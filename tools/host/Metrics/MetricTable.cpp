@@ -57,6 +57,7 @@ void sampleChrony(Samples& samples, const MetricValues& values, double /*seconds
     if (values.usesChrony) {
         samples.add(number(values.chronySent), {"sent"});
         samples.add(number(values.chronyFailed), {"failed"});
+        samples.add(number(values.chronyWithheld), {"withheld"});
     }
 }
 
@@ -202,7 +203,7 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_chrony_pairs_total",
          MetricType::Counter,
          {"result"},
-         "Time pairs handed to chronyd, and those that it did not take.",
+         "Time pairs handed to chronyd, those that it did not take, and those withheld from it.",
          sampleChrony},
     };
     return table;

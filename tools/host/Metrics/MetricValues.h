@@ -65,6 +65,7 @@ struct MetricValues {
     std::atomic<bool> usesChrony{false};
     Count chronySent{0};
     Count chronyFailed{0};
+    Count chronyWithheld{0};
     AtomicHistogram offsets;    ///< seconds, without their sign
     AtomicHistogram pollDelays; ///< seconds
     Published<QualityLabels> quality;

@@ -60,7 +60,9 @@ std::string portRows(const Json& ports) {
 
 std::string chronyText(const Json& chrony) {
     return chrony.is_null() ? "gets no pairs"
-                            : chronyEvent(chrony["sent"], chrony["failed"], chrony["problem"]).text;
+                            : chronyEvent({chrony["sent"], chrony["failed"], chrony["withheld"]},
+                                          chrony["problem"])
+                                  .text;
 }
 
 } // namespace
