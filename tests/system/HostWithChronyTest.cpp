@@ -85,7 +85,8 @@ protected:
 
     Source sourceWithSimulatedDaemon(const std::string& offset) const {
         EXPECT_EQ(::symlink(VANTEL_SIMPTP4L, path("ptp4l").c_str()), 0);
-        std::ofstream(path("ptp4l.conf.sim")) << "offset " << offset << "\nsyncs-before-delay 0\n";
+        std::ofstream(path("ptp4l.conf.sim"))
+            << "offset " << offset << "\njitter 4\nsyncs-before-delay 0\n";
         const Child clock(chronydCommand());
         const Child host(hostCommand(VANTEL_BC_TEST_LIBRARY,
                                      {"--interface", "sim0", "--fifo", path("quillEpochOffset"),

@@ -29,7 +29,7 @@ ChronyClock::~ChronyClock() {
 
 std::optional<Event> ChronyClock::take(std::uint64_t reference, std::uint64_t local) {
     const int error = send(sockSample(reference, local));
-    ++(error == 0 ? sent_ : failed_);
+    ++(error == 0 ? counts_.sent : counts_.failed);
     const bool isNews = error_ < 0 || (error == 0) != (error_ == 0);
     error_ = error;
     return isNews ? std::optional(state()) : std::nullopt;
@@ -37,10 +37,9 @@ std::optional<Event> ChronyClock::take(std::uint64_t reference, std::uint64_t lo
 
 Event ChronyClock::state() const {
     if (error_ < 0) {
-        return chronyEvent(sent_, failed_, "there was none");
+        return chronyEvent(counts_, "there was none");
     }
-    return chronyEvent(sent_, failed_,
-                       error_ == 0 ? "" : fmt::format("{}: {}", path_, errorText(error_)));
+    return chronyEvent(counts_, error_ == 0 ? "" : fmt::format("{}: {}", path_, errorText(error_)));
 }
 
 /// To the path each time: chronyd may come later, and makes a new socket when it is restarted.

@@ -25,11 +25,13 @@ public:
     /// @return an event when handing over begins to work or to fail.
     std::optional<Event> take(std::uint64_t reference, std::uint64_t local);
 
-    /// Whether there were pairs, and none was taken.
-    bool tookNone() const { return sent_ == 0 && failed_ > 0; }
+    /// Counts a pair that chronyd is not to get.
+    void withhold() { ++counts_.withheld; }
 
-    std::uint64_t sent() const { return sent_; }
-    std::uint64_t failed() const { return failed_; }
+    /// Whether there were pairs, and none was taken.
+    bool tookNone() const { return counts_.sent == 0 && counts_.failed > 0; }
+
+    const ChronyCounts& counts() const { return counts_; }
 
     /// How it stands.
     Event state() const;
@@ -40,8 +42,7 @@ private:
     const std::string path_;
     const sockaddr_un address_;
     int descriptor_ = -1;
-    std::uint64_t sent_ = 0;
-    std::uint64_t failed_ = 0;
+    ChronyCounts counts_;
     int error_ = -1; ///< errno of the last pair; 0 after success, -1 before the first
 };
 

@@ -59,6 +59,15 @@ std::string offsetSummary(const Tally& tally) {
                        tally.offsets.mean(), tally.offsets.largest, tally.offsets.rms());
 }
 
+/// Behind the number of pairs; empty when none was left out.
+std::string leftOutSummary(const Tally& tally) {
+    std::uint64_t sum = 0;
+    for (const auto& [word, count] : tally.leftOut) {
+        sum += count;
+    }
+    return sum == 0 ? "" : fmt::format("{} left out, ", sum);
+}
+
 Json offsetMembers(const OffsetStatistics& offsets) {
     if (offsets.count == 0) {
         return nullptr;
@@ -104,9 +113,8 @@ Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offse
                 fmt::format("reference {} local {} offset {} ns", reference, local, offset),
                 {{"reference", reference}, {"local", local}, {"offset", offset}}};
     if (kind != PairKind::measured) {
-        const char* const leftOut = kind == PairKind::of1970 ? "1970" : "no-delay";
-        event.text += fmt::format(", no measurement ({})", leftOut);
-        event.members["leftOut"] = leftOut;
+        event.text += fmt::format(", left out ({})", leftOutWord(kind));
+        event.members["leftOut"] = leftOutWord(kind);
     }
     return event;
 }
@@ -149,13 +157,18 @@ Event refusedEvent(const std::string& function) {
     return {"refused", function + ": the host is stopping", Json{{"function", function}}};
 }
 
-Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem) {
+Event chronyEvent(const ChronyCounts& counts, const std::string& problem) {
     const bool reachable = problem.empty();
     std::string text = reachable ? "takes the pairs" : "does not take the pairs: " + problem;
-    text += fmt::format("; {} sent, {} failed", sent, failed);
+    text += fmt::format("; {} sent, {} failed", counts.sent, counts.failed);
+    text += counts.withheld == 0 ? "" : fmt::format(", {} withheld", counts.withheld);
     return {"chrony",
             std::move(text),
-            {{"reachable", reachable}, {"sent", sent}, {"failed", failed}, {"problem", problem}}};
+            {{"reachable", reachable},
+             {"sent", counts.sent},
+             {"failed", counts.failed},
+             {"withheld", counts.withheld},
+             {"problem", problem}}};
 }
 
 Event statusSocketEvent(const std::string& path, const std::string& problem) {
@@ -235,13 +248,14 @@ Event stoppedEvent() {
 
 Event summaryEvent(double seconds, const Tally& tally) {
     std::string text =
-        fmt::format("{:.3f} s, {} pairs, {} quality changes, {} metadata updates, {} errors, {}",
-                    seconds, tally.offsets.count, tally.qualityChanges, tally.metadataUpdates,
-                    tally.errors, offsetSummary(tally));
+        fmt::format("{:.3f} s, {} pairs, {}{} quality changes, {} metadata updates, {} errors, {}",
+                    seconds, tally.offsets.count, leftOutSummary(tally), tally.qualityChanges,
+                    tally.metadataUpdates, tally.errors, offsetSummary(tally));
     return {"summary",
             std::move(text),
             {{"duration", seconds},
              {"pairs", tally.offsets.count},
+             {"leftOut", tally.leftOut},
              {"qualityChanges", tally.qualityChanges},
              {"metadataUpdates", tally.metadataUpdates},
              {"timeRequests", tally.timeRequests},

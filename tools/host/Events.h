@@ -7,7 +7,7 @@
 #include <string>
 
 #include "Json.h"
-#include "PairFilter.h"
+#include "PairKind.h"
 #include "Signals.h"
 #include "Tally.h"
 
@@ -45,9 +45,16 @@ Event failureEvent(const std::string& operation, const std::string& problem);
 /// A call of the plug-in that is refused because the host is stopping.
 Event refusedEvent(const std::string& function);
 
-/// Whether chronyd takes the time pairs, and how many it took.
+/// What became of the time pairs that chronyd might get.
+struct ChronyCounts {
+    std::uint64_t sent = 0;
+    std::uint64_t failed = 0;   ///< it did not take them
+    std::uint64_t withheld = 0; ///< it was not to get them
+};
+
+/// Whether chronyd takes the time pairs.
 /// @param problem why it does not; empty when it does.
-Event chronyEvent(std::uint64_t sent, std::uint64_t failed, const std::string& problem);
+Event chronyEvent(const ChronyCounts& counts, const std::string& problem);
 
 /// Nobody can ask how the run stands.
 Event statusSocketEvent(const std::string& path, const std::string& problem);

@@ -129,7 +129,7 @@ void HealthWatch::takeQuality(const Json& members, double seconds) {
 void HealthWatch::takePair(const Json& members, double seconds) {
     const auto leftOut = members.find("leftOut");
     const bool isLeftOut = leftOut != members.end();
-    if (isLeftOut && *leftOut == "1970") {
+    if (isLeftOut && *leftOut == leftOutWord(PairKind::of1970)) {
         return;
     }
     if (facts_.pairs > 0) {
@@ -137,7 +137,8 @@ void HealthWatch::takePair(const Json& members, double seconds) {
     }
     ++facts_.pairs;
     facts_.pairTime = seconds;
-    facts_.pairIsMeasured = !isLeftOut;
+    // What is left out for another reason is a measurement that came.
+    facts_.pairIsMeasured = !isLeftOut || *leftOut != leftOutWord(PairKind::falseOffset);
 }
 
 /// The median: an outage does not count, nor a pair that was told late.

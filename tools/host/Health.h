@@ -70,6 +70,9 @@ public:
     /// @return the event that tells so.
     std::optional<Event> change(double now);
 
+    /// As of now, whether it was told or not.
+    HealthState state(double now) const { return healthOf(facts_, now).state; }
+
     /// As of the last call of change().
     Standing standing(double now) const;
 

@@ -83,18 +83,31 @@ void Journal::quality(const double* quality, const std::string& reason, bool exp
 }
 
 void Journal::pair(std::uint64_t reference, std::uint64_t local) {
-    const std::int64_t offset = difference(local, reference);
     const std::lock_guard lock(mutex_);
     lastCall_ = Moment::Clock::now();
-    const Event event = pairEvent(reference, local, offset, filter_.pair(local, offset));
-    tally_.offsets.add(offset);
-    print(event);
-    if (!pairTaker_) {
-        return;
+    const Moment moment = Moment::now(begin_);
+    const Event event = judge(reference, local, moment);
+    tally_.offsets.add(event.members["offset"]);
+    pass(event, moment);
+    tellHealth(moment);
+    if (event.members.contains("leftOut")) {
+        ++tally_.leftOut[event.members["leftOut"]];
+    } else if (pairTaker_) {
+        if (const auto news = pairTaker_(reference, local)) {
+            tell({*news}, moment);
+        }
     }
-    if (const auto news = pairTaker_(reference, local)) {
-        print(*news);
-    }
+}
+
+Event Journal::judge(std::uint64_t reference, std::uint64_t local, const Moment& moment) {
+    const std::int64_t offset = difference(local, reference);
+    const PairKind kind = trust_.pair(local, offset, moment);
+    Event event = pairEvent(reference, local, offset, kind);
+    // The pair itself may have made it good.
+    health_.take(event, moment.seconds);
+    return kind == PairKind::measured && health_.state(moment.seconds) != HealthState::locked
+               ? pairEvent(reference, local, offset, PairKind::unhealthy)
+               : event;
 }
 
 void Journal::metadata(const std::string& text, bool expected) {
@@ -162,19 +175,19 @@ Tally Journal::tally() const {
 void Journal::print(const Event& event) {
     const Moment moment = Moment::now(begin_);
     pass(event, moment);
-    tellFilter(event);
+    tellTrust(event);
     health_.take(event, moment.seconds);
     tellHealth(moment);
 }
 
-void Journal::tellFilter(const Event& event) {
+void Journal::tellTrust(const Event& event) {
     if (event.name == "quality") {
-        filter_.quality(event.members["quality"].get_ref<const std::string&>(),
-                        event.members["reason"].get_ref<const std::string&>());
+        trust_.quality(event.members["quality"].get_ref<const std::string&>(),
+                       event.members["reason"].get_ref<const std::string&>());
     } else if (event.name == "epoch-offset") {
-        filter_.epochOffset(event.members["offset"]);
+        trust_.epochOffset(event.members["offset"]);
     } else if (event.name == "initialised") {
-        filter_ = {};
+        trust_ = {};
     }
 }
 

@@ -12,7 +12,7 @@
 #include "Events.h"
 #include "Health.h"
 #include "Moment.h"
-#include "PairFilter.h"
+#include "PairTrust.h"
 #include "Tally.h"
 
 namespace vantelhost {
@@ -48,7 +48,7 @@ public:
     /// There will be no more outputs: what has come so far need not be kept.
     void outputsAreComplete();
 
-    /// Who gets the time pairs besides.
+    /// Who gets besides the time pairs that a clock may follow: those that are not left out.
     void handPairsTo(PairTaker taker);
 
     /// Something without a count.
@@ -90,8 +90,12 @@ public:
 private:
     void print(const Event& event);
 
+    /// What a time pair is, or that the health is not what it should be.
+    /// @return its event.
+    Event judge(std::uint64_t reference, std::uint64_t local, const Moment& moment);
+
     /// What the time pairs to come are judged by.
-    void tellFilter(const Event& event);
+    void tellTrust(const Event& event);
     void tellHealth(const Moment& moment);
     void pass(const Event& event, const Moment& moment);
     void tell(const std::vector<Event>& news, const Moment& moment);
@@ -101,7 +105,7 @@ private:
     std::vector<EventTaker> outputs_;
     std::optional<std::vector<std::pair<Event, Moment>>> early_{std::in_place};
     PairTaker pairTaker_;
-    PairFilter filter_;
+    PairTrust trust_;
     HealthWatch health_;
     Moment::Clock::time_point lastCall_ = Moment::Clock::now();
     std::string lastQuality_;

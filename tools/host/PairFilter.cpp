@@ -14,13 +14,14 @@ void PairFilter::epochOffset(std::int64_t nanoseconds) {
     epochOffset_ = static_cast<std::uint64_t>(nanoseconds);
 }
 
-void PairFilter::quality(std::string_view quality, std::string_view reason) {
+bool PairFilter::quality(std::string_view quality, std::string_view reason) {
     // The only reason that tells of a grandmaster; others come and go while it stays.
     if (reason != "PTP role has changed.") {
-        return;
+        return false;
     }
     hasGrandmaster_ = quality == "usable";
     isMeasuring_ = false;
+    return hasGrandmaster_;
 }
 
 PairKind PairFilter::pair(std::uint64_t local, std::int64_t offset) {

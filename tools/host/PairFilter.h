@@ -7,24 +7,20 @@
 #include <string>
 #include <string_view>
 
-namespace vantelhost {
+#include "PairKind.h"
 
-enum class PairKind {
-    measured,
-    of1970,     ///< the grandmaster has gone: the ingress time became 0, and no Sync is behind it
-    falseOffset ///< a Sync came, but no delay is known yet: the offset is that of before, 0 at
-                ///< first
-};
+namespace vantelhost {
 
 struct PairCounts {
     std::size_t measured = 0;
     std::size_t of1970 = 0;
     std::size_t falseOffsets = 0;
+    std::size_t distrusted = 0; ///< measured, but not to be believed: only hosts tell
 
-    std::size_t all() const { return measured + of1970 + falseOffsets; }
+    std::size_t all() const { return measured + of1970 + falseOffsets + distrusted; }
 
     /// Whether Syncs come and every offset is exactly 0: no delay is measured.
-    bool onlyZeros() const { return measured == 0 && falseOffsets > 0; }
+    bool onlyZeros() const { return measured + distrusted == 0 && falseOffsets > 0; }
 };
 
 /// What to say about so many pairs that all have this offset, in nanoseconds.
@@ -44,7 +40,8 @@ public:
     void epochOffset(std::int64_t nanoseconds);
 
     /// @param quality "usable" or another one
-    void quality(std::string_view quality, std::string_view reason);
+    /// @return whether a grandmaster has come.
+    bool quality(std::string_view quality, std::string_view reason);
 
     /// Judges a pair, and counts it.
     /// @param local  nanoseconds modulo 2^64

@@ -46,7 +46,7 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
         record_.emplace(options_.recordFile, options_.recordRules);
     }
     if (!options_.chronySocket.empty()) {
-        chrony_.emplace(options_.chronySocket);
+        chrony_.emplace(options_.chronySocket, TaiOffset(options_.taiOffset));
         journal_.handPairsTo([this](std::uint64_t reference, std::uint64_t local) {
             return handToChrony(reference, local);
         });
@@ -75,12 +75,13 @@ EventSink Run::output() {
 }
 
 std::optional<Event> Run::handToChrony(std::uint64_t reference, std::uint64_t local) {
-    auto news = chrony_->take(reference, local);
+    auto news = chrony_->take(reference, local, StampedBy::systemClock);
+    const ChronyCounts& counts = chrony_->clock().counts();
     if (metrics_) {
-        metrics_->takeChrony(chrony_->sent(), chrony_->failed());
+        metrics_->takeChrony(counts);
     }
     if (statusPage_) {
-        statusPage_->takeChrony(chrony_->sent(), chrony_->failed());
+        statusPage_->takeChrony(counts);
     }
     return news;
 }
@@ -95,7 +96,7 @@ int Run::execute() {
         beginOutputs();
     }
     if (chrony_) {
-        journal_.note(chrony_->state());
+        journal_.note(chrony_->clock().state());
     }
     tellFailure();
     journal_.summary();
@@ -239,8 +240,8 @@ void Run::turn() {
 
 void Run::tellFailure() {
     facts_.tally = journal_.tally();
-    if (chrony_ && chrony_->tookNone()) {
-        facts_.chronyFailure = chrony_->state().text;
+    if (chrony_ && chrony_->clock().tookNone()) {
+        facts_.chronyFailure = chrony_->clock().state().text;
     }
     if (const auto failure = failureOf(facts_)) {
         journal_.error(causeEvent(failure->cause));

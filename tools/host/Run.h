@@ -7,7 +7,7 @@
 #include <optional>
 #include <string>
 
-#include "ChronyClock.h"
+#include "ChronyFeed.h"
 #include "ConfigReload.h"
 #include "Failure.h"
 #include "Journal.h"
@@ -77,7 +77,7 @@ private:
     const Moment::Clock::time_point begin_ = Moment::Clock::now();
     std::optional<LiveView> view_;
     std::optional<Record> record_;
-    std::optional<ChronyClock> chrony_;
+    std::optional<ChronyFeed> chrony_;
     std::optional<StatusPage> statusPage_;
     std::optional<StatusSocket> statusSocket_;
     std::optional<Metrics> metrics_;

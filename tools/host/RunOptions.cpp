@@ -25,6 +25,16 @@ std::int64_t integer(const std::string& option, const std::string& text) {
     return *value;
 }
 
+/// @return nothing for the kernel's.
+std::optional<std::int64_t> taiOffset(const std::string& text) {
+    constexpr std::int64_t most = 1000;
+    const auto seconds = parseInteger(text);
+    if (text != "kernel" && (!seconds || *seconds < 0 || *seconds > most)) {
+        refuse("--tai-offset", "kernel, or an integer of seconds from 0 to 1000", text);
+    }
+    return seconds;
+}
+
 TimedOffset timedOffset(const std::string& option, const std::string& text) {
     const auto colon = text.find(':');
     const auto seconds = parseSeconds(text.substr(0, colon));
@@ -106,8 +116,16 @@ void addOutput(CLI::App& command, RunOptions& options) {
     addRecord(command, options);
     command
         .add_option("--chrony", options.chronySocket,
-                    "Hand every time pair to chronyd's reference clock (refclock SOCK) here")
+                    "Hand time pairs to chronyd's reference clock (refclock SOCK) here")
         ->type_name("SOCKET");
+    command
+        .add_option_function<std::string>(
+            "--tai-offset",
+            [&options](const std::string& text) { options.taiOffset = taiOffset(text); },
+            "TAI minus UTC, for chronyd, where the grandmaster keeps TAI and a PTP clock stamps; "
+            "kernel: as that knows it")
+        ->type_name("SECONDS|kernel")
+        ->default_str("kernel");
     command
         .add_option("--status-socket", options.statusSocket,
                     "Answer \"vantel-host status\" here, who may write to it: mode 0660")

@@ -31,9 +31,10 @@ struct RunOptions : SettingsOptions {
     bool quiet = false;     ///< no lines for pairs and metadata
     std::string recordFile; ///< empty when nothing is recorded
     RecordRules recordRules;
-    std::string chronySocket;             ///< empty when chronyd gets nothing
-    std::string statusSocket;             ///< empty when nobody may ask
-    std::optional<ListenAddress> metrics; ///< where they are served
+    std::string chronySocket;              ///< empty when chronyd gets nothing
+    std::optional<std::int64_t> taiOffset; ///< seconds; nothing: as the kernel has it
+    std::string statusSocket;              ///< empty when nobody may ask
+    std::optional<ListenAddress> metrics;  ///< where they are served
     bool useFifo = false;
     bool createFifo = false;
     std::string fifo = builtEpochFifo;

@@ -5,6 +5,8 @@
 #include <cstdint>
 #include <string>
 
+#include "PairKind.h"
+
 namespace vantelhost {
 
 /// Statistics of offsets in nanoseconds.
@@ -29,6 +31,7 @@ std::string frozenOffsets(const OffsetStatistics& offsets);
 
 struct Tally {
     OffsetStatistics offsets;          ///< one for each time pair
+    LeftOutCounts leftOut;             ///< of those
     std::uint64_t qualityChanges = 0;  ///< quality calls whose values or reason are new
     std::uint64_t metadataUpdates = 0; ///< valid ones
     std::uint64_t timeRequests = 0;

@@ -212,7 +212,7 @@ std::vector<std::string> viewLines(const ViewState& state, double now, ScreenSiz
         {shownClock(state.metadata, "localClockId", "clockClass", "clockAccuracy")});
     add(before, "offset", {offsetText(state, now)});
     add(before, fmt::format("last {:.0f} s", state.offsets.length()), {windowText(state, now)});
-    add(before, "pairs", {fmt::format("{}", state.allOffsets.count)});
+    add(before, "pairs", {shownPairs(state.allOffsets.count, state.leftOut)});
     if (const std::string hint = hintText(state, now); !hint.empty()) {
         add(before, "hint", wrapped(hint, room));
     }

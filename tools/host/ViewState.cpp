@@ -37,7 +37,11 @@ void updateQuality(ViewState& state, const Json& members, double seconds) {
     }
 }
 
-void updateOffset(ViewState& state, std::int64_t offset, double seconds) {
+void updatePair(ViewState& state, const Json& members, double seconds) {
+    if (const auto leftOut = members.find("leftOut"); leftOut != members.end()) {
+        ++state.leftOut[*leftOut];
+    }
+    const std::int64_t offset = members["offset"];
     state.offset = offset;
     state.offsetSeconds = seconds;
     state.allOffsets.add(offset);
@@ -85,7 +89,7 @@ void update(ViewState& state, const Event& event, double seconds) {
     } else if (event.name == "quality") {
         updateQuality(state, members, seconds);
     } else if (event.name == "pair") {
-        updateOffset(state, members["offset"], seconds);
+        updatePair(state, members, seconds);
     } else if (event.name == "health") {
         updateHealth(state, members, seconds);
     } else if (event.name == "restart") {

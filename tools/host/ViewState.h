@@ -36,6 +36,7 @@ struct ViewState {
     std::optional<std::int64_t> offset; ///< of the last pair, in nanoseconds
     double offsetSeconds = 0;           ///< when it came
     OffsetStatistics allOffsets;
+    LeftOutCounts leftOut; ///< of the pairs
     OffsetWindow offsets{60};
     std::string chrony;           ///< empty when chronyd gets nothing
     std::deque<Problem> problems; ///< the last five, oldest first

@@ -1,13 +1,10 @@
 #include "ChronyClock.h"
 
-#include <array>
 #include <cstring>
 
-#include <sys/socket.h>
-#include <sys/time.h>
-#include <sys/un.h>
 #include <unistd.h>
 
+#include "ListeningChronyd.h"
 #include "SockSample.h"
 #include "Tool.h"
 #include "UsageError.h"
@@ -22,30 +19,6 @@ Number numberAt(const std::string& octets, std::size_t position) {
     std::memcpy(&number, octets.data() + position, sizeof(number));
     return number;
 }
-
-/// Where chronyd listens.
-class ListeningChronyd {
-public:
-    explicit ListeningChronyd(const std::string& path) {
-        sockaddr_un address{};
-        address.sun_family = AF_UNIX;
-        std::strcpy(address.sun_path, path.c_str());
-        EXPECT_EQ(::bind(descriptor_, reinterpret_cast<const sockaddr*>(&address), sizeof(address)),
-                  0);
-    }
-    ~ListeningChronyd() { ::close(descriptor_); }
-    ListeningChronyd(const ListeningChronyd&) = delete;
-    ListeningChronyd& operator=(const ListeningChronyd&) = delete;
-
-    std::string receive() const {
-        std::array<char, 100> buffer;
-        const ssize_t size = ::recv(descriptor_, buffer.data(), buffer.size(), MSG_DONTWAIT);
-        return size < 0 ? "" : std::string(buffer.data(), static_cast<std::size_t>(size));
-    }
-
-private:
-    int descriptor_ = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_CLOEXEC, 0);
-};
 
 class ChronyClockTest : public testing::Test {
 protected:
@@ -111,6 +84,14 @@ TEST_F(ChronyClockTest, AMissingChronydIsToldOnceAndCounted) {
     EXPECT_EQ(news->members["problem"], path + ": No such file or directory");
     EXPECT_FALSE(clock.take(reference, local).has_value());
     EXPECT_EQ(clock.state().members["failed"], 2);
+}
+
+TEST_F(ChronyClockTest, WhatIsWithheldIsCounted) {
+    const ListeningChronyd chronyd(path);
+    clock.withhold();
+    EXPECT_FALSE(clock.tookNone());
+    EXPECT_EQ(clock.take(reference, local).value().text,
+              "takes the pairs; 1 sent, 0 failed, 1 withheld");
 }
 
 TEST_F(ChronyClockTest, ARestartedChronydGetsPairsAgain) {

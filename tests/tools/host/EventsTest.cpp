@@ -2,6 +2,7 @@
 
 #include <array>
 #include <cerrno>
+#include <map>
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -75,11 +76,30 @@ TEST(Events, MetadataWithoutTheUsualMembersIsSummedUpToo) {
 }
 
 TEST(Events, ChronydTakesThePairsOrNot) {
-    EXPECT_EQ(chronyEvent(7, 2, "").text, "takes the pairs; 7 sent, 2 failed");
-    EXPECT_EQ(chronyEvent(7, 2, "").members.dump(),
-              R"({"reachable":true,"sent":7,"failed":2,"problem":""})");
-    EXPECT_EQ(chronyEvent(0, 1, "gone").text, "does not take the pairs: gone; 0 sent, 1 failed");
-    EXPECT_EQ(chronyEvent(0, 1, "gone").members["reachable"], false);
+    EXPECT_EQ(chronyEvent({7, 2, 0}, "").text, "takes the pairs; 7 sent, 2 failed");
+    EXPECT_EQ(chronyEvent({7, 2, 3}, "").text, "takes the pairs; 7 sent, 2 failed, 3 withheld");
+    EXPECT_EQ(chronyEvent({7, 2, 3}, "").members.dump(),
+              R"({"reachable":true,"sent":7,"failed":2,"withheld":3,"problem":""})");
+    EXPECT_EQ(chronyEvent({0, 1, 0}, "gone").text,
+              "does not take the pairs: gone; 0 sent, 1 failed");
+    EXPECT_EQ(chronyEvent({0, 1, 0}, "gone").members["reachable"], false);
+}
+
+TEST(Events, APairThatIsLeftOutSaysWhy) {
+    EXPECT_EQ(pairEvent(1, 4, 3).text, "reference 1 local 4 offset 3 ns");
+    EXPECT_FALSE(pairEvent(1, 4, 3).members.contains("leftOut"));
+    const std::map<PairKind, std::string> words{
+        {PairKind::of1970, "1970"},   {PairKind::falseOffset, "no-delay"},
+        {PairKind::repeated, "same"}, {PairKind::afterReturn, "return"},
+        {PairKind::jump, "jump"},     {PairKind::unhealthy, "health"}};
+    for (const auto& [kind, word] : words) {
+        const Event event = pairEvent(1, 4, 3, kind);
+        EXPECT_EQ(event.text, "reference 1 local 4 offset 3 ns, left out (" + word + ")");
+        EXPECT_EQ(event.members["leftOut"], word);
+        EXPECT_EQ(kindOfWord(word), kind);
+    }
+    EXPECT_FALSE(kindOfWord(""));
+    EXPECT_FALSE(kindOfWord("new"));
 }
 
 TEST(Events, TheSummaryHasOffsetsOnlyIfThereWereSome) {
@@ -91,6 +111,10 @@ TEST(Events, TheSummaryHasOffsetsOnlyIfThereWereSome) {
     EXPECT_THAT(summaryEvent(1, tally).text,
                 HasSubstr("2 pairs, 0 quality changes, 0 metadata updates, 0 errors, "
                           "offset min -3 mean 0.5 max 4 rms 3.5 ns"));
+    EXPECT_EQ(summaryEvent(1, tally).members["leftOut"], Json::object());
+    tally.leftOut = {{"jump", 1}, {"return", 2}};
+    EXPECT_THAT(summaryEvent(1, tally).text, HasSubstr("2 pairs, 3 left out, 0 quality changes"));
+    EXPECT_EQ(summaryEvent(1, tally).members["leftOut"], Json({{"jump", 1}, {"return", 2}}));
 }
 
 TEST(Events, ReadableEventsAreOneLineWhateverTheyHold) {

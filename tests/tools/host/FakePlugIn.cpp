@@ -159,6 +159,9 @@ private:
             quality({2.5e-08, 1e-06, -1.0}, "role\nchanged \x01\xff.");
             quality({1.0, 2.0, 3.0}, "odd");
         }
+        if (does("role")) {
+            quality({2.5e-08, 1e-06, -1.0}, "PTP role has changed.");
+        }
         if (does("pairs")) {
             pair(1000, 990);
             pair(2000, 2030);

@@ -22,6 +22,13 @@ protected:
 
     std::vector<Json> events() const { return Result{0, contentOf(path), {}}.events(); }
 
+    std::vector<Json> pairs() const { return Result{0, contentOf(path), {}}.events("pair"); }
+
+    void becomeUsable() {
+        constexpr std::array usable{2.5e-08, 1e-06, -1.0};
+        journal.quality(usable.data(), "PTP role has changed.");
+    }
+
     Folder folder;
     std::string path = folder.path("out");
     int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0600);
@@ -205,13 +212,66 @@ TEST_F(JournalTest, EveryOutputGetsTheSameMoment) {
 
 TEST_F(JournalTest, WhatThePairTakerTellsFollowsThePair) {
     journal.handPairsTo([](std::uint64_t reference, std::uint64_t local) {
-        return local == 2 ? std::optional(chronyEvent(reference, local, "")) : std::nullopt;
+        return local == 3 ? std::optional(chronyEvent({reference, local, 0}, "")) : std::nullopt;
     });
+    becomeUsable();
     journal.pair(0, 1);
-    journal.pair(1, 2);
+    journal.pair(1, 3);
     const auto shown = events();
-    ASSERT_EQ(shown.size(), 3U);
+    ASSERT_EQ(shown.size(), 5U);
     EXPECT_EQ(shown[1]["event"], "pair");
-    EXPECT_EQ(shown[2]["event"], "chrony");
-    EXPECT_EQ(shown[2]["sent"], 1);
+    EXPECT_EQ(shown[2]["event"], "health");
+    EXPECT_EQ(shown[3]["event"], "pair");
+    EXPECT_EQ(shown[4]["event"], "chrony");
+    EXPECT_EQ(shown[4]["sent"], 1);
+}
+
+TEST_F(JournalTest, AnErrorOfThePairTakerIsNotClean) {
+    journal.handPairsTo([](std::uint64_t, std::uint64_t) { return failureEvent("chronyd", "p"); });
+    becomeUsable();
+    journal.pair(0, 1);
+    EXPECT_FALSE(journal.isClean());
+    EXPECT_EQ(events().back()["problem"], "p");
+}
+
+TEST_F(JournalTest, OnlyPairsThatAClockMayFollowAreHandedOn) {
+    std::vector<std::uint64_t> handedOn;
+    journal.handPairsTo([&](std::uint64_t, std::uint64_t local) {
+        handedOn.push_back(local);
+        return std::nullopt;
+    });
+    becomeUsable();
+    journal.pair(200, 200); // the offset of before
+    journal.pair(300, 302); // the first good one
+    journal.pair(400, 500000400);
+    constexpr std::array unusable{-2.0, -2.0, -1.0};
+    journal.quality(unusable.data(), "Unable to communicate with PTP sub process while "
+                                     "attempting to retrieve time data");
+    journal.pair(500, 503);
+    std::vector<std::string> leftOut;
+    for (const auto& pair : pairs()) {
+        leftOut.push_back(pair.value("leftOut", ""));
+    }
+    EXPECT_THAT(leftOut, testing::ElementsAre("no-delay", "", "jump", "health"));
+    EXPECT_THAT(handedOn, testing::ElementsAre(302));
+    EXPECT_THAT(journal.tally().leftOut,
+                testing::ElementsAre(testing::Pair("health", 1), testing::Pair("jump", 1),
+                                     testing::Pair("no-delay", 1)));
+}
+
+TEST_F(JournalTest, WhatIsLeftOutButNotForWantOfADelayKeepsTheClockLocked) {
+    becomeUsable();
+    journal.pair(300, 302);
+    journal.pair(400, 500000400);
+    EXPECT_EQ(journal.health().health.state, HealthState::locked);
+    EXPECT_EQ((Result{0, contentOf(path), {}}.events("health").size()), 1U);
+}
+
+TEST_F(JournalTest, ANewSessionIsJudgedAnew) {
+    becomeUsable();
+    journal.pair(300, 302);
+    journal.note(initialisedEvent({{"interface", Json::array()}}));
+    becomeUsable();
+    journal.pair(400, 500000400);
+    EXPECT_FALSE(pairs().back().contains("leftOut"));
 }

@@ -32,8 +32,8 @@ void fill(StatusPage& page) {
     page.take(pairEvent(100, 400, 300), at(7));
     page.take(healthEvent("locked", "time pairs arrive", "unmeasured", 1), at(7));
     page.take(pairEvent(1000, 600, -400), at(100));
-    page.takeChrony(2, 1);
-    page.take(chronyEvent(1, 0, ""), at(100));
+    page.takeChrony({2, 1, 4});
+    page.take(chronyEvent({1, 0, 0}, ""), at(100));
 }
 
 } // namespace
@@ -53,7 +53,7 @@ TEST(StatusPage, TellsARunFromTheBeginning) {
                                   "Last offset     : none\n"
                                   "Last minute     : none\n"
                                   "Last hour       : none\n"
-                                  "Pairs           : 0, 0 of them no measurement\n"
+                                  "Pairs           : 0\n"
                                   "Ports           : none\n"
                                   "chronyd         : gets no pairs\n"
                                   "Running         : 0:00:01, 0 restarts, \n");
@@ -76,8 +76,9 @@ TEST(StatusPage, TellsAllOfARun) {
     EXPECT_EQ(status["hour"]["pairs"], 2);
     EXPECT_EQ(status["hour"]["max"], 300);
     EXPECT_EQ(status["pairs"], 3);
-    EXPECT_EQ(status["leftOut"], 1);
+    EXPECT_EQ(status["leftOut"], Json({{"no-delay", 1}}));
     EXPECT_EQ(status["chrony"]["sent"], 2);
+    EXPECT_EQ(status["chrony"]["withheld"], 4);
     EXPECT_EQ(statusText(status),
               "Health          : locked for 0:01:33 (time pairs arrive)\n"
               "Quality         : usable (PTP role has changed.)\n"
@@ -86,8 +87,8 @@ TEST(StatusPage, TellsAllOfARun) {
               "Last offset     : -400 ns, 0.2 s ago\n"
               "Last minute     : rms 400 ns, max 400 ns in 1 pairs\n"
               "Last hour       : rms 354 ns, max 400 ns in 2 pairs\n"
-              "Pairs           : 3, 1 of them no measurement\n"
+              "Pairs           : 3, 1 left out: no-delay 1\n"
               "Port1           : PTP_UNCALIBRATED on e0\n"
-              "chronyd         : takes the pairs; 2 sent, 1 failed\n"
+              "chronyd         : takes the pairs; 2 sent, 1 failed, 4 withheld\n"
               "Running         : 0:01:40, 2 restarts, IEEE 1588-2008 BC\n");
 }

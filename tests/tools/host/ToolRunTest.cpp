@@ -100,7 +100,7 @@ TEST_F(ToolTest, ReadableLinesTellTheSame) {
           "on eth0",
           "metadata     invalid, not a JSON object: {\"gmClockId\":", "stopping     duration\n",
           "stopped\n",
-          "3 pairs, 3 quality changes, 1 metadata updates, 1 errors, offset min -10"}) {
+          "3 pairs, 3 left out, 3 quality changes, 1 metadata updates, 1 errors, offset min -10"}) {
         EXPECT_THAT(result.output, HasSubstr(text));
     }
     std::istringstream lines(result.output);

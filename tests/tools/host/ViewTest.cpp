@@ -141,7 +141,7 @@ TEST(View, WhatARereadingAndTheOutputsCannotDoAreProblems) {
 
 TEST(View, PhasesAndChronydAreNamed) {
     ViewState state = following();
-    update(state, chronyEvent(3, 0, ""), 8);
+    update(state, chronyEvent({3, 0, 0}, ""), 8);
     update(state, stoppingEvent("SIGINT"), 9);
     const auto lines = viewLines(state, 9, roomy);
     EXPECT_EQ(lines[0], "IEEE 1588-2008 BC, stopping (SIGINT), up 0:00:09");
@@ -270,6 +270,15 @@ TEST(View, ARestartForgetsTheSessionAndKeepsThePairs) {
     update(state, qualityEvent(unusable.data(), "PTP sub process has died unexpectedly"), 11);
     EXPECT_EQ(viewLines(state, 11, roomy)[1],
               "quality       unusable for 0:00:00: PTP sub process has died unexpectedly");
+}
+
+TEST(View, PairsThatWereLeftOutAreCountedByTheirReason) {
+    ViewState state = following();
+    update(state, pairEvent(3000, 3000, 0, PairKind::of1970), 8);
+    update(state, pairEvent(3000, 3004, 4, PairKind::jump), 9);
+    update(state, pairEvent(3000, 3005, 5, PairKind::jump), 9);
+    EXPECT_THAT(viewLines(state, 9, roomy),
+                Contains("pairs         5, 3 left out: 1970 1, jump 2"));
 }
 
 TEST(View, AUsableQualityWithoutPairsGetsAHint) {

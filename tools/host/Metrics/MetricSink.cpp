@@ -142,19 +142,23 @@ void MetricSink::takePair(const Event& event, const Moment& moment) {
     increase(values_.pairs);
     values_.lastPair = moment.seconds;
     const auto leftOut = members.find("leftOut");
-    if (leftOut != members.end() && *leftOut == "1970") {
-        increase(values_.pairsOf1970);
-        return;
+    if (leftOut == members.end() || *leftOut != leftOutWord(PairKind::of1970)) {
+        countPollDelay(members["local"].get<std::uint64_t>(), moment.realtime);
     }
-    countPollDelay(members["local"].get<std::uint64_t>(), moment.realtime);
     if (leftOut != members.end()) {
-        increase(values_.pairsWithoutDelay);
+        countLeftOut(leftOut->get_ref<const std::string&>());
         return;
     }
     const auto offset = members["offset"].get<std::int64_t>();
     values_.offset = offset;
     values_.hasOffset = true;
     values_.offsets.count(std::abs(static_cast<double>(offset)) * 1e-9);
+}
+
+void MetricSink::countLeftOut(std::string_view word) {
+    const auto* const kind =
+        std::find(std::begin(leftOutKinds), std::end(leftOutKinds), kindOfWord(word));
+    increase(values_.pairsLeftOut.at(static_cast<std::size_t>(kind - leftOutKinds)));
 }
 
 void MetricSink::countPollDelay(std::uint64_t local, std::uint64_t now) {

@@ -30,6 +30,7 @@ private:
     void takeMetadata(const Event& event, const Moment& moment);
     void takeError(const Event& event, const Moment& moment);
 
+    void countLeftOut(std::string_view word);
     void countPollDelay(std::uint64_t local, std::uint64_t now);
     void takeGrandmaster(const std::string& identity, std::string_view ownIdentity);
 

@@ -48,14 +48,16 @@ void sampleOffset(Samples& samples, const MetricValues& values, double /*seconds
 }
 
 void samplePairsLeftOut(Samples& samples, const MetricValues& values, double /*seconds*/) {
-    samples.add(number(values.pairsOf1970), {"1970"});
-    samples.add(number(values.pairsWithoutDelay), {"no-delay"});
+    for (std::size_t i = 0; i < values.pairsLeftOut.size(); ++i) {
+        samples.add(number(values.pairsLeftOut.at(i)), {leftOutWord(leftOutKinds[i])});
+    }
 }
 
 void sampleChrony(Samples& samples, const MetricValues& values, double /*seconds*/) {
     if (values.usesChrony) {
         samples.add(number(values.chronySent), {"sent"});
         samples.add(number(values.chronyFailed), {"failed"});
+        samples.add(number(values.chronyWithheld), {"withheld"});
     }
 }
 
@@ -146,12 +148,12 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_pairs_total",
          MetricType::Counter,
          {},
-         "Time pairs, those that are no measurements included.",
+         "Time pairs, those left out included.",
          sampleCount<&Values::pairs>},
         {"vantel_pairs_left_out_total",
          MetricType::Counter,
          {"reason"},
-         "Time pairs that are no measurements.",
+         "Time pairs that no clock may follow.",
          samplePairsLeftOut},
         {"vantel_pair_age_seconds",
          MetricType::Gauge,
@@ -161,12 +163,12 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_offset_seconds",
          MetricType::Gauge,
          {},
-         "Offset of the last time pair that is a measurement, local minus reference.",
+         "Offset of the last time pair that was not left out, local minus reference.",
          sampleOffset},
         {"vantel_offset_magnitude_seconds",
          MetricType::Histogram,
          {},
-         "Offsets of the measurements, without their sign.",
+         "Offsets of time pairs that were not left out, without their sign.",
          sampleHistogram<&Values::offsets>},
         {"vantel_poll_delay_seconds",
          MetricType::Histogram,
@@ -201,7 +203,7 @@ const std::vector<MetricRow>& metricTable() {
         {"vantel_chrony_pairs_total",
          MetricType::Counter,
          {"result"},
-         "Time pairs handed to chronyd, and those that it did not take.",
+         "Time pairs handed to chronyd, those that it did not take, and those withheld from it.",
          sampleChrony},
     };
     return table;

@@ -6,12 +6,14 @@
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <string>
 #include <vector>
 
 #include "Health.h"
 #include "Metrics/AtomicHistogram.h"
 #include "Metrics/Published.h"
+#include "PairKind.h"
 
 namespace vantelhost {
 
@@ -53,9 +55,8 @@ struct MetricValues {
     Count healthChanges{0};
     Count restarts{0};
     Count failedPolls{0};
-    Count pairs{0}; ///< those left out, too
-    Count pairsOf1970{0};
-    Count pairsWithoutDelay{0};
+    Count pairs{0};                                            ///< those left out, too
+    std::array<Count, std::size(leftOutKinds)> pairsLeftOut{}; ///< in the order of those
     std::atomic<double> lastPair{
         -1}; ///< seconds since the beginning of the run; below 0 when none came
     std::atomic<bool> hasOffset{false};
@@ -66,6 +67,7 @@ struct MetricValues {
     std::atomic<bool> usesChrony{false};
     Count chronySent{0};
     Count chronyFailed{0};
+    Count chronyWithheld{0};
     AtomicHistogram offsets;    ///< seconds, without their sign
     AtomicHistogram pollDelays; ///< seconds
     Published<QualityLabels> quality;

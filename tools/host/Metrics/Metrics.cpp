@@ -7,9 +7,10 @@ namespace vantelhost {
 Metrics::Metrics(const ListenAddress& address, Moment::Clock::time_point begin)
     : server_(address, std::make_shared<MetricPage>(values_, begin)) {}
 
-void Metrics::takeChrony(std::uint64_t sent, std::uint64_t failed) {
-    values_.chronySent = sent;
-    values_.chronyFailed = failed;
+void Metrics::takeChrony(const ChronyCounts& counts) {
+    values_.chronySent = counts.sent;
+    values_.chronyFailed = counts.failed;
+    values_.chronyWithheld = counts.withheld;
     values_.usesChrony = true;
 }
 

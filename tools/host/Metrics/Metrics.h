@@ -23,8 +23,8 @@ public:
     /// One event at a time, from any thread. Never waits for who asks for metrics.
     void take(const Event& event, const Moment& moment) { sink_.take(event, moment); }
 
-    /// How many pairs chronyd took, and how many not. As above.
-    void takeChrony(std::uint64_t sent, std::uint64_t failed);
+    /// As above.
+    void takeChrony(const ChronyCounts& counts);
 
     /// Listens, if it does not: see MetricServer.
     std::optional<Event> attend() { return server_.attend(); }

@@ -58,6 +58,9 @@ std::string pairCount(const PairCounts& counts) {
     if (counts.falseOffsets > 0) {
         text += fmt::format(", {} with a false offset", counts.falseOffsets);
     }
+    if (counts.distrusted > 0) {
+        text += fmt::format(", {} not believed", counts.distrusted);
+    }
     return text;
 }
 

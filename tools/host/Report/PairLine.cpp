@@ -89,10 +89,8 @@ std::optional<PairLine> parsePairLine(std::string_view text) {
 }
 
 std::optional<PairKind> judgementOf(std::string_view leftOut) {
-    if (leftOut == "1970") {
-        return PairKind::of1970;
-    }
-    return leftOut == "no-delay" ? std::optional(PairKind::falseOffset) : std::nullopt;
+    const auto kind = kindOfWord(leftOut);
+    return kind == PairKind::unhealthy ? PairKind::measured : kind;
 }
 
 } // namespace vantelhost

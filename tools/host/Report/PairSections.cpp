@@ -88,6 +88,11 @@ std::string leftOut(const PairCounts& counts) {
                                       "no delay was measured yet.",
                                       pairsText(counts.falseOffsets)));
     }
+    if (counts.distrusted > 0) {
+        html += paragraph(fmt::format("Left out: {} that the host did not believe, behind a "
+                                      "return or a jump, or all of the same offset.",
+                                      pairsText(counts.distrusted)));
+    }
     return html;
 }
 

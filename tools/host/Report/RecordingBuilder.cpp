@@ -61,6 +61,7 @@ void count(PairCounts& counts, PairKind kind) {
     counts.measured += kind == PairKind::measured ? 1U : 0U;
     counts.of1970 += kind == PairKind::of1970 ? 1U : 0U;
     counts.falseOffsets += kind == PairKind::falseOffset ? 1U : 0U;
+    counts.distrusted += kind > PairKind::falseOffset ? 1U : 0U;
 }
 
 } // namespace

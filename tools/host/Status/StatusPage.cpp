@@ -55,7 +55,6 @@ void StatusPage::take(const Event& event, const Moment& moment) {
         return;
     }
     if (event.members.contains("leftOut")) {
-        ++state_.leftOut;
         return;
     }
     const std::int64_t offset = event.members["offset"];
@@ -63,11 +62,9 @@ void StatusPage::take(const Event& event, const Moment& moment) {
     state_.hour.add(moment.seconds, offset);
 }
 
-void StatusPage::takeChrony(std::uint64_t sent, std::uint64_t failed) {
+void StatusPage::takeChrony(const ChronyCounts& counts) {
     const std::lock_guard lock(mutex_);
-    state_.hasChrony = true;
-    state_.sent = sent;
-    state_.failed = failed;
+    state_.chrony = counts;
 }
 
 Json StatusPage::at(double now) const {
@@ -82,8 +79,11 @@ Json StatusPage::at(double now) const {
         last = {{"offset", *view.offset}, {"age", toMilliseconds(now - view.offsetSeconds)}};
     }
     Json chrony;
-    if (state.hasChrony) {
-        chrony = {{"problem", state.chronyProblem}, {"sent", state.sent}, {"failed", state.failed}};
+    if (state.chrony) {
+        chrony = {{"problem", state.chronyProblem},
+                  {"sent", state.chrony->sent},
+                  {"failed", state.chrony->failed},
+                  {"withheld", state.chrony->withheld}};
     }
     return {{"health", view.health},
             {"reason", view.healthReason},
@@ -99,7 +99,7 @@ Json StatusPage::at(double now) const {
             {"minute", statisticsOf(state.minute, now)},
             {"hour", statisticsOf(state.hour, now)},
             {"pairs", view.allOffsets.count},
-            {"leftOut", state.leftOut},
+            {"leftOut", view.leftOut},
             {"chrony", chrony}};
 }
 

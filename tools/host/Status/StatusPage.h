@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <mutex>
+#include <optional>
 #include <string>
 
 #include "Events.h"
@@ -19,8 +20,7 @@ public:
     /// Takes what an event says.
     void take(const Event& event, const Moment& moment);
 
-    /// How many time pairs chronyd took, and how many it did not.
-    void takeChrony(std::uint64_t sent, std::uint64_t failed);
+    void takeChrony(const ChronyCounts& counts);
 
     /// @param now seconds since the beginning of the run
     Json at(double now) const;
@@ -28,13 +28,10 @@ public:
 private:
     struct State {
         ViewState view;
-        OffsetWindow minute{60}; ///< of measurements alone, as the next
+        OffsetWindow minute{60}; ///< without those left out, as the next
         OffsetWindow hour{3600};
-        std::uint64_t leftOut = 0; ///< pairs that are no measurement
-        bool hasChrony = false;
+        std::optional<ChronyCounts> chrony;
         std::string chronyProblem; ///< empty while chronyd takes the pairs
-        std::uint64_t sent = 0;
-        std::uint64_t failed = 0;
     };
 
     mutable std::mutex mutex_;

@@ -61,7 +61,9 @@ std::string portRows(const Json& ports) {
 std::string chronyText(const Json& chrony) {
     return chrony.is_null()
                ? "gets no pairs"
-               : chronyEvent(chrony.at("sent"), chrony.at("failed"), chrony.at("problem")).text;
+               : chronyEvent({chrony.at("sent"), chrony.at("failed"), chrony.at("withheld")},
+                             chrony.at("problem"))
+                     .text;
 }
 
 } // namespace
@@ -74,9 +76,7 @@ std::string statusText(const Json& status) {
            row("Last offset", lastText(status.at("last"))) +
            row("Last minute", windowText(status.at("minute"))) +
            row("Last hour", windowText(status.at("hour"))) +
-           row("Pairs",
-               fmt::format("{}, {} of them no measurement", status.at("pairs").get<std::uint64_t>(),
-                           status.at("leftOut").get<std::uint64_t>())) +
+           row("Pairs", shownPairs(status.at("pairs"), status.at("leftOut"))) +
            portRows(status.at("ports")) + row("chronyd", chronyText(status.at("chrony"))) +
            row("Running",
                fmt::format("{}, {} restarts, {}", shownHours(status.at("uptime").get<double>()),

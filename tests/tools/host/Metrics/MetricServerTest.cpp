@@ -32,11 +32,12 @@ TEST(MetricServer, AnswersWhoAsks) {
     EXPECT_EQ(event->members["listening"], true);
     EXPECT_EQ(event->text, "served at 127.0.0.1:" + std::to_string(portIn(*event)));
     metrics.take(pairEvent(0, 1000, 1000), {0, 0});
-    metrics.takeChrony(7, 3);
+    metrics.takeChrony({7, 3, 2});
     const std::string page = httpGet(portIn(*event), "/metrics");
     EXPECT_THAT(page, HasSubstr("\nvantel_offset_seconds 1e-06\n"));
     EXPECT_THAT(page, HasSubstr("\nvantel_chrony_pairs_total{result=\"sent\"} 7\n"));
     EXPECT_THAT(page, HasSubstr("\nvantel_chrony_pairs_total{result=\"failed\"} 3\n"));
+    EXPECT_THAT(page, HasSubstr("\nvantel_chrony_pairs_total{result=\"withheld\"} 2\n"));
     EXPECT_EQ(httpGet(portIn(*event), "/"), "");
     EXPECT_FALSE(metrics.attend().has_value());
 }

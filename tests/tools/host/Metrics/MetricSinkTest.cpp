@@ -141,6 +141,21 @@ TEST_F(MetricSinkTest, APairWithoutADelayHasAPollDelayAndNoOffset) {
     EXPECT_THAT(page(), HasSubstr("\nvantel_poll_delay_seconds_count 1\n"));
 }
 
+TEST_F(MetricSinkTest, WhatIsLeftOutIsCountedByItsReasonAndHasAPollDelay) {
+    takePair(250);
+    for (const auto kind : {PairKind::afterReturn, PairKind::repeated, PairKind::jump,
+                            PairKind::jump, PairKind::unhealthy}) {
+        takePair(700, kind);
+    }
+    for (const char* const each : {"return\"} 1", "same\"} 1", "jump\"} 2", "health\"} 1"}) {
+        EXPECT_THAT(page(),
+                    HasSubstr(std::string("\nvantel_pairs_left_out_total{reason=\"") + each));
+    }
+    EXPECT_THAT(page(), HasSubstr("\nvantel_offset_seconds 2.5e-07\n"));
+    EXPECT_THAT(page(), HasSubstr("\nvantel_offset_magnitude_seconds_count 1\n"));
+    EXPECT_THAT(page(), HasSubstr("\nvantel_poll_delay_seconds_count 6\n"));
+}
+
 TEST_F(MetricSinkTest, TheEpochOffsetIsNoPollDelay) {
     take(epochOffsetEvent(-37000000000));
     Event pair = pairEvent(0, arrival - 37000000000, 250);

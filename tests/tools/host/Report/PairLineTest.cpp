@@ -28,6 +28,8 @@ TEST(PairLine, MayHaveTheHostsJudgement) {
     EXPECT_EQ(line->offset, -6);
     EXPECT_EQ(judgementOf("1970"), PairKind::of1970);
     EXPECT_EQ(judgementOf("no-delay"), PairKind::falseOffset);
+    EXPECT_EQ(judgementOf("jump"), PairKind::jump);
+    EXPECT_EQ(judgementOf("health"), PairKind::measured);
     EXPECT_FALSE(judgementOf(""));
     EXPECT_FALSE(judgementOf("new"));
 }

@@ -445,10 +445,16 @@ TEST(RecordingReader, TheHostsOwnJudgementOfAPairCounts) {
         read(line("loaded", 1, named) +
              line("pair", 2, R"("local":5,"reference":0,"offset":5,"leftOut":"no-delay")") +
              line("pair", 3, R"("local":6,"reference":0,"offset":6,"leftOut":"1970")") +
-             line("pair", 4, R"("local":7,"reference":0,"offset":7)"));
+             line("pair", 4, R"("local":7,"reference":0,"offset":7)") +
+             line("pair", 5, R"("local":8,"reference":0,"offset":8,"leftOut":"jump")") +
+             line("pair", 6, R"("local":9,"reference":0,"offset":9,"leftOut":"return")") +
+             line("pair", 7, R"("local":10,"reference":0,"offset":10,"leftOut":"same")") +
+             line("pair", 8, R"("local":11,"reference":0,"offset":11,"leftOut":"health")"));
     EXPECT_EQ(recording.counts.falseOffsets, 1U);
     EXPECT_EQ(recording.counts.of1970, 1U);
-    EXPECT_THAT(valuesOf(recording.pairs->offsets()), ElementsAre(7));
+    EXPECT_EQ(recording.counts.distrusted, 3U);
+    EXPECT_EQ(recording.counts.all(), 7U);
+    EXPECT_THAT(valuesOf(recording.pairs->offsets()), ElementsAre(7, 11));
 }
 
 TEST(RecordingReader, HealthBeginsWithTheStateBeforeTheFirstOneTold) {
