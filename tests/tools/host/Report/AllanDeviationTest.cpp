@@ -13,7 +13,7 @@ namespace {
 constexpr std::uint64_t second = 1000000000;
 
 /// Of one sample a second, without gaps.
-std::vector<Deviation> everySecond(const std::vector<double>& phases) {
+std::vector<TauValue> everySecond(const std::vector<double>& phases) {
     AllanDeviation deviation;
     for (std::size_t i = 0; i < phases.size(); ++i) {
         deviation.add({static_cast<std::int64_t>(i), phases[i]});
