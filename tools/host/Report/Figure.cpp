@@ -103,7 +103,7 @@ std::string tauFigure(const Caption& caption, const std::string& name,
     plots.resize(plots.size() - std::string_view(", ").size());
     return draw(caption, 320, [&, &taus = taus, &values = values](const Canvas&) {
         return fmt::format("set xlabel \"averaging time tau in s\"\nset ylabel \"{}\"\n"
-                           "set logscale xy\nset format y \"%.0e\"\nset format x \"%g\"\n"
+                           "set logscale xy\nset format y \"%g\"\nset format x \"%g\"\n"
                            "set xrange [{:.9g}:{:.9g}]\nset yrange [{:.9g}:{:.9g}]\n{}plot {}\n",
                            name, taus.low / 1.5, taus.high * 1.5, decadeBelow(values.low),
                            decadeAbove(values.high), data, plots);
