@@ -1,7 +1,6 @@
 /// @file
 #pragma once
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -23,8 +22,8 @@ public:
     /// @param overlap in octaves
     /// @param reach   how many of its lengths a window knows of those before; a power of two
     DyadicWindows(unsigned overlap, std::size_t reach) {
-        for (unsigned octave = 0; octave < histories_.size(); ++octave) {
-            histories_[octave] = History(octave, overlap, reach);
+        for (unsigned octave = 0; octave < lengths; ++octave) {
+            histories_.emplace_back(octave, overlap, reach);
         }
     }
 
@@ -34,16 +33,16 @@ public:
         Window(const History& history, const Part& part, std::int64_t run)
             : history_(history), part_(part), run_(run) {}
 
-        unsigned octave() const { return history_.octave; }
+        unsigned octave() const { return history_.octave(); }
         std::int64_t length() const { return history_.length(); }
         const Part& part() const { return part_; }
 
-        /// Whether windows end at each place.
-        bool isEverywhere() const { return history_.zeros == 0; }
+        /// Whether windows of its length end at each place.
+        bool isEverywhere() const { return history_.takes(1); }
 
         /// The window of the same length that ended so many places ago; null if it would begin
         /// before the first place.
-        /// @param places 1 to the reach; where windows are not everywhere, lengths.
+        /// @param places 1 to the reach; where windows do not end at each place, lengths.
         const Part* ago(std::int64_t places) const {
             return run_ - places < length() ? nullptr : &history_.at(run_ - places);
         }
@@ -61,35 +60,35 @@ public:
     template <typename Visit>
     void add(const Part& part, Visit visit) {
         ++run_;
-        Part window = part;
+        Part held = part;
         for (auto& history : histories_) {
             if (run_ < history.length() || !history.takes(run_)) {
                 return;
             }
-            const Window last(history, window, run_);
-            visit(last);
-            const auto* before = last.ago(history.length());
-            Part longer = window;
+            const Window window(history, held, run_);
+            visit(window);
+            const auto* before = window.ago(history.length());
+            Part longer = held;
             if (before != nullptr) {
                 longer.add(*before);
             }
-            history.put(run_, window);
-            window = longer;
+            history.put(run_, held);
+            held = longer;
         }
     }
 
 private:
-    /// The last windows of one length.
+    /// The last windows of one length. A window is known by the number of places until its end.
     class History {
     public:
-        History() = default;
-        History(unsigned octaves, unsigned overlap, std::size_t reach)
-            : octave(octaves),
-              zeros(octaves > overlap ? octaves - overlap : 0),
-              size_(reach << (octaves - zeros)) {}
+        History(unsigned octave, unsigned overlap, std::size_t reach)
+            : octave_(octave),
+              zeros_(octave > overlap ? octave - overlap : 0),
+              size_(reach << (octave - zeros_)) {}
 
-        std::int64_t length() const { return std::int64_t{1} << octave; }
-        bool takes(std::int64_t run) const { return run >> zeros << zeros == run; }
+        unsigned octave() const { return octave_; }
+        std::int64_t length() const { return std::int64_t{1} << octave_; }
+        bool takes(std::int64_t run) const { return run >> zeros_ << zeros_ == run; }
         const Part& at(std::int64_t run) const { return parts_[indexOf(run)]; }
 
         /// Takes the place of the one a reach ago. Memory is taken when the first one comes.
@@ -98,19 +97,18 @@ private:
             parts_[indexOf(run)] = part;
         }
 
-        unsigned octave = 0;
-        unsigned zeros = 0; ///< windows end where the count of places has so many, in binary
-
     private:
         std::size_t indexOf(std::int64_t run) const {
-            return static_cast<std::size_t>(run >> zeros) & (size_ - 1);
+            return static_cast<std::size_t>(run >> zeros_) & (size_ - 1);
         }
 
-        std::size_t size_ = 0; ///< a power of two
+        unsigned octave_;
+        unsigned zeros_;   ///< windows end where the number of places has so many, in binary
+        std::size_t size_; ///< a power of two
         std::vector<Part> parts_;
     };
 
-    std::array<History, lengths> histories_;
+    std::vector<History> histories_;
     std::int64_t run_ = 0; ///< places since the beginning
 };
 

@@ -19,12 +19,12 @@ constexpr double longestLimitedTau = 1000;
 
 /// Of a class of clocks, in nanoseconds.
 struct Limits {
-    const char* name; ///< as an option has it
-    char letter;
-    double largest;                 ///< max|TE|, unfiltered
-    double constant;                ///< cTE, averaged over 1000 s, to both sides
-    double mtie;                    ///< of dTE below 0.1 Hz
-    double tdev;                    ///< of the same
+    const char* name = ""; ///< as an option has it
+    char letter = ' ';
+    double largest = 0;             ///< max|TE|, unfiltered
+    double constant = 0;            ///< cTE, averaged over 1000 s, to both sides
+    double mtie = 0;                ///< of dTE below 0.1 Hz
+    double tdev = 0;                ///< of the same
     std::optional<double> highPass; ///< dTE above 0.1 Hz, from peak to peak; for further study
 };
 
@@ -36,11 +36,11 @@ const Limits* findLimits(std::string_view name);
 
 /// How a quantity keeps its limit.
 struct LimitVerdict {
-    const char* quantity;
+    const char* quantity = "";
     std::optional<double> value; ///< nanoseconds; nothing: too little was measured
     std::optional<double> limit; ///< nanoseconds; nothing: there is none
     std::optional<double> tau;   ///< where a quantity over tau is largest, seconds
-    const char* result;          ///< "pass", "fail", "open" (less was measured than the limit is
+    const char* result = "none"; ///< "pass", "fail", "open" (less was measured than the limit is
                                  ///< for) or "none" (there is no limit)
 };
 

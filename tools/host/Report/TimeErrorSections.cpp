@@ -85,10 +85,10 @@ bool isVisible(const std::vector<TauValue>& values) {
 
 /// A measure of the time error, and of its part below 0.1 Hz.
 struct Measure {
-    const char* name; ///< a word, unlike those of others
-    const char* title;
-    const char* text;  ///< how it is made
-    const char* terms; ///< what it is made of
+    const char* name = ""; ///< a word, unlike those of others
+    const char* title = "";
+    const char* text = "";  ///< how it is made
+    const char* terms = ""; ///< what it is made of
     const std::vector<TauValue>& whole;
     const std::vector<TauValue>& low;
     std::optional<Mask> mask; ///< of what is below 0.1 Hz

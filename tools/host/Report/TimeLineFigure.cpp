@@ -101,6 +101,7 @@ std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, con
 std::string timeLineLegend(const TimeLine& timeLine) {
     const auto labels = labelsOf(timeLine);
     std::vector<LegendEntry> entries;
+    entries.reserve(labels.size());
     for (const auto& label : labels) {
         entries.push_back({colourOf(labels, label), label});
     }
