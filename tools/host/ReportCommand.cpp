@@ -12,9 +12,11 @@
 #include <fmt/format.h>
 
 #include "RecordFile.h"
+#include "Report/Limits.h"
 #include "Report/Page.h"
 #include "Report/RecordFiles.h"
 #include "Report/RecordingReader.h"
+#include "Report/ReportJson.h"
 #include "Text.h"
 #include "UsageError.h"
 #include "WriteAll.h"
@@ -26,6 +28,8 @@ namespace {
 struct ReportOptions {
     std::vector<std::string> recordings;
     std::string page;
+    std::string limits; ///< empty: none
+    bool json = false;
 };
 
 /// One file is open at a time: there may be more of them than descriptors.
@@ -70,14 +74,20 @@ void writePage(const std::string& path, const std::string& page) {
     }
 }
 
+std::string textOf(const Recording& recording, const ReportOptions& options) {
+    const auto name = nameOf(options.recordings);
+    const auto* limits = findLimits(options.limits);
+    return options.json ? toAscii(reportJson(recording, name, limits)) + "\n"
+                        : reportPage(recording, name, limits);
+}
+
 /// The page is complete before the file is touched.
 int makeReport(const ReportOptions& options) {
     const auto paths = findRecords(options.recordings);
     if (options.page != standardOutput) {
         refuseToReplace(paths, options.page);
     }
-    const auto recording = readRecords(paths);
-    writePage(options.page, reportPage(recording, nameOf(options.recordings)));
+    writePage(options.page, textOf(readRecords(paths), options));
     return exitClean;
 }
 
@@ -92,9 +102,22 @@ std::function<int()> prepareReport(CLI::App& command) {
         ->required();
     command
         .add_option("-o,--output", options->page,
-                    "The HTML page to write; - is the standard output")
-        ->type_name("FILE")
-        ->required();
+                    "The HTML page to write; - is the standard output, which is where the JSON "
+                    "text goes by default")
+        ->type_name("FILE");
+    command
+        .add_option("--limits", options->limits,
+                    "Judge the time error by the limits of ITU-T G.8273.2 for this class of clocks")
+        ->check(CLI::IsMember(limitNames()));
+    command.add_flag("--json", options->json, "Write the figures as JSON, and no page");
+    command.callback([options] {
+        if (options->page.empty()) {
+            if (!options->json) {
+                throw CLI::RequiredError("--output");
+            }
+            options->page = standardOutput;
+        }
+    });
     return [options] { return makeReport(*options); };
 }
 

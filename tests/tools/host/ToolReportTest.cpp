@@ -153,14 +153,14 @@ protected:
 
 TEST_F(ToolReportDrawingTest, HasEverySection) {
     const auto html = pageOf(wholeRecord());
-    for (const char* title :
-         {"Summary", "Offset", "Distribution of the offset", "Allan deviation", "Pair intervals",
-          "Poll delay", "Quality", "Port states", "Errors", "Last metadata", "Settings"}) {
+    for (const char* title : {"Summary", "Offset", "Distribution of the offset", "Time error",
+                              "MTIE", "TDEV", "Allan deviation", "Pair intervals", "Poll delay",
+                              "Quality", "Port states", "Errors", "Last metadata", "Settings"}) {
         EXPECT_THAT(html, HasSubstr("<h2>" + std::string(title) + "</h2>"));
     }
-    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"wide\""), 7U);
-    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"narrow\""), 7U);
-    EXPECT_EQ(count(html, "<title>"), 15U);
+    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"wide\""), 9U);
+    EXPECT_EQ(count(html, "<svg role=\"img\" class=\"narrow\""), 9U);
+    EXPECT_EQ(count(html, "<title>"), 19U);
     EXPECT_THAT(html, HasSubstr("<tr><td>Time pairs</td><td>18</td></tr>"));
     EXPECT_THAT(html, HasSubstr("<tr><td>Quality usable</td><td>12 s (92.3 %)</td></tr>"));
     EXPECT_THAT(html, Not(HasSubstr("class=\"note\"")));
@@ -219,7 +219,7 @@ TEST_F(ToolReportDrawingTest, IsWellFormedAndEveryIdIsUnique) {
         ids.push_back((*each)[1]);
     }
     std::sort(ids.begin(), ids.end());
-    EXPECT_GT(ids.size(), 7U);
+    EXPECT_GT(ids.size(), 9U);
     EXPECT_EQ(std::adjacent_find(ids.begin(), ids.end()), ids.end());
 }
 
@@ -232,9 +232,9 @@ TEST_F(ToolReportDrawingTest, ABrowserShowsAllOfIt) {
     Child child({browser, "--headless", "--no-sandbox", "--disable-gpu",
                  "--user-data-dir=" + folder.path("browser"), "--dump-dom", "file://" + page});
     ASSERT_EQ(child.wait(std::chrono::minutes(1)), 0) << child.errors();
-    EXPECT_EQ(count(child.output(), "<section>"), 11U);
-    EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 14U);
-    EXPECT_EQ(count(child.output(), "</svg>"), 14U);
+    EXPECT_EQ(count(child.output(), "<section>"), 14U);
+    EXPECT_EQ(count(child.output(), "<svg role=\"img\""), 18U);
+    EXPECT_EQ(count(child.output(), "</svg>"), 18U);
 }
 
 TEST_F(ToolReportDrawingTest, OnePairAloneIsEnough) {
@@ -346,7 +346,7 @@ TEST_F(ToolReportDrawingTest, NarrowScreensHaveDrawingsWhoseTextTheyCanRead) {
     // A phone of 390 pixels leaves 358 to a drawing: no text gets less than 13 * 358 / 350.
     const auto html = pageOf(wholeRecord());
     const std::regex drawings(R"(class="narrow"[^>]*viewBox="0 0 350 )");
-    EXPECT_EQ(std::distance(std::sregex_iterator(html.begin(), html.end(), drawings), {}), 7);
+    EXPECT_EQ(std::distance(std::sregex_iterator(html.begin(), html.end(), drawings), {}), 9);
     EXPECT_EQ(count(html, "font-size=\""), count(html, "font-size=\"13.00\""));
 }
 

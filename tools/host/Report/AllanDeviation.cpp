@@ -72,8 +72,8 @@ void AllanDeviation::add(const PhaseSample& sample) {
     }
 }
 
-std::vector<Deviation> AllanDeviation::deviations(double interval) const {
-    std::vector<Deviation> result;
+std::vector<TauValue> AllanDeviation::deviations(double interval) const {
+    std::vector<TauValue> result;
     for (const auto& [steps, squares, terms] : octaves_) {
         if (steps <= slots_ / 4 && terms > 0) {
             const double tau = interval * static_cast<double>(steps);

@@ -7,14 +7,9 @@
 #include <vector>
 
 #include "Report/PhaseGrid.h"
+#include "Report/TauValue.h"
 
 namespace vantelhost {
-
-struct Deviation {
-    double tau;          ///< seconds
-    double value;        ///< dimensionless
-    std::uint64_t terms; ///< how many second differences it is made of; at least 1
-};
 
 /// The overlapping Allan deviation for 1, 2, 4, ... intervals, in bounded memory: up to 1024
 /// intervals a second difference begins at each slot, for longer times at 1024 slots in each.
@@ -26,9 +21,9 @@ public:
     /// Slots ascend.
     void add(const PhaseSample& sample);
 
-    /// Up to a quarter of all slots. A deviation without any second difference is not there.
+    /// Dimensionless, up to a quarter of all slots. One without any second difference is not there.
     /// @param interval of the grid, seconds
-    std::vector<Deviation> deviations(double interval) const;
+    std::vector<TauValue> deviations(double interval) const;
 
 private:
     /// The last samples of slots whose number ends in so many zeros, in binary.

@@ -2,12 +2,66 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstddef>
+#include <string_view>
 
 #include <fmt/format.h>
 
+#include "Report/Colours.h"
 #include "Report/Units.h"
 
 namespace vantelhost {
+
+namespace {
+
+std::string curveData(const std::vector<TauValue>& values) {
+    std::string data;
+    for (const auto& each : values) {
+        if (each.value > 0) {
+            data += fmt::format("{:.9g} {:.9g}\n", each.tau, each.value);
+        }
+    }
+    return data;
+}
+
+struct Extents {
+    Extent taus;
+    Extent values;
+};
+
+/// Of what is drawn.
+Extents extentsOf(const std::vector<Curve>& curves, const std::optional<Mask>& mask) {
+    std::optional<Extent> taus;
+    std::optional<Extent> values;
+    const auto add = [&](double tau, double value) {
+        if (value > 0) {
+            taus = joined(taus, tau);
+            values = joined(values, value);
+        }
+    };
+    for (const auto& curve : curves) {
+        for (const auto& each : curve.values) {
+            add(each.tau, each.value);
+        }
+    }
+    if (mask) {
+        add(mask->from, mask->limit);
+        add(mask->to, mask->limit);
+    }
+    return {taus.value_or(Extent{1, 1}), values.value_or(Extent{1, 1})};
+}
+
+/// An axis of whole decades has labels that tell them.
+double decadeBelow(double value) {
+    return std::pow(10, std::floor(std::log10(value)));
+}
+
+/// Not the value itself: it is to be seen.
+double decadeAbove(double value) {
+    return std::pow(10, std::floor(std::log10(value)) + 1);
+}
+
+} // namespace
 
 std::string histogramFigure(const Caption& caption, const Histogram& histogram) {
     const auto count = static_cast<double>(histogram.counts.size());
@@ -31,20 +85,28 @@ std::string histogramFigure(const Caption& caption, const Histogram& histogram) 
     });
 }
 
-std::string deviationFigure(const Caption& caption, const std::vector<Deviation>& deviations) {
+std::string tauFigure(const Caption& caption, const std::string& name,
+                      const std::vector<Curve>& curves, const std::optional<Mask>& mask) {
+    const auto [taus, values] = extentsOf(curves, mask);
     std::string data;
-    for (const auto& each : deviations) {
-        if (each.value > 0) {
-            data += fmt::format("{:.9g} {:.9g}\n", each.tau, each.value);
-        }
+    std::string plots;
+    for (std::size_t i = 0; i < curves.size(); ++i) {
+        data += fmt::format("$curve{} << END\n{}END\n", i, curveData(curves[i].values));
+        plots += fmt::format("$curve{} with linespoints lc rgb \"#{:06x}\" pt 7 ps 0.5, ", i,
+                             curves[i].colour);
     }
-    return draw(caption, 320, [&](const Canvas&) {
-        // A range of its own: a single point has none.
-        return fmt::format("set xlabel \"averaging time tau in s\"\nset ylabel \"deviation\"\n"
-                           "set logscale xy\nset format y \"%.0e\"\nset format x \"%g\"\n"
-                           "set xrange [{:.9g}:{:.9g}]\n$data << END\n{}END\n"
-                           "plot $data with linespoints lc rgb \"#2b6cb0\" pt 7 ps 0.5\n",
-                           deviations.front().tau / 1.5, deviations.back().tau * 1.5, data);
+    if (mask) {
+        data += fmt::format("$mask << END\n{0:.9g} {2:.9g}\n{1:.9g} {2:.9g}\nEND\n", mask->from,
+                            mask->to, mask->limit);
+        plots += fmt::format("$mask with lines lc rgb \"#{:06x}\" dt 2 lw 2, ", maskColour);
+    }
+    plots.resize(plots.size() - std::string_view(", ").size());
+    return draw(caption, 320, [&, &taus = taus, &values = values](const Canvas&) {
+        return fmt::format("set xlabel \"averaging time tau in s\"\nset ylabel \"{}\"\n"
+                           "set logscale xy\nset format y \"%g\"\nset format x \"%g\"\n"
+                           "set xrange [{:.9g}:{:.9g}]\nset yrange [{:.9g}:{:.9g}]\n{}plot {}\n",
+                           name, taus.low / 1.5, taus.high * 1.5, decadeBelow(values.low),
+                           decadeAbove(values.high), data, plots);
     });
 }
 

@@ -81,6 +81,15 @@ std::string section(std::string_view title, std::string_view html) {
     return fmt::format("<section>\n<h2>{}</h2>\n{}</section>\n", escaped(title), html);
 }
 
+std::string legend(const std::vector<LegendEntry>& entries) {
+    std::string html = "<ul class=\"legend\">\n";
+    for (const auto& [colour, text] : entries) {
+        html += fmt::format("<li><span style=\"background:#{:06x}\"></span>{}</li>\n", colour,
+                            escaped(text));
+    }
+    return html + "</ul>\n";
+}
+
 std::string table(const Row& head, const std::vector<Row>& rows) {
     std::string html = "<div class=\"table\"><table>\n";
     if (!head.empty()) {

@@ -19,6 +19,14 @@ std::string note(std::string_view text);
 
 std::string section(std::string_view title, std::string_view html);
 
+/// What a colour stands for.
+struct LegendEntry {
+    unsigned colour; ///< red, green, blue
+    std::string text;
+};
+
+std::string legend(const std::vector<LegendEntry>& entries);
+
 using Row = std::vector<std::string>;
 
 /// @param head the texts of the heading; may be empty

@@ -152,13 +152,13 @@ std::string portTable(const Json& metadata) {
     return rows.empty() ? "" : table(head, rows);
 }
 
-std::string sections(const Recording& recording) {
+std::string sections(const Recording& recording, const Limits* limits) {
     std::string html = summarySection(recording) + gapSection(recording);
     html += recording.pairs->empty()
                 ? section("Offset",
                           paragraph(recording.counts.all() == 0 ? "There are no time pairs."
                                                                 : "No pair is a measurement."))
-                : pairSections(recording);
+                : pairSections(recording, limits);
     html += stateSections(recording);
     if (recording.metadata.is_object()) {
         html += section("Last metadata",
@@ -172,14 +172,14 @@ std::string sections(const Recording& recording) {
 
 } // namespace
 
-std::string reportPage(const Recording& recording, const std::string& name) {
+std::string reportPage(const Recording& recording, const std::string& name, const Limits* limits) {
     return fmt::format(
         "<!DOCTYPE html>\n<html lang=\"en\">\n<head>\n<meta charset=\"utf-8\" />\n"
         "<meta name=\"viewport\" content=\"width=device-width, initial-scale=1\" />\n"
         "<title>{0}</title>\n<style>{1}</style>\n</head>\n<body>\n"
         "<h1>{0}</h1>\n<p>Recording of vantel-host</p>\n{2}{3}</body>\n</html>\n",
         escaped(name), pageStyle, notes(recording),
-        recording.lines == 0 ? "" : sections(recording));
+        recording.lines == 0 ? "" : sections(recording, limits));
 }
 
 } // namespace vantelhost

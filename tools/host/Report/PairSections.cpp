@@ -4,11 +4,11 @@
 
 #include <fmt/format.h>
 
-#include "Report/AllanDeviation.h"
 #include "Report/Figure.h"
 #include "Report/Html.h"
 #include "Report/SeriesFigure.h"
 #include "Report/Statistics.h"
+#include "Report/TimeErrorSections.h"
 #include "Report/Units.h"
 
 namespace vantelhost {
@@ -110,38 +110,6 @@ std::string histogramSection(const ValueCounts& offsets) {
                        paragraph(text));
 }
 
-std::string howItIsMade(const PhaseGrid& grid) {
-    return paragraph(fmt::format(
-        "Overlapping Allan deviation of the offset as time error. The offsets stand on a grid of "
-        "{}, the mean distance of successive pairs. Places of the grid without an offset, from "
-        "missed Syncs and gaps: {}. Nothing is interpolated: sums that need one of those are "
-        "left out.",
-        shownTime(grid.interval() * 1e9), grid.missing()));
-}
-
-std::string deviationSection(const PairSeries& pairs) {
-    const auto deviations = pairs.deviations();
-    const bool visible = std::any_of(deviations.begin(), deviations.end(),
-                                     [](const Deviation& each) { return each.value > 0; });
-    std::string html;
-    if (visible) {
-        html =
-            deviationFigure({"deviation", "Allan deviation over the averaging time"}, deviations);
-    }
-    if (deviations.empty()) {
-        html += paragraph("Too few pairs.");
-    } else {
-        std::vector<Row> rows;
-        rows.reserve(deviations.size());
-        for (const auto& each : deviations) {
-            rows.push_back({fmt::format("{:.5g} s", each.tau), fmt::format("{:.3e}", each.value),
-                            fmt::format("{}", each.terms)});
-        }
-        html += howItIsMade(pairs.grid()) + table({"tau", "deviation", "sums"}, rows);
-    }
-    return section("Allan deviation", html);
-}
-
 std::string intervalSection(const Recording& recording) {
     const auto& intervals = recording.pairs->intervals();
     if (intervals.values().size() == 0) {
@@ -161,21 +129,21 @@ std::string delaySection(const Recording& recording) {
             seriesPart({"delay", "Poll delay over time"}, recording.pairs->delays(), recording));
 }
 
-std::string offsetSections(const Recording& recording) {
+std::string offsetSections(const Recording& recording, const Limits* limits) {
     const auto& offsets = recording.pairs->offsets();
     return section("Offset", paragraph("Local minus reference time, at the time of the call.") +
                                  leftOut(recording.counts) +
                                  seriesPart({"offset", "Offset over time"}, offsets, recording)) +
-           histogramSection(offsets.values()) + deviationSection(*recording.pairs);
+           histogramSection(offsets.values()) + timeErrorSections(*recording.pairs, limits);
 }
 
 } // namespace
 
-std::string pairSections(const Recording& recording) {
+std::string pairSections(const Recording& recording, const Limits* limits) {
     const auto& counts = recording.counts;
     return (counts.onlyZeros()
                 ? section("Offset", paragraph("No offset is a measurement.") + leftOut(counts))
-                : offsetSections(recording)) +
+                : offsetSections(recording, limits)) +
            intervalSection(recording) + delaySection(recording);
 }
 

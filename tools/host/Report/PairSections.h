@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "Report/Limits.h"
 #include "Report/Recording.h"
 
 namespace vantelhost {
@@ -10,6 +11,7 @@ namespace vantelhost {
 /// The sections about time pairs, as HTML: offset, its distribution and stability, intervals, poll
 /// delay.
 /// @param recording with pairs
-std::string pairSections(const Recording& recording);
+/// @param limits    null: none
+std::string pairSections(const Recording& recording, const Limits* limits);
 
 } // namespace vantelhost

@@ -7,6 +7,8 @@
 #include "Report/AllanDeviation.h"
 #include "Report/PhaseGrid.h"
 #include "Report/Series.h"
+#include "Report/TauValue.h"
+#include "Report/TimeError.h"
 
 namespace vantelhost {
 
@@ -42,7 +44,8 @@ public:
     const Series& intervals() const { return intervals_; }
 
     const PhaseGrid& grid() const { return grid_; }
-    std::vector<Deviation> deviations() const { return allan_.deviations(grid_.interval()); }
+    const TimeError& timeError() const { return timeError_; }
+    std::vector<TauValue> deviations() const { return allan_.deviations(grid_.interval()); }
 
     /// How many pairs a second there are from the first to the last one; 0 of one moment.
     double rate() const;
@@ -52,7 +55,11 @@ private:
     Series delays_;
     Series intervals_;
     AllanDeviation allan_;
-    PhaseGrid grid_{[this](const PhaseSample& sample) { allan_.add(sample); }};
+    TimeError timeError_;
+    PhaseGrid grid_{[this](const PhaseSample& sample) {
+        allan_.add(sample);
+        timeError_.add(sample, grid_.median());
+    }};
     double firstSeconds_ = 0;
     std::optional<Pair> last_;
     bool isInterrupted_ = true;

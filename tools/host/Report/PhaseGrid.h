@@ -11,7 +11,7 @@ namespace vantelhost {
 /// An offset at its place on an even grid of time.
 struct PhaseSample {
     std::int64_t slot = 0;
-    double phase = 0;    ///< nanoseconds
+    double phase = 0;    ///< nanoseconds from the grid's base
     bool begins = false; ///< it is not to be compared with those before
 };
 
@@ -35,6 +35,12 @@ public:
 
     /// Of the grid, in seconds; 0 before two times that differ.
     double interval() const;
+
+    /// About that, in seconds: the median distance. Known when samples are given.
+    double median() const { return median_ * 1e-9; }
+
+    /// The offset that phases are counted from, nanoseconds.
+    std::int64_t base() const { return static_cast<std::int64_t>(base_); }
 
     /// Slots without a sample, between the first and the last one.
     std::int64_t missing() const { return missing_; }

@@ -5,6 +5,11 @@
 
 namespace vantelhost {
 
+Extent joined(const std::optional<Extent>& extent, double value) {
+    return extent ? Extent{std::min(extent->low, value), std::max(extent->high, value)}
+                  : Extent{value, value};
+}
+
 double roundWidth(double width) {
     double power = 1;
     while (power * 10 <= width) {

@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <vector>
 
 #include "Report/ValueCounts.h"
@@ -19,6 +20,9 @@ struct Extent {
     double low;
     double high;
 };
+
+/// The extent of its values and another one.
+Extent joined(const std::optional<Extent>& extent, double value);
 
 /// Where all but a few of the values are: a thousandth at each end, or of fewer than 3000 values
 /// up to three, but no more than a tenth, does not count. It is then made wider by a quarter at

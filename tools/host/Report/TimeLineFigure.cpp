@@ -100,12 +100,12 @@ std::string timeLineFigure(const Caption& caption, const TimeLine& timeLine, con
 
 std::string timeLineLegend(const TimeLine& timeLine) {
     const auto labels = labelsOf(timeLine);
-    std::string html = "<ul class=\"legend\">\n";
+    std::vector<LegendEntry> entries;
+    entries.reserve(labels.size());
     for (const auto& label : labels) {
-        html += fmt::format("<li><span style=\"background:#{:06x}\"></span>{}</li>\n",
-                            colourOf(labels, label), escaped(label));
+        entries.push_back({colourOf(labels, label), label});
     }
-    return html + "</ul>\n";
+    return legend(entries);
 }
 
 } // namespace vantelhost

@@ -6,6 +6,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "Report/PublishedSets.h"
+
 using namespace vantelhost;
 
 namespace {
@@ -13,7 +15,7 @@ namespace {
 constexpr std::uint64_t second = 1000000000;
 
 /// Of one sample a second, without gaps.
-std::vector<Deviation> everySecond(const std::vector<double>& phases) {
+std::vector<TauValue> everySecond(const std::vector<double>& phases) {
     AllanDeviation deviation;
     for (std::size_t i = 0; i < phases.size(); ++i) {
         deviation.add({static_cast<std::int64_t>(i), phases[i]});
@@ -62,6 +64,15 @@ TEST(AllanDeviation, OfFiveKnownPhases) {
     const auto deviations = everySecond({0, 1, 5, 4, 7});
     ASSERT_EQ(deviations.size(), 1U);
     EXPECT_NEAR(deviations[0].value, 2.88675135e-9, 1e-16);
+}
+
+TEST(AllanDeviation, OfThePublishedFrequencies) {
+    const auto nine = everySecond(nbsPhases());
+    ASSERT_EQ(nine.size(), 2U);
+    EXPECT_NEAR(nine[0].value * 1e9, 91.22945, 5e-6);
+    EXPECT_NEAR(nine[1].value * 1e9, 85.95287, 5e-6);
+    const auto thousand = everySecond(thousandPhases());
+    EXPECT_NEAR(thousand.at(0).value * 1e9, 2.922319e-01, 5e-8);
 }
 
 TEST(AllanDeviation, OfAConstantFrequencyIsNothing) {
