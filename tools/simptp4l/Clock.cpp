@@ -78,7 +78,7 @@ std::int64_t Clock::elapsed(std::int64_t now) const {
 
 void Clock::measure(std::int64_t arrival, std::uint64_t index) {
     last_ = arrival;
-    ingress_ = ingressOf(arrival) + stepped_;
+    ingress_ = ingressOf(arrival) + script_.clockOffset + stepped_;
     // Without a delay no offset can be told: the last one stays.
     if (index >= script_.syncsBeforeDelay) {
         const double drift = script_.driftPpb * (static_cast<double>(arrival) / 1e9);

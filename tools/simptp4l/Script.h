@@ -67,7 +67,8 @@ struct Script {
     std::uint64_t syncsBeforeDelay = 1; ///< of each grandmaster
     ClockSource clock = ClockSource::realtime;
     std::int64_t fixedTime = 0;
-    std::string steeredFile; ///< holds a SteeredTime
+    std::string steeredFile;      ///< holds a SteeredTime
+    std::int64_t clockOffset = 0; ///< by which the ingress time is ahead of that clock
 
     bool gmPresent = true;
     std::int64_t gmAfter = 0;

@@ -70,6 +70,10 @@ void takeClock(ScriptWords& words, Script& script) {
     }
 }
 
+void takeClockOffset(ScriptWords& words, Script& script) {
+    script.clockOffset = words.takeSeconds("offset");
+}
+
 void takeGm(ScriptWords& words, Script& script) {
     script.gmPresent = words.accept("present");
     if (!script.gmPresent && !words.accept("absent")) {
@@ -224,6 +228,7 @@ constexpr LineWord lineWords[] = {
     {"sync-interval", takeSyncInterval},
     {"syncs-before-delay", takeSyncsBeforeDelay},
     {"clock", takeClock},
+    {"clock-offset", takeClockOffset},
     {"gm", takeGm},
     {"gm-after", takeGmAfter},
     {"gm-identity", takeGmIdentity},

@@ -104,6 +104,22 @@ TEST(Simptp4lClock, StepsOffsetAndIngressTimeTogether) {
     EXPECT_EQ(session.status(), stepped);
 }
 
+TEST(Simptp4lClock, ItsOffsetIsInTheIngressTimeAloneToTheNanosecond) {
+    const Session session("offset 7\nsyncs-before-delay 0\nclock fixed 5000\n"
+                          "clock-offset 37.000000001\n");
+    const std::string status = session.status();
+    EXPECT_EQ(ingressOf(status), 37000005001);
+    EXPECT_EQ(offsetOf(status), 7);
+}
+
+TEST(Simptp4lClock, ItsOffsetMayBeNegativeAndGoesWithTheGrandmaster) {
+    const Session session("clock fixed 5000000000\nclock-offset -1.5\n"
+                          "on PARENT_DATA_SET do gm off\n");
+    EXPECT_EQ(ingressOf(session.status()), 3500000000);
+    session.client.ask(requests::parentDataSet());
+    EXPECT_EQ(ingressOf(session.status()), 0);
+}
+
 TEST(Simptp4lClock, TimedLinesActWithoutARequest) {
     const Session session("at 0.1 do gm off\n");
     EXPECT_TRUE(waitUntil([&] { return !hasGrandmaster(session.status()); }));
