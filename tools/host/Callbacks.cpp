@@ -5,7 +5,6 @@
 #include <fmt/format.h>
 
 #include "HostStatus.h"
-#include "Moment.h"
 
 namespace vantelhost {
 
@@ -15,10 +14,12 @@ std::atomic<Callbacks*> activeCallbacks{nullptr};
 
 } // namespace
 
-Callbacks::Callbacks(Journal& journal, bool refuseWhileStopping, std::function<bool()> endsBySignal)
+Callbacks::Callbacks(Journal& journal, bool refuseWhileStopping, std::function<bool()> endsBySignal,
+                     std::function<std::uint64_t()> now)
     : journal_(journal),
       refuseWhileStopping_(refuseWhileStopping),
-      endsBySignal_(std::move(endsBySignal)) {
+      endsBySignal_(std::move(endsBySignal)),
+      now_(std::move(now)) {
     activeCallbacks = this;
 }
 
@@ -32,7 +33,7 @@ Callbacks* Callbacks::active() {
 
 void Callbacks::getTime(void** context, std::uint64_t* time, zeerr_Status* status) {
     if (accepts(context, time != nullptr, "zekel_getTime", status)) {
-        *time = realtimeNanoseconds();
+        *time = now_();
         journal_.timeRequest();
     }
 }

@@ -8,6 +8,7 @@
 #include <vantel_bc/status.h>
 
 #include "Journal.h"
+#include "Moment.h"
 
 namespace vantelhost {
 
@@ -20,10 +21,13 @@ class Callbacks {
 public:
     /// @param refuseWhileStopping answer ZEKEL_HOST_IS_STOPPING once stopping has begun.
     /// @param endsBySignal        whether a signal ends the run: what is told of quality and
-    ///                            metadata then is expected. Called from any thread.
+    ///                            metadata then is expected. Called from any thread, as the next.
+    /// @param now                 answers zekel_getTime: nanoseconds of the clock that pairs have
+    ///                            their local times of
     Callbacks(
         Journal& journal, bool refuseWhileStopping,
-        std::function<bool()> endsBySignal = [] { return false; });
+        std::function<bool()> endsBySignal = [] { return false; },
+        std::function<std::uint64_t()> now = realtimeNanoseconds);
     ~Callbacks();
     Callbacks(const Callbacks&) = delete;
     Callbacks& operator=(const Callbacks&) = delete;
@@ -50,6 +54,7 @@ private:
     Journal& journal_;
     const bool refuseWhileStopping_;
     const std::function<bool()> endsBySignal_;
+    const std::function<std::uint64_t()> now_;
     std::atomic<bool> stopping_{false};
     void* slot_ = nullptr;
 };

@@ -108,13 +108,20 @@ Event qualityEvent(const double* quality, const std::string& reason) {
             {{"quality", kind}, {"values", values}, {"reason", reason}}};
 }
 
-Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset, PairKind kind) {
+Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset, PairKind kind,
+                const std::optional<Carried>& carried) {
     Event event{"pair",
                 fmt::format("reference {} local {} offset {} ns", reference, local, offset),
                 {{"reference", reference}, {"local", local}, {"offset", offset}}};
     if (kind != PairKind::measured) {
         event.text += fmt::format(", left out ({})", leftOutWord(kind));
         event.members["leftOut"] = leftOutWord(kind);
+    }
+    if (carried && carried->isOfOtherClock) {
+        event.text +=
+            fmt::format(", CLOCK_REALTIME {} +- {} ns", carried->realtime, carried->uncertainty);
+        event.members["realtime"] = carried->realtime;
+        event.members["uncertainty"] = carried->uncertainty;
     }
     return event;
 }
@@ -155,6 +162,14 @@ Event failureEvent(const std::string& operation, const std::string& problem) {
 
 Event refusedEvent(const std::string& function) {
     return {"refused", function + ": the host is stopping", Json{{"function", function}}};
+}
+
+Event clockEvent(const std::string& clock, const std::string& problem, std::uint64_t refused) {
+    std::string text = "local times are those of " + clock;
+    text += problem.empty() ? "" : ", not as they should: " + problem;
+    text += refused == 0 ? "" : fmt::format("; {} pairs were not, and are refused", refused);
+    return {
+        "clock", std::move(text), {{"clock", clock}, {"problem", problem}, {"refused", refused}}};
 }
 
 Event chronyEvent(const ChronyCounts& counts, const std::string& problem) {

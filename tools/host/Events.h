@@ -4,8 +4,10 @@
 
 #include <cstdint>
 #include <deque>
+#include <optional>
 #include <string>
 
+#include "Clock/Carried.h"
 #include "Json.h"
 #include "PairKind.h"
 #include "Signals.h"
@@ -28,8 +30,9 @@ Event epochOffsetEvent(std::int64_t nanoseconds);
 Event qualityEvent(const double* quality, const std::string& reason);
 
 /// Times in nanoseconds modulo 2^64. The offset is local - reference.
+/// @param carried the local time in CLOCK_REALTIME, told when it is of another clock
 Event pairEvent(std::uint64_t reference, std::uint64_t local, std::int64_t offset,
-                PairKind kind = PairKind::measured);
+                PairKind kind = PairKind::measured, const std::optional<Carried>& carried = {});
 
 Event metadataEvent(const Json& metadata);
 Event invalidMetadataEvent(const std::string& text);
@@ -44,6 +47,12 @@ Event failureEvent(const std::string& operation, const std::string& problem);
 
 /// A call of the plug-in that is refused because the host is stopping.
 Event refusedEvent(const std::string& function);
+
+/// Whose time the local times of pairs are.
+/// @param clock   its name
+/// @param problem why it is not the one that it should be; empty when it is.
+/// @param refused so many pairs were not of it
+Event clockEvent(const std::string& clock, const std::string& problem, std::uint64_t refused);
 
 /// What became of the time pairs that chronyd might get.
 struct ChronyCounts {

@@ -55,6 +55,10 @@ void Journal::handPairsTo(PairTaker taker) {
     pairTaker_ = std::move(taker);
 }
 
+void Journal::carryPairsBy(LocalCarrier carrier) {
+    carrier_ = std::move(carrier);
+}
+
 void Journal::note(const Event& event) {
     const std::lock_guard lock(mutex_);
     print(event);
@@ -86,28 +90,39 @@ void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     const std::lock_guard lock(mutex_);
     lastCall_ = Moment::Clock::now();
     const Moment moment = Moment::now(begin_);
-    const Event event = judge(reference, local, moment);
-    tally_.offsets.add(event.members["offset"]);
-    pass(event, moment);
+    const std::int64_t offset = difference(local, reference);
+    const PairKind kind = judge(reference, local, moment);
+    const auto carried = carry(kind, local);
+    tally_.offsets.add(offset);
+    pass(pairEvent(reference, local, offset, kind, carried.time), moment);
     tellHealth(moment);
-    if (event.members.contains("leftOut")) {
-        ++tally_.leftOut[event.members["leftOut"]];
-    } else if (pairTaker_) {
-        if (const auto news = pairTaker_(reference, local)) {
+    if (carried.news) {
+        tell({*carried.news}, moment);
+    }
+    if (kind != PairKind::measured) {
+        ++tally_.leftOut[leftOutWord(kind)];
+    } else if (pairTaker_ && carried.time) {
+        if (const auto news = pairTaker_(reference, carried.time->realtime)) {
             tell({*news}, moment);
         }
     }
 }
 
-Event Journal::judge(std::uint64_t reference, std::uint64_t local, const Moment& moment) {
+PairKind Journal::judge(std::uint64_t reference, std::uint64_t local, const Moment& moment) {
     const std::int64_t offset = difference(local, reference);
     const PairKind kind = trust_.pair(local, offset, moment);
-    Event event = pairEvent(reference, local, offset, kind);
     // The pair itself may have made it good.
-    health_.take(event, moment.seconds);
+    health_.take(pairEvent(reference, local, offset, kind), moment.seconds);
     return kind == PairKind::measured && health_.state(moment.seconds) != HealthState::locked
-               ? pairEvent(reference, local, offset, PairKind::unhealthy)
-               : event;
+               ? PairKind::unhealthy
+               : kind;
+}
+
+PairCarrier::Result Journal::carry(PairKind kind, std::uint64_t local) const {
+    if (!carrier_) {
+        return {Carried{local, 0, false}, std::nullopt};
+    }
+    return kind == PairKind::of1970 ? PairCarrier::Result() : carrier_(local);
 }
 
 void Journal::metadata(const std::string& text, bool expected) {

@@ -9,6 +9,7 @@
 #include <utility>
 #include <vector>
 
+#include "Clock/PairCarrier.h"
 #include "Events.h"
 #include "Health.h"
 #include "Moment.h"
@@ -21,9 +22,12 @@ namespace vantelhost {
 /// @return false when it is lost; errno says why.
 using EventSink = std::function<bool(const Event&, const Moment&)>;
 
-/// Takes a time pair, in nanoseconds.
+/// Takes a time pair, in nanoseconds; the local time is of CLOCK_REALTIME.
 /// @return an event, if there is something to tell.
 using PairTaker = std::function<std::optional<Event>(std::uint64_t reference, std::uint64_t local)>;
+
+/// Carries the local time of a pair over to CLOCK_REALTIME: see PairCarrier.
+using LocalCarrier = std::function<PairCarrier::Result(std::uint64_t local)>;
 
 /// Takes one event, and sees itself to what it cannot take.
 /// @return an event, if there is something to tell.
@@ -42,14 +46,18 @@ public:
             Moment::Clock::time_point begin = Moment::Clock::now());
 
     /// One more output, which also gets what has come so far. To be called before other threads use
-    /// the journal, as the next two.
+    /// the journal, as the next three.
     void addOutput(EventTaker output);
 
     /// There will be no more outputs: what has come so far need not be kept.
     void outputsAreComplete();
 
-    /// Who gets besides the time pairs that a clock may follow: those that are not left out.
+    /// Who gets besides the time pairs that a clock may follow: those that are neither left out nor
+    /// refused.
     void handPairsTo(PairTaker taker);
+
+    /// How local times are carried over to CLOCK_REALTIME. Without, they are taken as of that.
+    void carryPairsBy(LocalCarrier carrier);
 
     /// Something without a count.
     void note(const Event& event);
@@ -91,12 +99,14 @@ private:
     void print(const Event& event);
 
     /// What a time pair is, or that the health is not what it should be.
-    /// @return its event.
-    Event judge(std::uint64_t reference, std::uint64_t local, const Moment& moment);
+    PairKind judge(std::uint64_t reference, std::uint64_t local, const Moment& moment);
 
     /// What the time pairs to come are judged by.
     void tellTrust(const Event& event);
     void tellHealth(const Moment& moment);
+
+    /// Pairs of 1970 have no time.
+    PairCarrier::Result carry(PairKind kind, std::uint64_t local) const;
     void pass(const Event& event, const Moment& moment);
     void tell(const std::vector<Event>& news, const Moment& moment);
 
@@ -105,6 +115,7 @@ private:
     std::vector<EventTaker> outputs_;
     std::optional<std::vector<std::pair<Event, Moment>>> early_{std::in_place};
     PairTaker pairTaker_;
+    LocalCarrier carrier_;
     PairTrust trust_;
     HealthWatch health_;
     Moment::Clock::time_point lastCall_ = Moment::Clock::now();

@@ -21,13 +21,17 @@ namespace {
 /// again and again.
 constexpr double pause = 1;
 
-/// Each is valid until the next one, or until the session ends, but for the first one.
-constexpr std::array<std::string_view, 6> lasting{"loaded",  "initialised", "epoch-offset",
-                                                  "quality", "metadata",    "health"};
+/// Each is valid until the next one, or until the session ends, but for those that survive it.
+constexpr std::array<std::string_view, 7> lasting{
+    "loaded", "clock", "initialised", "epoch-offset", "quality", "metadata", "health"};
 
 bool isLasting(const Event& event) {
     const bool isInvalid = event.name == "metadata" && !event.members.value("valid", false);
     return !isInvalid && std::find(lasting.begin(), lasting.end(), event.name) != lasting.end();
+}
+
+bool survives(const std::string& name) {
+    return name == "loaded" || name == "clock" || name == "health";
 }
 
 bool endsWithALine(const std::string& path) {
@@ -132,7 +136,7 @@ void Record::remember(const Event& event) {
         state_.erase(std::remove_if(state_.begin(), state_.end(), isOver), state_.end());
     };
     if (event.name == "restart") {
-        forget([](const auto& each) { return each.first != "loaded" && each.first != "health"; });
+        forget([](const auto& each) { return !survives(each.first); });
     } else if (isLasting(event)) {
         forget([&](const auto& each) { return each.first == event.name; });
         state_.emplace_back(event.name, event.members);

@@ -41,7 +41,10 @@ Run::Run(const RunOptions& options, std::optional<std::string> configText, Signa
       signals_(signals),
       reread_(std::move(reread)),
       journal_(
-          output(), [this](const std::string& reason) { loseOutput(reason); }, begin_) {
+          output(), [this](const std::string& reason) { loseOutput(reason); }, begin_),
+      localTime_(options_.clock, !options_.chronySocket.empty(),
+                 [this](const Event& event) { journal_.error(event); }) {
+    journal_.carryPairsBy([this](std::uint64_t local) { return localTime_.carry(local); });
     if (!options_.recordFile.empty()) {
         record_.emplace(options_.recordFile, options_.recordRules);
     }
@@ -75,7 +78,8 @@ EventSink Run::output() {
 }
 
 std::optional<Event> Run::handToChrony(std::uint64_t reference, std::uint64_t local) {
-    auto news = chrony_->take(reference, local, StampedBy::systemClock);
+    auto news = chrony_->take(
+        reference, local, localTime_.isRealtime() ? StampedBy::systemClock : StampedBy::ptpClock);
     const ChronyCounts& counts = chrony_->clock().counts();
     if (metrics_) {
         metrics_->takeChrony(counts);
@@ -95,6 +99,7 @@ int Run::execute() {
     } else {
         beginOutputs();
     }
+    tell(localTime_.state());
     if (chrony_) {
         journal_.note(chrony_->clock().state());
     }
@@ -166,7 +171,7 @@ std::optional<Json> Run::newSettings(const Schema& schema, const Json& settings)
 void Run::keepSessions(const PlugIn& plugIn, const Schema& schema) {
     std::optional<EpochFifo> fifo;
     const bool terminalIsShared = view_ && ::isatty(STDERR_FILENO) == 1;
-    SessionKeeper keeper({plugIn, options_, journal_, signals_, fifo,
+    SessionKeeper keeper({plugIn, options_, journal_, signals_, localTime_, fifo,
                           terminalIsShared ? -1 : STDERR_FILENO, [this] { turn(); },
                           [&](const Json& inUse) { return newSettings(schema, inUse); }},
                          completedSettings(schema));
@@ -194,6 +199,10 @@ void Run::keepSessions(const PlugIn& plugIn, const Schema& schema) {
 }
 
 void Run::beginOutputs() {
+    journal_.addOutput([this](const Event& event, const Moment& /*moment*/) {
+        localTime_.take(event);
+        return std::nullopt;
+    });
     if (record_) {
         record_->begin();
         journal_.addOutput([this](const Event& event, const Moment& moment) {

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "ChronyFeed.h"
+#include "Clock/LocalTime.h"
 #include "ConfigReload.h"
 #include "Failure.h"
 #include "Journal.h"
@@ -83,6 +84,7 @@ private:
     std::optional<Metrics> metrics_;
     std::atomic<bool> outputIsLost_{false};
     Journal journal_;
+    LocalTime localTime_;
     RunFacts facts_;
     std::uint64_t healedErrors_ = 0;
 };

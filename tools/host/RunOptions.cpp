@@ -120,6 +120,19 @@ void addOutput(CLI::App& command, RunOptions& options) {
         ->type_name("SOCKET");
     command
         .add_option_function<std::string>(
+            "--clock",
+            [&options](const std::string& text) {
+                if (text != "realtime" && text != "auto" && text[0] != '/') {
+                    refuse("--clock", R"("realtime", "auto" or the path of a device)", text);
+                }
+                options.clock = text;
+            },
+            "Whose time the local times of pairs are: \"realtime\"; that of a PTP clock, by its "
+            "device; or \"auto\", the PTP clock of the first interface, if it has one")
+        ->type_name("CLOCK")
+        ->default_str("auto");
+    command
+        .add_option_function<std::string>(
             "--tai-offset",
             [&options](const std::string& text) { options.taiOffset = taiOffset(text); },
             "TAI minus UTC, for chronyd, where the grandmaster keeps TAI and a PTP clock stamps; "

@@ -31,6 +31,7 @@ struct RunOptions : SettingsOptions {
     bool quiet = false;     ///< no lines for pairs and metadata
     std::string recordFile; ///< empty when nothing is recorded
     RecordRules recordRules;
+    std::string clock = "auto";            ///< as LocalTime has it
     std::string chronySocket;              ///< empty when chronyd gets nothing
     std::optional<std::int64_t> taiOffset; ///< seconds; nothing: as the kernel has it
     std::string statusSocket;              ///< empty when nobody may ask

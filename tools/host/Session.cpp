@@ -23,7 +23,7 @@ bool succeeded(Journal& journal, const char* operation, const HostStatus& status
 Session::Session(const PlugIn& plugIn, Journal& journal, const Manner& manner)
     : plugIn_(plugIn),
       journal_(journal),
-      callbacks_(journal, manner.refuseWhileStopping, manner.endsBySignal),
+      callbacks_(journal, manner.refuseWhileStopping, manner.endsBySignal, manner.now),
       words_(manner.passWordsOn) {}
 
 bool Session::initialise(const Json& settings) {

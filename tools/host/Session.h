@@ -1,6 +1,7 @@
 /// @file
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <string>
 
@@ -22,6 +23,7 @@ public:
         bool refuseWhileStopping;           ///< as Callbacks has it
         std::function<bool()> endsBySignal; ///< as Callbacks has it
         int passWordsOn;                    ///< as LastWords has it
+        std::function<std::uint64_t()> now; ///< as Callbacks has it
     };
 
     Session(const PlugIn& plugIn, Journal& journal, const Manner& manner);

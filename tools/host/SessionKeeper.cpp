@@ -99,10 +99,15 @@ SessionKeeper::End SessionKeeper::session() {
         if (restarts_ > 0) {
             prepare();
         }
+        session_.reset();
+        if (const auto news = with_.localTime.choose(settings_)) {
+            with_.journal.note(*news);
+        }
         session_.emplace(with_.plugIn, with_.journal,
                          Session::Manner{with_.options.refuseWhileStopping,
                                          [this] { return with_.signals.stopHasCome(); },
-                                         with_.passWordsOn});
+                                         with_.passWordsOn,
+                                         [this] { return with_.localTime.now(); }});
         if (!session_->initialise(settings_)) {
             return initialiseFailed();
         }

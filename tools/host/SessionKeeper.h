@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 
+#include "Clock/LocalTime.h"
 #include "EpochFifo.h"
 #include "Failure.h"
 #include "Journal.h"
@@ -32,6 +33,7 @@ public:
         const RunOptions& options;
         Journal& journal;
         Signals& signals;
+        LocalTime& localTime;           ///< each session chooses its clock
         std::optional<EpochFifo>& fifo; ///< there when this host writes epoch offsets
         int passWordsOn;                ///< as LastWords has it
         std::function<void()> onTurn;   ///< called several times a second, by the same thread

@@ -148,6 +148,13 @@ private:
         zekel_adjustTime(context_, reference, local, &call.status);
     }
 
+    std::uint64_t hostTime() {
+        CallStatus call;
+        std::uint64_t time = 0;
+        zekel_getTime(context_, &time, &call.status);
+        return time;
+    }
+
     void update(const char* text) {
         CallStatus call;
         zekel_updateMetaData(context_, text, &call.status);
@@ -167,6 +174,12 @@ private:
             pair(2000, 2030);
             pair(0xFFFFFFFFFFFFFFFF, 1);
         }
+        if (does("timely")) {
+            for (std::uint64_t i = 1; i <= 3; ++i) {
+                const std::uint64_t time = hostTime();
+                pair(time - i, time);
+            }
+        }
         if (does("zeros")) {
             for (std::uint64_t i = 0; i < 20; ++i) {
                 pair(i, i);
@@ -176,10 +189,7 @@ private:
             update(metadata);
         }
         if (does("time")) {
-            CallStatus call;
-            std::uint64_t time = 0;
-            zekel_getTime(context_, &time, &call.status);
-            record("time " + std::to_string(time));
+            record("time " + std::to_string(hostTime()));
         }
     }
 

@@ -156,7 +156,7 @@ TEST_F(ToolRecordTest, AFileThatFillsLaterIsToldOnceAndTheRunGoesOn) {
 }
 
 TEST_F(ToolRecordTest, WithoutChronydTheRunFailsAndSaysSoOnceAndAtTheEnd) {
-    const auto result = play("role pairs", {"--chrony", folder.path("none")});
+    const auto result = play("role timely", {"--chrony", folder.path("none")});
     EXPECT_EQ(result.status, 1);
     EXPECT_THAT(result.events("cause").at(0)["text"].get<std::string>(),
                 HasSubstr("No such file or directory; 0 sent, 3 failed"));

@@ -143,7 +143,11 @@ void MetricSink::takePair(const Event& event, const Moment& moment) {
     values_.lastPair = moment.seconds;
     const auto leftOut = members.find("leftOut");
     if (leftOut == members.end() || *leftOut != leftOutWord(PairKind::of1970)) {
-        countPollDelay(members["local"].get<std::uint64_t>(), moment.realtime);
+        const auto carried = members.find("realtime");
+        countPollDelay(carried != members.end()
+                           ? carried->get<std::uint64_t>()
+                           : members["local"].get<std::uint64_t>() - epochOffset_,
+                       moment.realtime);
     }
     if (leftOut != members.end()) {
         countLeftOut(leftOut->get_ref<const std::string&>());
@@ -161,8 +165,7 @@ void MetricSink::countLeftOut(std::string_view word) {
     increase(values_.pairsLeftOut.at(static_cast<std::size_t>(kind - leftOutKinds)));
 }
 
-void MetricSink::countPollDelay(std::uint64_t local, std::uint64_t now) {
-    const std::uint64_t ingress = local - epochOffset_;
+void MetricSink::countPollDelay(std::uint64_t ingress, std::uint64_t now) {
     const auto delay = static_cast<std::int64_t>(now - ingress);
     // Below 0 the ingress time is of another clock than the host's, and it tells nothing.
     if (delay >= 0) {

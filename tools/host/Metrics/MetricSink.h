@@ -31,7 +31,7 @@ private:
     void takeError(const Event& event, const Moment& moment);
 
     void countLeftOut(std::string_view word);
-    void countPollDelay(std::uint64_t local, std::uint64_t now);
+    void countPollDelay(std::uint64_t ingress, std::uint64_t now);
     void takeGrandmaster(const std::string& identity, std::string_view ownIdentity);
 
     MetricValues& values_;

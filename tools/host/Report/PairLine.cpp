@@ -81,6 +81,13 @@ std::optional<PairLine> parsePairLine(std::string_view text) {
         line.leftOut = cutter.takeUntil('"');
         cutter.skip("\"");
     }
+    if (cutter.begins(R"(,"realtime":)")) {
+        std::uint64_t uncertainty = 0;
+        cutter.skip(R"(,"realtime":)");
+        cutter.take(line.realtime.emplace());
+        cutter.skip(R"(,"uncertainty":)");
+        cutter.take(uncertainty);
+    }
     cutter.skip("}");
     if (!cutter.isDone() || !isPlain(seconds)) {
         return std::nullopt;

@@ -125,7 +125,7 @@ void RecordingBuilder::takeOld(const std::string& event, const Json& line, doubl
 
 void RecordingBuilder::takePair(const PairLine& line, double seconds) {
     const auto ingress = line.local - static_cast<std::uint64_t>(recording_.epochOffset);
-    const auto delay = static_cast<std::int64_t>(line.time - ingress);
+    const auto delay = static_cast<std::int64_t>(line.time - line.realtime.value_or(ingress));
     const auto found = filter_.pair(line.local, line.offset);
     const auto kind = judgementOf(line.leftOut).value_or(found);
     const bool onlyZerosBefore = recording_.counts.onlyZeros();

@@ -40,9 +40,13 @@ PairLine pairOf(const Json& line) {
                   line.at("time").get<std::uint64_t>(),
                   line.at("local").get<std::uint64_t>(),
                   line.at("offset").get<std::int64_t>(),
+                  {},
                   {}};
     if (const auto leftOut = line.find("leftOut"); leftOut != line.end()) {
         pair.leftOut = leftOut->get_ref<const std::string&>();
+    }
+    if (const auto realtime = line.find("realtime"); realtime != line.end()) {
+        pair.realtime = realtime->get<std::uint64_t>();
     }
     return pair;
 }
