@@ -133,6 +133,7 @@ HostPackageHoldsAServiceWithItsUserFifoAndConfiguration() {
 usr/lib/systemd/system/vantel-host.service
 usr/lib/sysusers.d/vantel-host.conf
 usr/lib/tmpfiles.d/vantel-host.conf
+usr/lib/udev/rules.d/60-vantel-host.rules
 usr/libexec/vantel-host/ptp4l-software
 usr/share/vantel-host/chrony-socket.conf
 usr/share/vantel-host/software-time-stamps.conf" \
