@@ -101,15 +101,13 @@ Finding checkClockDevice(const Subject& subject, const std::string& interface) {
         return skipped("there is no PTP hardware clock");
     }
     const std::string path = fmt::format("{}/ptp{}", subject.dev, timeStamping.clock);
-    if (!isAllowed(path, R_OK | W_OK)) {
+    if (!isAllowed(path, R_OK)) {
         const int error = errno;
-        return doubtful(fmt::format("{}: {}; ptp4l does not open it here, a host that steers the "
-                                    "clock does",
+        return doubtful(fmt::format("{}: {}; ptp4l does not open it here, but the host reads the "
+                                    "time of its pairs there",
                                     path, errorText(error)),
-                        error == ENOENT ? "for such a host let udev make it, or pass it into the "
-                                          "container"
-                                        : "for such a host give its user the right to read and "
-                                          "write it");
+                        error == ENOENT ? "let udev make it, or pass it into the container"
+                                        : "give the host's user the right to read it");
     }
     return good(path);
 }

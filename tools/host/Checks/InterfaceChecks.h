@@ -16,7 +16,7 @@ Finding checkInterface(const Subject& subject, const std::string& interface);
 /// those in software may do.
 Finding checkTimeStamping(const Subject& subject, const std::string& interface);
 
-/// Its clock's device may be opened, as by a host that steers the clock; else a warning.
+/// Its clock's device may be read, as by "run" with the option --clock auto; else a warning.
 Finding checkClockDevice(const Subject& subject, const std::string& interface);
 
 /// All interfaces have one clock.
