@@ -92,6 +92,16 @@ TEST_F(CallbacksTest, TheTimeIsTheRealtimeClockInNanoseconds) {
     EXPECT_LE(time, now());
 }
 
+TEST_F(CallbacksTest, TheTimeIsThatOfAnotherClockWhereOneIsGiven) {
+    Callbacks callbacks(
+        journal, false, [] { return false; }, [] { return std::uint64_t{12345}; });
+    HostStatus status;
+    std::uint64_t time = 0;
+    zekel_getTime(callbacks.slot(), &time, status.get());
+    EXPECT_EQ(time, 12345U);
+    EXPECT_EQ(journal.tally().timeRequests, 1U);
+}
+
 TEST_F(CallbacksTest, AnotherContextIsRefusedAndCounted) {
     Callbacks callbacks(journal, false);
     void* elsewhere = nullptr;

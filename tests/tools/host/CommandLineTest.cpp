@@ -104,6 +104,13 @@ TEST(CommandLine, AllOptionsOfRun) {
                 options.refuseWhileStopping && options.force);
 }
 
+TEST(CommandLine, TheClockIsAutoRealtimeOrADevice) {
+    EXPECT_EQ(run({}).clock, "auto");
+    for (const char* clock : {"auto", "realtime", "/dev/ptp1"}) {
+        EXPECT_EQ(run({"--clock", clock}).clock, clock);
+    }
+}
+
 TEST(CommandLine, OffsetsMayBeNegativeAndUseTheFifo) {
     EXPECT_EQ(run({"--epoch-offset", "-5"}).epochOffset, -5);
     EXPECT_EQ(run({"--epoch-offset=-6"}).epochOffset, -6);
@@ -184,6 +191,10 @@ TEST(CommandLine, MistakesGiveTheStatusOfUsageErrors) {
              {"run", "--json", "--quiet"},
              {"run", "--record"},
              {"run", "--chrony"},
+             {"run", "--clock"},
+             {"run", "--clock", ""},
+             {"run", "--clock", "monotonic"},
+             {"run", "--clock", "ptp0"},
          }) {
         EXPECT_EQ(read(words), 2) << testing::PrintToString(words);
         EXPECT_FALSE(accepted.has_value());

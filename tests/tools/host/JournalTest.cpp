@@ -58,6 +58,46 @@ TEST_F(JournalTest, TheOffsetIsTheModuloDifferenceWithItsSign) {
     EXPECT_EQ(journal.tally().offsets.count, 4U);
 }
 
+TEST_F(JournalTest, PairsAreHandedOnWithTheirTimeInTheSystemsClock) {
+    std::vector<std::uint64_t> handed;
+    journal.handPairsTo([&](std::uint64_t reference, std::uint64_t local) {
+        handed.insert(handed.end(), {reference, local});
+        return std::nullopt;
+    });
+    journal.pair(100, 90);
+    journal.carryPairsBy([](std::uint64_t local) {
+        return PairCarrier::Result{Carried{local + 1000, 7, true}, std::nullopt};
+    });
+    journal.pair(300, 250);
+    EXPECT_EQ(handed, (std::vector<std::uint64_t>{100, 90, 300, 1250}));
+    const auto shown = events();
+    EXPECT_FALSE(shown.front().contains("realtime"));
+    EXPECT_EQ(shown.back()["local"], 250);
+    EXPECT_EQ(shown.back()["realtime"], 1250);
+    EXPECT_EQ(shown.back()["uncertainty"], 7);
+}
+
+TEST_F(JournalTest, APairThatIsRefusedIsShownAndCountedButNotHandedOn) {
+    int handed = 0;
+    int asked = 0;
+    journal.handPairsTo([&](std::uint64_t, std::uint64_t) {
+        ++handed;
+        return std::nullopt;
+    });
+    journal.carryPairsBy([&](std::uint64_t) {
+        return PairCarrier::Result{
+            std::nullopt, asked++ == 0 ? std::optional(failureEvent("clock", "no")) : std::nullopt};
+    });
+    journal.pair(100, 90);
+    journal.pair(300, 250);
+    journal.pair(10, 0); // of 1970: of no clock
+    EXPECT_EQ(handed, 0);
+    EXPECT_EQ(asked, 2);
+    EXPECT_EQ(journal.tally().errors, 1U);
+    EXPECT_EQ(journal.tally().offsets.count, 3U);
+    EXPECT_EQ(events().front()["event"], "pair");
+}
+
 TEST_F(JournalTest, ARepeatedQualityIsShownButIsNoChange) {
     constexpr std::array usable{2.5e-08, 1e-06, -1.0};
     journal.quality(usable.data(), "a");

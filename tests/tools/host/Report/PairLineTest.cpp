@@ -34,6 +34,18 @@ TEST(PairLine, MayHaveTheHostsJudgement) {
     EXPECT_FALSE(judgementOf("new"));
 }
 
+TEST(PairLine, MayHaveItsTimeInTheSystemsClock) {
+    const Carried carried{1795261583276518056, 150, true};
+    for (const auto kind : {PairKind::measured, PairKind::falseOffset}) {
+        const auto line = parsePairLine(jsonLine(pairEvent(1, 5, -6, kind, carried), {0.5, 7}));
+        ASSERT_TRUE(line);
+        EXPECT_EQ(line->realtime, 1795261583276518056U);
+        EXPECT_EQ(line->leftOut, kind == PairKind::measured ? "" : "no-delay");
+    }
+    const auto plain = parsePairLine(jsonLine(pairEvent(1, 5, -6), {0.5, 7}));
+    EXPECT_FALSE(plain->realtime);
+}
+
 TEST(PairLine, AnythingElseIsLeftToTheReaderOfJson) {
     const std::string good =
         R"({"event":"pair","t":10.5,"time":7,"reference":1,"local":5,"offset":-6})";
@@ -51,6 +63,7 @@ TEST(PairLine, AnythingElseIsLeftToTheReaderOfJson) {
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":5,"offset":-6} )",
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":5,"offset":-6,"new":1})",
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":5,"offset":-6,"leftOut":"1970})",
+            R"({"event":"pair","t":1,"time":7,"reference":1,"local":5,"offset":-6,"realtime":1})",
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":-5,"offset":-6})",
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":5,"offset":9223372036854775808})",
             R"({"event":"pair","t":1,"time":7,"reference":1,"local":18446744073709551616,"offset":0})",
