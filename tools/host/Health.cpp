@@ -93,9 +93,7 @@ Health healthOf(const HealthFacts& facts, double now) {
 }
 
 void HealthWatch::take(const Event& event, double seconds) {
-    if (event.name == "pair") {
-        takePair(event.members, seconds);
-    } else if (event.name == "quality") {
+    if (event.name == "quality") {
         takeQuality(event.members, seconds);
     } else if (event.name == "initialised") {
         facts_ = {};
@@ -126,10 +124,8 @@ void HealthWatch::takeQuality(const Json& members, double seconds) {
     }
 }
 
-void HealthWatch::takePair(const Json& members, double seconds) {
-    const auto leftOut = members.find("leftOut");
-    const bool isLeftOut = leftOut != members.end();
-    if (isLeftOut && *leftOut == leftOutWord(PairKind::of1970)) {
+void HealthWatch::pair(PairKind kind, double seconds) {
+    if (kind == PairKind::of1970) {
         return;
     }
     if (facts_.pairs > 0) {
@@ -138,7 +134,7 @@ void HealthWatch::takePair(const Json& members, double seconds) {
     ++facts_.pairs;
     facts_.pairTime = seconds;
     // What is left out for another reason is a measurement that came.
-    facts_.pairIsMeasured = !isLeftOut || *leftOut != leftOutWord(PairKind::falseOffset);
+    facts_.pairIsMeasured = kind != PairKind::falseOffset;
 }
 
 /// The median: an outage does not count, nor a pair that was told late.

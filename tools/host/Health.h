@@ -63,8 +63,12 @@ struct Standing {
 /// Gathers the facts of a run from its events. Knows nothing of threads.
 class HealthWatch {
 public:
-    /// @param seconds when it happened, never before the last event
+    /// Any event but a time pair.
+    /// @param seconds when it happened, never before the last one
     void take(const Event& event, double seconds);
+
+    /// A time pair. As above.
+    void pair(PairKind kind, double seconds);
 
     /// Whether the state is another than at the last call: then it has changed now.
     /// @return the event that tells so.
@@ -78,7 +82,6 @@ public:
 
 private:
     void takeQuality(const Json& members, double seconds);
-    void takePair(const Json& members, double seconds);
     void learn(double gap);
 
     HealthFacts facts_;

@@ -91,7 +91,7 @@ void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     lastCall_ = Moment::Clock::now();
     const Moment moment = Moment::now(begin_);
     const std::int64_t offset = difference(local, reference);
-    const PairKind kind = judge(reference, local, moment);
+    const PairKind kind = judge(local, offset, moment);
     const auto carried = carry(kind, local);
     tally_.offsets.add(offset);
     pass(pairEvent(reference, local, offset, kind, carried.time), moment);
@@ -108,11 +108,10 @@ void Journal::pair(std::uint64_t reference, std::uint64_t local) {
     }
 }
 
-PairKind Journal::judge(std::uint64_t reference, std::uint64_t local, const Moment& moment) {
-    const std::int64_t offset = difference(local, reference);
+PairKind Journal::judge(std::uint64_t local, std::int64_t offset, const Moment& moment) {
     const PairKind kind = trust_.pair(local, offset, moment);
     // The pair itself may have made it good.
-    health_.take(pairEvent(reference, local, offset, kind), moment.seconds);
+    health_.pair(kind, moment.seconds);
     return kind == PairKind::measured && health_.state(moment.seconds) != HealthState::locked
                ? PairKind::unhealthy
                : kind;

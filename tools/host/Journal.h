@@ -99,7 +99,7 @@ private:
     void print(const Event& event);
 
     /// What a time pair is, or that the health is not what it should be.
-    PairKind judge(std::uint64_t reference, std::uint64_t local, const Moment& moment);
+    PairKind judge(std::uint64_t local, std::int64_t offset, const Moment& moment);
 
     /// What the time pairs to come are judged by.
     void tellTrust(const Event& event);

@@ -22,20 +22,17 @@ Event initialisedWith(int logAnnounceInterval = 1) {
     return {"initialised", "", {{"configuration", {{"logAnnounceInterval", logAnnounceInterval}}}}};
 }
 
-Event aPair(PairKind kind = PairKind::measured) {
-    return pairEvent(1000, 1250, 250, kind);
-}
-
 /// A session that was initialised at second 100.
 class HealthTest : public testing::Test {
 protected:
     void SetUp() override { watch.take(initialisedWith(), 100); }
 
     void take(const Event& event, double seconds) { watch.take(event, seconds); }
+    void take(PairKind pair, double seconds) { watch.pair(pair, seconds); }
 
     void takePairs(double begin, double end, double interval) {
         for (double time = begin; time <= end; time += interval) {
-            watch.take(aPair(), time);
+            take(PairKind::measured, time);
         }
     }
 
@@ -155,15 +152,15 @@ TEST_F(HealthTest, AGoodStartIsTold) {
     take(qualityEvent(unusableQuality, waiting), 100.1);
     EXPECT_EQ(at(101), "starting");
     take(qualityEvent(usableQuality, role), 105);
-    take(aPair(PairKind::falseOffset), 105.1);
+    take(PairKind::falseOffset, 105.1);
     EXPECT_EQ(at(105.1), "unmeasured");
-    take(aPair(), 105.2);
+    take(PairKind::measured, 105.2);
     EXPECT_EQ(at(105.2), "locked");
 }
 
 TEST_F(HealthTest, AChangeIsAnEventWithTheTimeSpentBefore) {
     take(qualityEvent(usableQuality, role), 105);
-    take(aPair(), 105.1);
+    take(PairKind::measured, 105.1);
     const auto first = watch.change(105.1);
     ASSERT_TRUE(first);
     EXPECT_EQ(first->name, "health");
@@ -198,9 +195,19 @@ TEST_F(HealthTest, AnOutageIsNotLearnt) {
 
 TEST_F(HealthTest, ThePairOf1970IsNone) {
     take(qualityEvent(usableQuality, role), 105);
-    take(aPair(PairKind::of1970), 106);
+    take(PairKind::of1970, 106);
     EXPECT_EQ(at(106), "starting");
     EXPECT_EQ(at(108.1), "stale");
+}
+
+TEST_F(HealthTest, OnlyPairsWithoutADelayMeasureNothing) {
+    take(qualityEvent(usableQuality, role), 105);
+    for (const PairKind kind : {PairKind::afterReturn, PairKind::repeated, PairKind::jump}) {
+        take(kind, 105.1);
+        EXPECT_EQ(at(105.1), "locked");
+    }
+    take(PairKind::falseOffset, 105.2);
+    EXPECT_EQ(at(105.2), "unmeasured");
 }
 
 TEST_F(HealthTest, ARepeatedUsableQualityBeginsNothingAnew) {
@@ -214,14 +221,14 @@ TEST_F(HealthTest, EveryFailedPollAsksForNewPairs) {
     takePairs(106, 110, 0.125);
     take(qualityEvent(unusableQuality, noAnswer), 112);
     EXPECT_EQ(at(112), "lost");
-    take(aPair(), 112.5);
+    take(PairKind::measured, 112.5);
     EXPECT_EQ(at(112.5), "recovered");
     take(qualityEvent(unusableQuality, noAnswer), 112.6);
     EXPECT_EQ(at(112.6), "lost");
-    take(aPair(), 112.9);
+    take(PairKind::measured, 112.9);
     EXPECT_EQ(at(112.9), "recovered");
     take(qualityEvent(usableQuality, role), 113);
-    take(aPair(), 113.1);
+    take(PairKind::measured, 113.1);
     EXPECT_EQ(at(113.1), "locked");
 }
 
@@ -251,7 +258,7 @@ TEST_F(HealthTest, PatienceGrowsWithTheAnnounceInterval) {
 
 TEST_F(HealthTest, WhatIsExpectedOfAStopChangesNothing) {
     take(qualityEvent(usableQuality, role), 105);
-    take(aPair(), 105.1);
+    take(PairKind::measured, 105.1);
     take(expectedEvent(qualityEvent(otherQuality, daemonDied)), 105.2);
     EXPECT_EQ(at(105.2), "locked");
     take(stoppingEvent("SIGINT"), 105.3);
