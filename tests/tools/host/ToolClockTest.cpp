@@ -5,7 +5,9 @@
 #include <cstdlib>
 #include <sstream>
 
+#include "ListeningChronyd.h"
 #include "Moment.h"
+#include "TaiOffset.h"
 #include "Tool.h"
 #include "support/PtpDevice.h"
 #include "support/SimulatedRun.h"
@@ -23,7 +25,26 @@ class ToolClockTest : public ToolTest {
 protected:
     ToolClockTest() { writePtpDevice(device, {nicAhead, PtpDevice::Best::extended, 0}); }
 
+    /// Runs with a grandmaster that keeps TAI until so many pairs have come.
+    /// @return the exit status.
+    int runOnTai(int pairs, const std::string& taiOffset) {
+        SimulatedRun run(folder.path("run"), "clock-offset 37\noffset 250\njitter 50\n",
+                         {"--clock", device, "--chrony", socket, "--tai-offset", taiOffset});
+        Child& host = run.host();
+        for (int i = 1; i <= pairs; ++i) {
+            EXPECT_TRUE(host.waitForOutput("\"event\":\"pair\"", i)) << host.errors();
+            chronyd.read();
+        }
+        host.signal(SIGTERM);
+        const int status = host.wait();
+        result = {status, host.output(), host.errors()};
+        return status;
+    }
+
     const std::string device = folder.path("ptp0");
+    const std::string socket = folder.path("chrony.sock");
+    ListeningChronyd chronyd{socket};
+    Result result{};
 };
 
 /// The pairs in whole lines of an output.
@@ -124,6 +145,28 @@ TEST_F(ToolClockTest, AClockThatIsNoneIsABadOption) {
         EXPECT_THAT(result.errors, HasSubstr(name));
         EXPECT_TRUE(record().empty());
     }
+}
+
+TEST_F(ToolClockTest, OfAGrandmasterThatKeepsTaiChronydGetsUtc) {
+    EXPECT_EQ(runOnTai(12, "37"), 0) << result.output;
+    const auto offsets = chronyd.takeOffsets();
+    EXPECT_GE(offsets.size(), 5U);
+    EXPECT_THAT(offsets, testing::Each(testing::DoubleNear(0, 1e-4)));
+    EXPECT_EQ(result.events("chrony").back()["sent"], offsets.size());
+}
+
+TEST_F(ToolClockTest, ChronydGetsNothingOfATimescaleThatIsNotKnown) {
+    if (vantelhost::kernelTaiOffset() != 0) {
+        GTEST_SKIP() << "SKIPPED: the kernel knows TAI minus UTC";
+    }
+    EXPECT_EQ(runOnTai(12, "kernel"), 1);
+    EXPECT_TRUE(chronyd.takeOffsets().empty());
+    ASSERT_EQ(result.events("error").size(), 1U);
+    EXPECT_EQ(result.events("error")[0]["operation"], "chronyd");
+    EXPECT_THAT(result.events("error")[0]["problem"].get<std::string>(),
+                HasSubstr("37.000 s ahead of this machine's, and the kernel does not know TAI "
+                          "minus UTC: set the clock, or say --tai-offset 37"));
+    EXPECT_GE(result.events("chrony").back()["withheld"], 5);
 }
 
 // Syncs come in the middle between polls that are 125 ms apart: pairs that are early show that the
