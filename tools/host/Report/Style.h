@@ -47,6 +47,7 @@ th { color: var(--faint); font-weight: 600; }
   gap: .1rem 1.4rem; font-size: .9rem; }
 .legend span { display: inline-block; width: .9em; height: .9em; margin-right: .5em;
   print-color-adjust: exact; -webkit-print-color-adjust: exact; }
+.legend [style="background:#2b6cb0"] { background: var(--data) !important; }
 @media print {
   :root { color-scheme: light; --ink: #000; --paper: #fff; --faint: #444; --line: #bbb; }
   body { max-width: none; margin: 0; font-size: 11px; }
