@@ -111,6 +111,19 @@ TEST(CommandLine, TheClockIsAutoRealtimeOrADevice) {
     }
 }
 
+TEST(CommandLine, TheTaiOffsetIsTheKernelsOrSeconds) {
+    EXPECT_EQ(run({}).taiOffset, std::nullopt);
+    EXPECT_EQ(run({"--tai-offset", "kernel"}).taiOffset, std::nullopt);
+    EXPECT_EQ(run({"--tai-offset", "37"}).taiOffset, 37);
+    EXPECT_EQ(run({"--tai-offset", "0"}).taiOffset, 0);
+    EXPECT_EQ(run({"--tai-offset", "1000"}).taiOffset, 1000);
+    for (const char* const wrong : {"-1", "1001", "37.5", "37s", "Kernel", ""}) {
+        EXPECT_EQ(read({"run", "--tai-offset", wrong}), 2) << wrong;
+    }
+    EXPECT_NE(errors.find("must be kernel, or an integer of seconds from 0 to 1000"),
+              std::string::npos);
+}
+
 TEST(CommandLine, OffsetsMayBeNegativeAndUseTheFifo) {
     EXPECT_EQ(run({"--epoch-offset", "-5"}).epochOffset, -5);
     EXPECT_EQ(run({"--epoch-offset=-6"}).epochOffset, -6);
