@@ -28,9 +28,9 @@ namespace zekelVantel {
 /// Whether an object says how many octets it has only when it is read: it has a member of that
 /// name.
 template <typename Fields, typename = void>
-constexpr bool isVariable = false;
+inline constexpr bool isVariable = false;
 template <typename Fields>
-constexpr bool isVariable<Fields, std::void_t<decltype(Fields::isVariable)>> = true;
+inline constexpr bool isVariable<Fields, std::void_t<decltype(Fields::isVariable)>> = true;
 
 template <typename Integer>
 Integer swappedIfLittleEndian(Integer octets) {

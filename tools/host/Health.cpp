@@ -86,6 +86,10 @@ const char* nameOf(HealthState state) {
     return names[static_cast<std::size_t>(state)];
 }
 
+bool isGood(HealthState state) {
+    return state == HealthState::locked || state == HealthState::recovered;
+}
+
 Health healthOf(const HealthFacts& facts, double now) {
     const auto& row = *std::find_if(std::begin(rows), std::end(rows),
                                     [&](const auto& each) { return each.holds(facts, now); });

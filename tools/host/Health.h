@@ -29,6 +29,10 @@ constexpr HealthState allHealthStates[] = {
 /// Its word.
 const char* nameOf(HealthState state);
 
+/// Whether a clock may follow the pairs that come. Also when it has recovered: ptp4l answers again,
+/// and a clock that waited for the next change of role might wait for months.
+bool isGood(HealthState state);
+
 struct Health {
     HealthState state;
     std::string reason; ///< for people

@@ -112,7 +112,7 @@ PairKind Journal::judge(std::uint64_t local, std::int64_t offset, const Moment& 
     const PairKind kind = trust_.pair(local, offset, moment);
     // The pair itself may have made it good.
     health_.pair(kind, moment.seconds);
-    return kind == PairKind::measured && health_.state(moment.seconds) != HealthState::locked
+    return kind == PairKind::measured && !isGood(health_.state(moment.seconds))
                ? PairKind::unhealthy
                : kind;
 }

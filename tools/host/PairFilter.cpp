@@ -2,6 +2,8 @@
 
 #include <fmt/format.h>
 
+#include "QualityReasons.h"
+
 namespace vantelhost {
 
 std::string noDelayText(std::int64_t offset, std::uint64_t count) {
@@ -16,7 +18,7 @@ void PairFilter::epochOffset(std::int64_t nanoseconds) {
 
 bool PairFilter::quality(std::string_view quality, std::string_view reason) {
     // The only reason that tells of a grandmaster; others come and go while it stays.
-    if (reason != "PTP role has changed.") {
+    if (reason != roleHasChanged) {
         return false;
     }
     hasGrandmaster_ = quality == "usable";

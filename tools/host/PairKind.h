@@ -19,7 +19,7 @@ enum class PairKind {
     afterReturn, ///< one of the first behind those when a grandmaster has come back
     repeated,    ///< one more of many with exactly the same offset: nothing is measured any more
     jump,        ///< the offset has jumped, or the clock was stepped, and no pair confirms it yet
-    unhealthy    ///< a measurement, but the health was not "locked"
+    unhealthy    ///< a measurement, but the health was not good
 };
 
 constexpr PairKind leftOutKinds[] = {PairKind::of1970,      PairKind::falseOffset,

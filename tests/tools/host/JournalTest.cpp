@@ -292,12 +292,15 @@ TEST_F(JournalTest, OnlyPairsThatAClockMayFollowAreHandedOn) {
     journal.quality(unusable.data(), "Unable to communicate with PTP sub process while "
                                      "attempting to retrieve time data");
     journal.pair(500, 503);
+    journal.pair(600, 602); // the health has recovered
+    journal.quality(unusable.data(), "PTP role has changed.");
+    journal.pair(700, 703);
     std::vector<std::string> leftOut;
     for (const auto& pair : pairs()) {
         leftOut.push_back(pair.value("leftOut", ""));
     }
-    EXPECT_THAT(leftOut, testing::ElementsAre("no-delay", "", "jump", "health"));
-    EXPECT_THAT(handedOn, testing::ElementsAre(302));
+    EXPECT_THAT(leftOut, testing::ElementsAre("no-delay", "", "jump", "", "", "health"));
+    EXPECT_THAT(handedOn, testing::ElementsAre(302, 503, 602));
     EXPECT_THAT(journal.tally().leftOut,
                 testing::ElementsAre(testing::Pair("health", 1), testing::Pair("jump", 1),
                                      testing::Pair("no-delay", 1)));
