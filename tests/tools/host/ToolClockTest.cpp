@@ -7,6 +7,7 @@
 
 #include "ListeningChronyd.h"
 #include "Moment.h"
+#include "SockSample.h"
 #include "TaiOffset.h"
 #include "Tool.h"
 #include "support/PtpDevice.h"
@@ -117,6 +118,25 @@ TEST_F(ToolClockTest, PairsTellTheirTimeInTheSystemsClockAndHowCertainThatIs) {
         EXPECT_LE(std::abs(wrong), pair["uncertainty"].get<std::int64_t>());
         EXPECT_GE(pair["uncertainty"], 150);
     }
+}
+
+TEST_F(ToolClockTest, ChronydGetsTheSystemsTimeAndTheReferenceOnUtc) {
+    const auto result =
+        play("role timely", {"--clock", device, "--tai-offset", "37", "--chrony", socket});
+    EXPECT_EQ(result.status, 0) << result.output;
+    const auto pairs = result.events("pair");
+    ASSERT_EQ(pairs.size(), 3U);
+    for (const auto& pair : pairs) {
+        const auto realtime = pair["realtime"].get<std::uint64_t>();
+        const auto utc = pair["reference"].get<std::uint64_t>() - nicAhead;
+        EXPECT_EQ(chronyd.receive(), vantelhost::sockSample(utc, realtime));
+    }
+}
+
+TEST_F(ToolClockTest, PairsOfAnotherClockAreNotChronyds) {
+    const auto result = play("role pairs", {"--clock", device, "--chrony", socket});
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(chronyd.receive(), "");
 }
 
 TEST_F(ToolClockTest, OnRealtimePairsTellNoOtherTime) {

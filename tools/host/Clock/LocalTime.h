@@ -28,8 +28,8 @@ class LocalTime {
 public:
     /// @param option  "realtime", the path of a PTP clock's device, or "auto": the PTP clock of the
     ///                first interface, CLOCK_REALTIME where that has none
-    /// @param always  carry pairs over also where "auto" is CLOCK_REALTIME, and nothing is to be
-    ///                carried but what is wrong may be seen
+    /// @param always  judge and carry pairs over also where "auto" is CLOCK_REALTIME: somebody
+    ///                takes them
     /// @param onError told once, by any thread, when the clock cannot be read
     /// Throws UsageError when the device is no clock that can be read.
     LocalTime(std::string option, bool always, std::function<void(const Event&)> onError,
