@@ -6,7 +6,6 @@
 #include <functional>
 
 #include <fmt/format.h>
-#include <fmt/ranges.h>
 
 #include "Tool.h"
 #include "support/Child.h"
@@ -197,45 +196,4 @@ TEST_F(ToolReportFiguresTest, ThePageShowsVerdictsAndMasks) {
     EXPECT_THAT(without, AllOf(HasSubstr("<h2>MTIE</h2>"), HasSubstr("<h2>TDEV</h2>"),
                                Not(HasSubstr("Limits of")), Not(HasSubstr("d9480f")),
                                Not(HasSubstr("stroke='rgb(217,  72,  15)'"))));
-}
-
-TEST_F(ToolReportFiguresTest, AllantoolsFindsTheSame) {
-    if (Child({"/bin/sh", "-c", "python3 -c 'import allantools'"}).wait() != 0) {
-        GTEST_SKIP() << "SKIPPED: python3 has no allantools, which no release of Debian has";
-    }
-    std::uint64_t number = 1234567890;
-    std::vector<std::int64_t> offsets;
-    std::int64_t walk = 0;
-    record(3000, [&](std::uint64_t) {
-        number = number * 16807 % 2147483647;
-        walk += static_cast<std::int64_t>(number % 21) - 10;
-        offsets.push_back(walk + static_cast<std::int64_t>(number % 101));
-        return offsets.back();
-    });
-    const auto error = json({}).at("timeError");
-    // In nanoseconds and intervals.
-    Child python({"/bin/sh", "-c",
-                  fmt::format("exec python3 -c 'import allantools, json\n"
-                              "x = {}\n"
-                              "def values(measure, count):\n"
-                              "    taus = [2**i for i in range(count)]\n"
-                              "    found = measure(x, rate=1, data_type=\"phase\", taus=taus)\n"
-                              "    return list(map(float, found[1]))\n"
-                              "print(json.dumps(dict(mtie=values(allantools.mtie, 11),\n"
-                              "    tdev=values(allantools.tdev, 9),\n"
-                              "    adev=values(allantools.oadev, 10))))'",
-                              offsets)});
-    ASSERT_EQ(python.wait(std::chrono::minutes(2)), 0) << python.errors();
-    const auto theirs = Json::parse(python.output());
-    const auto compare = [&](const char* name, const char* member, double unit) {
-        ASSERT_GE(theirs.at(name).size(), 9U) << name;
-        for (std::size_t octave = 0; octave < theirs.at(name).size(); ++octave) {
-            const auto expected = theirs[name][octave].get<double>() * unit;
-            EXPECT_NEAR(error.at(name).at(octave).at(member).get<double>() / expected, 1, 1e-9)
-                << name << " " << octave;
-        }
-    };
-    compare("mtie", "mtie_ns", 1);
-    compare("tdev", "tdev_ns", 1);
-    compare("adev", "adev", 1e-9 / 0.125);
 }
