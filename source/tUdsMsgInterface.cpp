@@ -13,10 +13,9 @@ namespace {
 constexpr std::uint32_t sendTimeoutMs = 2000;
 
 timeval toTimeval(std::uint32_t milliseconds) {
-    const std::uint64_t microseconds = std::uint64_t{milliseconds} * 1000;
     timeval time{};
-    time.tv_sec = static_cast<decltype(time.tv_sec)>(microseconds / 1000000);
-    time.tv_usec = static_cast<decltype(time.tv_usec)>(microseconds % 1000000);
+    time.tv_sec = static_cast<decltype(time.tv_sec)>(milliseconds / 1000);
+    time.tv_usec = static_cast<decltype(time.tv_usec)>(milliseconds % 1000 * 1000);
     return time;
 }
 
@@ -72,7 +71,7 @@ void tUdsMsgInterface::send(const tMsgBuffer& buffer, const iMsgAddress& remoteA
     if (zeerr::isError(status)) {
         return;
     }
-    if (!isOpen()) {
+    if (!socket_.isOpen()) {
         zeerr::setError(status, zeerr::site::sendWhileClosed);
         return;
     }
@@ -98,7 +97,7 @@ void tUdsMsgInterface::receiveFrom(sockaddr* source, socklen_t* sourceLength, tM
     if (zeerr::isError(status)) {
         return;
     }
-    if (!isOpen()) {
+    if (!socket_.isOpen()) {
         zeerr::setError(status, zeerr::site::receiveWhileClosed);
         return;
     }
