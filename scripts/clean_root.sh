@@ -24,6 +24,16 @@ run_booted() { # root, command...
     exec env -i PATH="$PATH" HOME=/root LC_ALL=C.UTF-8 "$@"' booted "$@" </dev/null
 }
 
+# Runs a command where nothing is mounted in a root, as mmdebstrap has it while hooks run.
+without_mounts() { # root, command...
+  # The words of the inner shell are its own.
+  # shellcheck disable=SC2016
+  unshare --mount bash -ec '
+    grep -o " $1/[^ ]*" /proc/self/mounts | sort -r | xargs -r umount -l
+    shift
+    exec "$@"' without_mounts "$@"
+}
+
 # Makes a root, in which the hooks among the options do the work, and removes it. Where none can be made, it
 # ends the script with status 77, after a line that says why: hooks print "the root is there" first.
 in_clean_root() { # release, log, options of mmdebstrap and further mirrors...

@@ -3,6 +3,8 @@
 # usage: tests/service/boot.sh ROOT PACKAGE.deb...
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
+# shellcheck source=scripts/clean_root.sh
+. "$here/../../scripts/clean_root.sh"
 root=$1
 shift
 place=$root/service_test
@@ -21,7 +23,7 @@ make_upgrade() { # package, folder
 prepare() { # package...
   mkdir -p "$place/upgrade"
   rm -f "$root/usr/sbin/policy-rc.d"
-  cp "$@" "$here"/{booted_test,scene}.sh "$place"
+  cp "$@" "$here"/{booted_test,scene}.sh "$here/../../scripts/documents.sh" "$place"
   cp -r "$here/system" "$root/etc/systemd"
   make_upgrade "$place"/vantel-host_*.deb "$place/upgrade"
   chroot "$root" sh -ec 'cd /service_test
@@ -31,13 +33,9 @@ prepare() { # package...
 
 # Its status is that of the test, which ends it. What mmdebstrap has mounted in the root would stay read-only.
 boot() {
-  # The words of the inner shell are its own.
-  # shellcheck disable=SC2016
-  timeout --kill-after=10 400 unshare --mount bash -ec '
-    grep -o " $1/[^ ]*" /proc/self/mounts | sort -r | xargs -r umount -l
-    exec systemd-nspawn --quiet --boot --directory="$1" --private-network --machine="vantel-$$" --register=no \
-      --keep-unit --console=pipe --link-journal=no --resolv-conf=off \
-      --timezone=off' boot "$root" </dev/null
+  without_mounts "$root" timeout --kill-after=10 400 systemd-nspawn --quiet --boot --directory="$root" \
+    --private-network --machine="vantel-$$" --register=no --keep-unit --console=pipe --link-journal=no \
+    --resolv-conf=off --timezone=off </dev/null
 }
 
 echo "service_test: the root is there"

@@ -3,6 +3,8 @@
 # service_test.service, in a container that it ends with its status.
 set -euo pipefail
 cd /service_test
+# shellcheck source=scripts/documents.sh
+. ./documents.sh
 unit=vantel-host.service
 configuration=/etc/vantel-host/vantel-host.toml
 
@@ -57,11 +59,6 @@ set_priority() { # value
 }
 
 # --- before the first boot's end
-
-# One in a line.
-commands_of() { # document
-  awk '/^```/ { inside = !inside; shown = inside && $0 == "```"; next } shown' "$1"
-}
 
 # The first ten of the document.
 TenCommandsGiveALockedClock() {
