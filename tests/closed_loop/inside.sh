@@ -104,7 +104,7 @@ phase() { # way, name, seconds
 }
 
 count_observations() { grep -c " $outside " "$observations"; }
-more_observations() { (($(count_observations) >= $1)); }
+are_observations() { (($(count_observations) >= $1)); }
 
 # At its own frequency, and 50 ms ahead.
 displace_clock() { # way
@@ -112,9 +112,10 @@ displace_clock() { # way
   rm -f /var/lib/chrony/*
   phc_ctl -qQ CLOCK_REALTIME freq 0
   phase "$1" free "$free"
-  await 10 more_observations $(($(count_observations) + 4))
+  await 10 are_observations $(($(count_observations) + 4))
   behind=$(tail -n 4 "$observations" | awk '{ sum += $12 } END { printf "%.6f", sum / NR + 0.05 }')
   phc_ctl -qQ CLOCK_REALTIME adj "$behind"
+  sleep 0.5 # this step is told before the start
 }
 
 follow() { # way

@@ -56,12 +56,12 @@ silence() {
 run_machine() {
   local kHz
   kHz=$("$folder/tsc_khz")
-  exec qemu-system-x86_64 -machine q35,hpet=off -accel kvm -accel tcg -cpu max -m 1024 -nodefaults -no-reboot \
+  exec qemu-system-x86_64 -machine q35,hpet=off -accel tcg -cpu max -m 1024 -nodefaults -no-reboot \
     -display none -kernel "$folder/vmlinuz" -initrd "$folder/initrd" -append "root=/dev/vda rw console=ttyS0 \
 net.ifnames=0 hpet=disable pmtmr=0 tsc_early_khz=$((kHz - kHz * 40 / 1000000)) tsc=reliable clocksource=tsc \
 no-kvmclock nowatchdog closed_loop.part=$part" -drive "file=$folder/root.ext4,if=virtio,format=raw,snapshot=on" \
     -netdev tap,id=net,ifname=tap0,script=no,downscript=no -device virtio-net-pci,netdev=net,romfile= \
-    -serial "file:$folder/console.log" -chardev stdio,id=report,signal=off -device virtio-serial \
+    -serial "file:$folder/console.log" -chardev file,id=report,path=/dev/stdout -device virtio-serial \
     -device virtserialport,chardev=report,name=report </dev/null 2>"$folder/machine.log"
 }
 
