@@ -106,16 +106,21 @@ phase() { # way, name, seconds
 count_observations() { grep -c " $outside " "$observations"; }
 are_observations() { (($(count_observations) >= $1)); }
 
+# By what the observer sees. A step is told before what follows.
+set_ahead() { # seconds
+  await 10 are_observations $(($(count_observations) + 4))
+  phc_ctl -qQ CLOCK_REALTIME adj "$(tail -n 4 "$observations" |
+    awk -v ahead="$1" '{ sum += $12 } END { printf "%.6f", sum / NR + ahead }')"
+  sleep 0.5
+}
+
 # At its own frequency, and 50 ms ahead.
 displace_clock() { # way
-  local behind
   rm -f /var/lib/chrony/*
   phc_ctl -qQ CLOCK_REALTIME freq 0
+  set_ahead 0
   phase "$1" free "$free"
-  await 10 are_observations $(($(count_observations) + 4))
-  behind=$(tail -n 4 "$observations" | awk '{ sum += $12 } END { printf "%.6f", sum / NR + 0.05 }')
-  phc_ctl -qQ CLOCK_REALTIME adj "$behind"
-  sleep 0.5 # this step is told before the start
+  set_ahead 0.05
 }
 
 follow() { # way
