@@ -6,7 +6,7 @@
 # Says SKIPPED and why, with status 77, where no such machine can be had.
 # usage: scripts/closed_loop.sh [--again] [--quick]
 #   --again   with the machine of the last run
-#   --quick   a third of the time
+#   --quick   a third of the time: whether all works. ptp4l's servo needs longer to begin
 set -euo pipefail
 cd "$(dirname "$0")/.."
 . scripts/clean_root.sh
