@@ -1,4 +1,5 @@
-/* Prints how fast this machine's time stamp counter is, in kHz of its own CLOCK_REALTIME, to about 0.1 ppm. */
+/* Prints how fast this machine's time stamp counter is, in kHz of its own CLOCK_REALTIME, to about
+ * 0.1 ppm. */
 #include <stdio.h>
 #include <time.h>
 #include <x86intrin.h>

@@ -61,6 +61,10 @@ void Log::bound(std::int64_t time, const std::string& path) const {
 
 void Log::request(std::int64_t time, const Octets& octets, const std::string& from,
                   const std::string& ignored) const {
+    // Messages are many: nothing is made of them for nobody.
+    if (descriptor_ < 0) {
+        return;
+    }
     Json event{{"event", "request"}, {"t", seconds(time)}, {"octets", hex(octets)}, {"from", from}};
     if (!ignored.empty()) {
         event["ignored"] = ignored;
@@ -69,6 +73,9 @@ void Log::request(std::int64_t time, const Octets& octets, const std::string& fr
 }
 
 void Log::answer(std::int64_t time, const Octets& octets, const std::string& to) const {
+    if (descriptor_ < 0) {
+        return;
+    }
     write(descriptor_,
           Json{{"event", "answer"}, {"t", seconds(time)}, {"octets", hex(octets)}, {"to", to}});
 }
