@@ -43,7 +43,9 @@ PrometheusServer::PrometheusServer(const std::string& folder, const std::vector<
     : program_(prepare(folder, ports)) {
     static const std::regex address("\"Listening on\" address=127.0.0.1:(\\d+)");
     std::smatch found;
-    if (program_.waitForOutput("ready to receive web requests") &&
+    // In whichever order.
+    if (program_.waitForOutput("\"Listening on\" address=") &&
+        program_.waitForOutput("ready to receive web requests") &&
         std::regex_search(program_.output(), found, address)) {
         port_ = std::stoi(found[1]);
     }

@@ -11,11 +11,11 @@ namespace vantelhost {
 
 /// A line of the event "pair".
 struct PairLine {
-    double t = 0;                          ///< seconds since the host's start
-    std::uint64_t time = 0;                ///< nanoseconds since 1970
-    std::uint64_t local = 0;               ///< nanoseconds modulo 2^64
-    std::int64_t offset = 0;               ///< nanoseconds
-    std::string_view leftOut;              ///< why no clock may follow it, if the host said so
+    double t = 0;             ///< seconds since the host's start
+    std::uint64_t time = 0;   ///< nanoseconds since 1970
+    std::uint64_t local = 0;  ///< nanoseconds modulo 2^64
+    std::int64_t offset = 0;  ///< nanoseconds
+    std::string_view leftOut; ///< of the text: why no clock may follow it, if the host said so
     std::optional<std::uint64_t> realtime; ///< the local time's, if it is of another clock
 };
 

@@ -37,7 +37,8 @@ TEST(PairLine, MayHaveTheHostsJudgement) {
 TEST(PairLine, MayHaveItsTimeInTheSystemsClock) {
     const Carried carried{1795261583276518056, 150, true};
     for (const auto kind : {PairKind::measured, PairKind::falseOffset}) {
-        const auto line = parsePairLine(jsonLine(pairEvent(1, 5, -6, kind, carried), {0.5, 7}));
+        const auto text = jsonLine(pairEvent(1, 5, -6, kind, carried), {0.5, 7});
+        const auto line = parsePairLine(text);
         ASSERT_TRUE(line);
         EXPECT_EQ(line->realtime, 1795261583276518056U);
         EXPECT_EQ(line->leftOut, kind == PairKind::measured ? "" : "no-delay");
