@@ -109,7 +109,7 @@ are_observations() { (($(count_observations) >= $1)); }
 # By what the observer sees. A step is told before what follows.
 set_ahead() { # seconds
   await 10 are_observations $(($(count_observations) + 4))
-  phc_ctl -qQ CLOCK_REALTIME adj "$(tail -n 4 "$observations" |
+  phc_ctl -qQ CLOCK_REALTIME -- adj "$(tail -n 4 "$observations" |
     awk -v ahead="$1" '{ sum += $12 } END { printf "%.6f", sum / NR + ahead }')"
   sleep 0.5
 }
@@ -117,7 +117,7 @@ set_ahead() { # seconds
 # At its own frequency, and 50 ms ahead.
 displace_clock() { # way
   rm -f /var/lib/chrony/*
-  phc_ctl -qQ CLOCK_REALTIME freq 0
+  phc_ctl -qQ CLOCK_REALTIME -- freq 0
   set_ahead 0
   phase "$1" free "$free"
   set_ahead 0.05
