@@ -6,6 +6,7 @@
 #   armhf     what tests needs, for 32-bit ARM under emulation
 #   bench     what tests needs, and counters for scripts/bench.sh
 #   packages  build Debian packages, check and install them
+#   mutants   what tests needs, and what finds what can be changed: scripts/mutants.sh
 #   loop      an emulated machine, what is around it, and a drawing: scripts/closed_loop.sh
 set -euo pipefail
 
@@ -30,6 +31,7 @@ armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstd
   libbenchmark-dev:armhf libprometheus-cpp-core1.0:armhf libprometheus-cpp-pull1.0:armhf)
 bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
+mutants=("${tests[@]}" clang python3-clang)
 loop=("${daemon[@]}" chrony e2fsprogs gcc gnuplot-nox mmdebstrap qemu-system-x86)
 
 packages=()
@@ -41,9 +43,10 @@ for group in "${@:-tests}"; do
     armhf) packages+=("${armhf[@]}") ;;
     bench) packages+=("${bench[@]}") ;;
     packages) packages+=("${debs[@]}") ;;
+    mutants) packages+=("${mutants[@]}") ;;
     loop) packages+=("${loop[@]}") ;;
     *)
-      echo "usage: $0 [tests|demo|checks|armhf|bench|packages|loop]..." >&2
+      echo "usage: $0 [tests|demo|checks|armhf|bench|packages|mutants|loop]..." >&2
       exit 2
       ;;
   esac

@@ -1,0 +1,36 @@
+#!/usr/bin/env bash
+# Makes small changes in source/ and support/, one at a time, and lists those that no test notices, with the score of
+# each file. All of them are built once, into build/mutants; what was found out is kept there, so that a run that was
+# ended goes on. Survivors that are no fault of the tests are in tests/mutation/judged.txt, each with its reason.
+# The exit status is 1 if there is one that is not.
+# usage: scripts/mutants.sh [--share K/N] [FILE]...
+#   --share K/N   every N-th change, from the K-th on
+#   FILE          changes in these files alone, as source/tMsgBuffer.h
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+case ${1-} in
+  --share) ;;
+  -*)
+    sed -n 's/^# usage: /usage: /p' "$0" >&2
+    exit 2
+    ;;
+esac
+
+scripts/setup.sh mutants
+folder=$PWD/build/mutants
+tree=$folder/tree
+build=$folder/build
+programs=(unit_tests memory_tests allocation_tests process_tests system_calls_tests contract_tests session_tests
+  fault_tests child_program)
+
+mkdir -p "$tree"
+git ls-files -z --cached --others --exclude-standard | tar --create --null --files-from=- | tar --extract --directory="$tree"
+cmake -S "$tree" -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=None -DCMAKE_EXPORT_COMPILE_COMMANDS=ON \
+  -DCMAKE_CXX_FLAGS="-O0 -w -include $tree/tests/mutation/mutant.h" >"$folder/configure.log"
+tests/mutation/mutate.py "$tree" "$build" "$folder/mutants.jsonl"
+cmake --build "$build" --target "${programs[@]}" >"$folder/build.log" || {
+  tail -n 40 "$folder/build.log" >&2
+  exit 1
+}
+tests/mutation/run.py "$build" "$folder/mutants.jsonl" tests/mutation/judged.txt "$folder/results.jsonl" "$@"
