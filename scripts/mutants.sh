@@ -27,7 +27,7 @@ programs=(unit_tests memory_tests allocation_tests process_tests system_calls_te
 mkdir -p "$tree"
 git ls-files -z --cached --others --exclude-standard | tar --create --null --files-from=- | tar --extract --directory="$tree"
 cmake -S "$tree" -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=None -DCMAKE_EXPORT_COMPILE_COMMANDS=ON \
-  -DCMAKE_CXX_FLAGS="-O0 -w -include $tree/tests/mutation/mutant.h" >"$folder/configure.log"
+  -DCMAKE_CXX_FLAGS="-O0 -w -D_GLIBCXX_ASSERTIONS -include $tree/tests/mutation/mutant.h" >"$folder/configure.log"
 tests/mutation/mutate.py "$tree" "$build" "$folder/mutants.jsonl"
 cmake --build "$build" --target "${programs[@]}" >"$folder/build.log" || {
   tail -n 40 "$folder/build.log" >&2

@@ -1,5 +1,7 @@
 #include "sleepLength.h"
 
+#include <algorithm>
+
 namespace zekelVantel {
 namespace {
 
@@ -14,11 +16,7 @@ std::uint32_t sleepLength(std::uint64_t now, std::uint64_t ingressTime) {
     const auto elapsed = static_cast<std::uint32_t>((now - ingressTime) / 1000);
     // [oddity unsigned-sleep] Unsigned on purpose: when the aim has passed, or the clocks disagree,
     // there is no Sync to wait for and the long sleep is right.
-    const std::uint32_t rest = aimAfterSync - elapsed;
-    if (rest < shortestSleep) {
-        return shortestSleep;
-    }
-    return rest < longestSleep ? rest : longestSleep;
+    return std::clamp(aimAfterSync - elapsed, shortestSleep, longestSleep);
 }
 
 } // namespace zekelVantel

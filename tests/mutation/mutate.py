@@ -120,7 +120,7 @@ class Finder:
         if where is None or str(where) not in self.files:
             return
         self.file = self.files[str(where)]
-        if cursor.kind == CursorKind.VAR_DECL and self.is_constant(cursor):
+        if cursor.kind in (CursorKind.VAR_DECL, CursorKind.UNEXPOSED_DECL) and self.is_constant(cursor):
             return
         children = list(cursor.get_children())
         if not self.in_macro(cursor, str(where)):
@@ -203,7 +203,7 @@ class Finder:
         if len(children) == 3 and re.fullmatch(r"operator(==|!=|<|<=|>|>=|\+|-)", cursor.spelling):
             if self.span(children[0])[1] <= self.span(children[1])[0]:
                 self.operator(cursor, children[0], children[2])
-        if cursor.spelling.startswith("operator"):
+        if cursor.spelling.startswith("operator") or cursor.spelling in ("max", "min", "swap"):
             return
         arguments = list(cursor.get_arguments())
         for number in range(len(arguments) - 1):

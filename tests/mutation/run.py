@@ -17,19 +17,20 @@ import dataclasses
 import json
 import os
 import pathlib
-import re
 import subprocess
 import sys
 import tempfile
 import time
 
-# In this order: what is quick comes first.
-PROGRAMS = [
-    "unit_tests", "memory_tests", "allocation_tests", "process_tests", "system_calls_tests", "contract_tests",
-    "session_tests", "fault_tests"
+# What is quick comes first. How many run at once for each processor: what these do most of the time is wait.
+STAGES = [
+    (["unit_tests", "memory_tests", "allocation_tests", "process_tests", "system_calls_tests"], 4),
+    (["contract_tests", "session_tests", "fault_tests"], 8),
 ]
-# Of these, the tests that reach a mutant share one process.
+PROGRAMS = [program for programs, _ in STAGES for program in programs]
+# Of these, the tests that reach a mutant share one process, but for those that take longer, in seconds.
 SHARING = {"unit_tests"}
+LONG = 0.5
 
 
 @dataclasses.dataclass
@@ -39,6 +40,7 @@ class Test:
     command: list
     folder: str
     environment: dict
+    passed: bool = True
     seconds: float = 0
     reached: frozenset = frozenset()
 
@@ -78,32 +80,44 @@ def find_reached(test):
     with tempfile.NamedTemporaryFile() as file:
         file.truncate(1 << 20)
         start = time.monotonic()
-        passed = run(test, test.command, 120, VANTEL_MUTANTS_REACHED=file.name)
+        test.passed = run(test, test.command, 120, VANTEL_MUTANTS_REACHED=file.name)
         test.seconds = time.monotonic() - start
-        octets = pathlib.Path(file.name).read_bytes()
+        octets = file.read().rstrip(b"\0")
     test.reached = frozenset(number for number, octet in enumerate(octets) if octet)
-    return passed
 
 
-def find_all_reached(tests, jobs):
+def find_all_reached(tests, kept, jobs):
+    """Of a program that is as it was, what is kept is taken."""
+    known = json.loads(kept.read_text()) if kept.exists() else {}
+    built = {test.name: os.stat(test.command[0]).st_mtime for test in tests}
+    unknown = []
+    for test in tests:
+        if known.get(test.name, [0])[0] == built[test.name]:
+            _, test.passed, test.seconds, reached = known[test.name]
+            test.reached = frozenset(reached)
+        else:
+            unknown.append(test)
     with concurrent.futures.ThreadPoolExecutor(jobs) as pool:
-        failed = [test.name for test, passed in zip(tests, pool.map(find_reached, tests)) if not passed]
+        list(pool.map(find_reached, unknown))
+    kept.write_text(json.dumps(
+        {test.name: [built[test.name], test.passed, test.seconds, sorted(test.reached)] for test in tests}))
+    failed = [test.name for test in tests if not test.passed]
     if failed:
         print(f"run: left out, as they fail without a mutant: {' '.join(failed)}", file=sys.stderr)
-    return [test for test in tests if test.name not in failed]
+    return [test for test in tests if test.passed]
 
 
 def batches(tests):
     """What to run, in order: each a test, or those of a program that share a process, and the command."""
     for program in PROGRAMS:
         own = sorted((test for test in tests if test.program == program), key=lambda test: test.seconds)
-        if program in SHARING and own:
-            names = ":".join(test.name for test in own)
-            yield own[0], [own[0].command[0], "--gtest_fail_fast", f"--gtest_filter={names}"], 10 + 5 * sum(
-                test.seconds for test in own)
-        else:
-            for test in own:
-                yield test, test.command, 10 + 5 * test.seconds
+        shared = [test for test in own if program in SHARING and test.seconds < LONG]
+        if shared:
+            names = ":".join(test.name for test in shared)
+            command = [shared[0].command[0], "--gtest_fail_fast", f"--gtest_filter={names}"]
+            yield shared[0], command, 10 + 5 * sum(test.seconds for test in shared)
+        for test in own[len(shared):]:
+            yield test, test.command, 10 + 5 * test.seconds
 
 
 def outcome(mutant, tests):
@@ -122,17 +136,13 @@ def key(mutant, seen):
     return json.dumps(parts + (seen[parts],))
 
 
-def shown(mutant):
-    return f"{mutant['file']}:{mutant['line']}: {mutant['kind']}: {mutant['was']} -> {mutant['becomes'] or 'nothing'}"
+def shown(mutant, place=""):
+    return f"{mutant['file']}{place}: {mutant['text']} | {mutant['was']} -> {mutant['becomes'] or 'nothing'}"
 
 
 def judged_by(path):
-    """Pairs of a pattern for a mutant as it is shown, without its line number, and the file it is of."""
-    judged = set()
-    for line in path.read_text().splitlines():
-        if line and not line.startswith(("#", " ")):
-            judged.add(line)
-    return judged
+    """The mutants of the list: lines that are no comment and no reason, which is indented."""
+    return {line for line in path.read_text().splitlines() if line and not line.startswith(("#", " "))}
 
 
 def main():
@@ -160,17 +170,30 @@ def main():
     todo = [mutant for mutant in chosen if known.get(mutant["key"], "lived") in ("lived", "unreached")]
 
     if todo:
-        tests = find_all_reached(find_tests(given.build), jobs)
-        with given.results.open("a") as results, concurrent.futures.ThreadPoolExecutor(jobs) as pool:
-            running = {pool.submit(outcome, mutant, tests): mutant for mutant in todo}
-            for done, future in enumerate(concurrent.futures.as_completed(running), 1):
-                mutant = running[future]
-                known[mutant["key"]] = future.result()
-                results.write(json.dumps({"key": mutant["key"], "outcome": future.result()}) + "\n")
-                results.flush()
-                if done % 100 == 0:
-                    print(f"{done} of {len(todo)}", file=sys.stderr)
+        tests = find_all_reached(find_tests(given.build), given.results.with_name("reached.json"), jobs)
+        with given.results.open("a") as results:
+            for programs, each in STAGES:
+                stage = [test for test in tests if test.program in programs]
+                run_stage(todo, stage, jobs * each, known, results)
+                todo = [mutant for mutant in todo if known[mutant["key"]] in ("lived", "unreached")]
     sys.exit(report(chosen, known, judged_by(given.judged)))
+
+
+def run_stage(mutants, tests, jobs, known, results):
+    """What no test of a stage reaches may have lived through the one before."""
+    pool = concurrent.futures.ThreadPoolExecutor(jobs)
+    try:
+        running = {pool.submit(outcome, mutant, tests): mutant for mutant in mutants}
+        for done, future in enumerate(concurrent.futures.as_completed(running), 1):
+            key = running[future]["key"]
+            if future.result() != "unreached" or known.get(key) != "lived":
+                known[key] = future.result()
+                results.write(json.dumps({"key": key, "outcome": known[key]}) + "\n")
+                results.flush()
+            if done % 100 == 0:
+                print(f"{done} of {len(mutants)}", file=sys.stderr)
+    finally:
+        pool.shutdown(cancel_futures=True)
 
 
 def report(mutants, known, judged):
@@ -179,12 +202,11 @@ def report(mutants, known, judged):
     status = 0
     for mutant in mutants:
         result = known[mutant["key"]]
-        name = re.sub(r":\d+:", ":", shown(mutant), count=1)
-        if result in ("lived", "unreached"):
-            result = "judged" if name in judged else result
+        if result in ("lived", "unreached") and shown(mutant) in judged:
+            result = "judged"
         if result in ("lived", "unreached"):
             status = 1
-            print(f"{result}: {shown(mutant)}")
+            print(result + ": " + shown(mutant, f":{mutant['line']}"))
         state = result if result in ("lived", "unreached", "judged") else "caught"
         for of in (mutant["file"], mutant["file"].split("/")[0] + "/", "all"):
             counts[of][state] += 1

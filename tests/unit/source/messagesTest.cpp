@@ -1,3 +1,4 @@
+#include <cstring>
 #include <memory>
 #include <ostream>
 
@@ -46,6 +47,15 @@ TEST_P(MessageTest, WholeReplacesTheFormer) {
     EXPECT_EQ(serialized(*message), next);
 }
 
+TEST_P(MessageTest, WritesEveryOctetAlsoThoseThatAreReserved) {
+    EXPECT_EQ(readInto(*message, next), 0);
+    tMsgBuffer buffer;
+    zeerr::LocalStatus status;
+    std::memset(buffer.data(), 0x42, 1500);
+    message->serialize(buffer, status);
+    EXPECT_EQ(contentOf(buffer), next);
+}
+
 TEST_P(MessageTest, CutAnywhereKeepsEachFieldThatIsNotWhole) {
     expectEachFieldAsItIsRead(*message, before, first(ends.back(), next), ends);
 }
@@ -66,14 +76,18 @@ TEST_P(MessageTest, OnlyAnErrorStopsReading) {
     }
 }
 
-TEST_P(MessageTest, NoRoomIsEndOfData) {
+TEST_P(MessageTest, WritesTheOctetsThatHaveRoomUntilEndOfData) {
     EXPECT_EQ(readInto(*message, next), 0);
-    tMsgBuffer buffer;
-    zeerr::LocalStatus status;
-    buffer.setLength(1501U - static_cast<std::uint32_t>(next.size()), status);
-    message->serialize(buffer, status);
-    EXPECT_EQ(status.code, endOfData);
-    EXPECT_EQ(buffer.getLength(), 1500U);
+    for (std::size_t room = 0; room < next.size(); ++room) {
+        tMsgBuffer buffer;
+        zeerr::LocalStatus status;
+        buffer.setLength(1500U - static_cast<std::uint32_t>(room), status);
+        std::memset(buffer.data(), 0x42, 1500);
+        message->serialize(buffer, status);
+        EXPECT_EQ(status.code, endOfData);
+        EXPECT_EQ(buffer.getLength(), 1500U);
+        EXPECT_EQ(Octets(buffer.data() + 1500 - room, buffer.data() + 1500), first(room, next)) << room;
+    }
 }
 
 const Row allOrNothing[] = {

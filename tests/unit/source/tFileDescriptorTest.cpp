@@ -31,6 +31,24 @@ TEST(FileDescriptorTest, DefaultIsNone) {
     EXPECT_FALSE(none.isOpen());
 }
 
+TEST(FileDescriptorTest, TakingNoneKeepsWhyThereIsNone) {
+    errno = ENOENT;
+    EXPECT_FALSE(tFileDescriptor(-1).isOpen());
+    EXPECT_EQ(errno, ENOENT);
+}
+
+TEST(FileDescriptorTest, NumberZeroIsADescriptorToo) {
+    const tFileDescriptor before(dup(0));
+    ASSERT_TRUE(before.isOpen());
+    close(0);
+    tFileDescriptor descriptor(openNull());
+    EXPECT_EQ(descriptor.get(), 0);
+    EXPECT_TRUE(descriptor.isOpen());
+    EXPECT_EQ(descriptor.close(), 0);
+    EXPECT_FALSE(isOpenInTheProcess(0));
+    dup2(before.get(), 0);
+}
+
 TEST(FileDescriptorTest, TakenOverDescriptorIsNotInherited) {
     const int number = openNull();
     ASSERT_GE(number, 0);

@@ -91,13 +91,22 @@ TEST_F(MsgBufferTest, WritesEveryWidthWithTheHighOctetFirst) {
     EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(MsgBufferTest, ValueCutByTheEndStillConsumesWhatWasThere) {
-    buffer = received(octets("0A 0B 0C"));
-    buffer.readU32(status);
-    EXPECT_EQ(status.code, -52012);
-    zeerr::LocalStatus second;
-    buffer.readU8(second);
-    EXPECT_EQ(second.code, -52012);
+TEST_F(MsgBufferTest, ValueCutByTheEndConsumesWhatWasThereAndIsZeroBehindIt) {
+    const auto cut = [this](const char* datagram, auto read) -> std::uint64_t {
+        buffer = received(octets(datagram));
+        zeerr::LocalStatus first;
+        const auto value = (buffer.*read)(first);
+        EXPECT_EQ(first.code, -52012) << datagram;
+        zeerr::LocalStatus second;
+        EXPECT_EQ(buffer.readU8(second), 0U) << datagram;
+        EXPECT_EQ(second.code, -52012) << datagram;
+        return value;
+    };
+    EXPECT_EQ(cut("8A", &tMsgBuffer::readU16), 0x8A00U);
+    EXPECT_EQ(cut("8A", &tMsgBuffer::readU32), 0x8A000000U);
+    EXPECT_EQ(cut("8A 9B AC", &tMsgBuffer::readU32), 0x8A9BAC00U);
+    EXPECT_EQ(cut("8A 9B AC", &tMsgBuffer::readU64), 0x8A9BAC0000000000U);
+    EXPECT_EQ(cut("8A 9B AC BD CE DF E7", &tMsgBuffer::readU64), 0x8A9BACBDCEDFE700U);
 }
 
 TEST_F(MsgBufferTest, ReadingEndsAtTheLengthAndNotAtWhatLiesBehind) {
@@ -290,9 +299,11 @@ TEST_F(MsgBufferTest, OctetsAreAppendedAtOnceOrNotAtAll) {
     EXPECT_EQ(buffer.append(2, status), nullptr);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(behind(1498, contentOf(buffer)), octets("AB"));
+    EXPECT_EQ(buffer.append(1, status), appended + 1);
+    EXPECT_EQ(buffer.getLength(), 1500U);
     status.code = -1;
-    EXPECT_EQ(buffer.append(1, status), nullptr);
-    EXPECT_EQ(buffer.getLength(), 1499U);
+    EXPECT_EQ(buffer.append(0, status), nullptr);
+    EXPECT_EQ(buffer.getLength(), 1500U);
 }
 
 TEST_F(MsgBufferTest, ErrorMakesEveryOperationDoNothing) {
