@@ -8,6 +8,7 @@ if(VANTEL_SANITIZE)
   add_link_options(-fsanitize=${VANTEL_SANITIZE})
 endif()
 if(VANTEL_COVERAGE)
-  add_compile_options(--coverage)
+  # Two threads may reach one place at once, and no count may get lost.
+  add_compile_options(--coverage -fprofile-update=atomic)
   add_link_options(--coverage)
 endif()

@@ -62,8 +62,7 @@ report_coverage() {
     build/coverage/fuzz/"$target" "$work/corpus/$target" >/dev/null
   done
   printf '\nlines of the library that these inputs reach:\n'
-  gcovr --root . --filter 'source/' --filter 'support/' \
-    --object-directory build/coverage build/coverage |
+  gcovr --object-directory build/coverage build/coverage |
     awk '$4 != "0%" || !/^(source|support)/'
 }
 

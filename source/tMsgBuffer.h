@@ -30,7 +30,7 @@ public:
     /// Makes the first n octets valid; writing goes on behind them. Reading stays where it is.
     void setLength(std::uint32_t n, zeerr::Status& status);
 
-    /// The octets themselves. The length and both positions stay as they are.
+    /// The octets themselves. The length and the position of reading stay as they are.
     const std::uint8_t* data() const { return data_.data(); }
     std::uint8_t* data() {
         touched_ = maximumLength;
@@ -43,7 +43,7 @@ public:
     template <typename Receive>
     std::int64_t fill(Receive receive, zeerr::Status& status);
 
-    /// Zeroes octets, length and both positions.
+    /// Zeroes octets, length and the position of reading.
     void clear();
 
     /// Consumes so many octets at once.
@@ -86,7 +86,6 @@ private:
     std::array<std::uint8_t, maximumLength> data_{};
     std::uint32_t length_ = 0;
     std::uint32_t readPos_ = 0;
-    std::uint32_t writePos_ = 0;
     std::uint32_t touched_ = 0; ///< octets behind it are 0, but for those up to the length
 };
 
@@ -97,7 +96,6 @@ inline void tMsgBuffer::clear() {
     std::memset(data_.data(), 0, std::max(touched_, length_));
     length_ = 0;
     readPos_ = 0;
-    writePos_ = 0;
     touched_ = 0;
 }
 
@@ -111,7 +109,6 @@ inline void tMsgBuffer::setLength(std::uint32_t n, zeerr::Status& status) {
     }
     touched_ = std::max(touched_, length_);
     length_ = n;
-    writePos_ = n;
 }
 
 template <typename Receive>
@@ -133,11 +130,10 @@ inline const std::uint8_t* tMsgBuffer::take(std::uint32_t octets, const zeerr::S
 }
 
 inline std::uint8_t* tMsgBuffer::append(std::uint32_t octets, const zeerr::Status& status) {
-    if (zeerr::isError(status) || maximumLength - writePos_ < octets) {
+    if (zeerr::isError(status) || maximumLength - length_ < octets) {
         return nullptr;
     }
-    std::uint8_t* const appended = data_.data() + writePos_;
-    writePos_ += octets;
+    std::uint8_t* const appended = data_.data() + length_;
     length_ += octets;
     return appended;
 }
@@ -203,14 +199,11 @@ inline void tMsgBuffer::writeU8(std::uint8_t value, zeerr::Status& status) {
     if (zeerr::isError(status)) {
         return;
     }
-    if (writePos_ >= maximumLength) {
+    if (length_ >= maximumLength) {
         reportWritePastEnd(status);
         return;
     }
-    data_[writePos_++] = value;
-    if (writePos_ >= length_) {
-        ++length_;
-    }
+    data_[length_++] = value;
 }
 
 template <typename Integer>

@@ -104,6 +104,28 @@ TEST(ErrorTextGrowthTest, SuccessWithoutGrowingDoesNotLoop) {
     EXPECT_STREQ(status.json, "{}");
 }
 
+TEST(ErrorTextGrowthTest, CapacityThatCannotBeDoubledDoesNotGrow) {
+    for (const std::uint32_t capacity : {1U, 2U, 0x80000001U}) {
+        HostStatus status(&countingResize, "", 2);
+        status.capacity = capacity;
+        EXPECT_EQ(Resizer(status).insert(status.json, capacity), nullptr) << capacity;
+        EXPECT_TRUE(requestedSizes.empty()) << capacity;
+    }
+}
+
+TEST(ErrorTextGrowthTest, FreshStatusHasNothingToDouble) {
+    HostStatus status(&countingResize);
+    EXPECT_EQ(Resizer(status).insert(status.json, 1), nullptr);
+    EXPECT_TRUE(requestedSizes.empty());
+}
+
+TEST(ErrorTextGrowthTest, PositionBehindTheTextIsRefused) {
+    HostStatus status(&countingResize, "{}", 8);
+    EXPECT_EQ(Resizer(status).insert(status.json + 3, 1), nullptr);
+    EXPECT_STREQ(status.json, "{}");
+    EXPECT_EQ(Resizer(status).insert(status.json + 2, 1), status.json + 2);
+}
+
 bool anewResize(zeerr::Status* status, std::uint32_t size) {
     const bool resized = garbageResize(status, size);
     if (resized && size > 2) {

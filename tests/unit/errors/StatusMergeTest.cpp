@@ -145,4 +145,15 @@ TEST(CopyTextTest, WithoutASourceTextSucceedsAndAsksForNothing) {
     EXPECT_TRUE(requestedSizes.empty());
 }
 
+// The operation of this host gives memory back.
+TEST(CopyTextTest, ShorterTextTakesThePlaceOfALongerOne) {
+    for (const char* const text : {"{}", ""}) {
+        HostStatus source(&countingResize, text, 3);
+        HostStatus target(&countingResize, "{\"warning\":1}", 40);
+        EXPECT_TRUE(zeerr::copyText(target, source));
+        EXPECT_EQ(requestedSizes, std::vector{zeerr::textLength(source) + 1});
+        EXPECT_STREQ(target.json, text);
+    }
+}
+
 } // namespace

@@ -69,6 +69,20 @@ TEST_F(MessageFieldsTest, FieldsAreWrittenInTheOrderOfTheirList) {
     EXPECT_EQ(status.code, 0);
 }
 
+TEST_F(MessageFieldsTest, WhatFitsIsWrittenWhereverTheRoomEnds) {
+    for (std::size_t room = 0; room < before.size(); ++room) {
+        const std::size_t filled = tMsgBuffer::capacity() - room;
+        tMsgBuffer buffer;
+        zeerr::LocalStatus failed;
+        buffer.setLength(static_cast<std::uint32_t>(filled), failed);
+        writeFields(fields, buffer, failed);
+        EXPECT_EQ(failed.code, endOfData) << room;
+        const Octets content = contentOf(buffer);
+        ASSERT_EQ(content.size(), tMsgBuffer::capacity()) << room;
+        EXPECT_EQ(behind(filled, content), first(room, before)) << room;
+    }
+}
+
 TEST_F(MessageFieldsTest, FieldsAreReadInTheOrderOfTheirList) {
     tMsgBuffer buffer = received(next);
     readEachField(fields, buffer, status);
