@@ -132,7 +132,8 @@ class Finder:
     def is_compiled_in(self, cursor, child, index):
         """Whether a part is a constant to the compiler: a template's argument, a case."""
         if cursor.kind in FUNCTIONS | DECLARED:
-            return child.extent.start.offset < cursor.location.offset
+            is_size = cursor.type.kind == TypeKind.CONSTANTARRAY and child.kind != CursorKind.INIT_LIST_EXPR
+            return is_size or child.extent.start.offset < cursor.location.offset
         if cursor.kind in NAMED:
             return child.kind == CursorKind.INTEGER_LITERAL
         if cursor.kind == CursorKind.IF_STMT:
@@ -256,7 +257,7 @@ class Finder:
         if value.type.get_canonical().kind == TypeKind.BOOL:
             if value.kind not in (CursorKind.CXX_BOOL_LITERAL_EXPR, CursorKind.BINARY_OPERATOR):
                 self.add(value, "return", f"!({text})")
-        elif text not in ("{}", "nullptr", "0"):
+        elif text not in ("{}", "nullptr", "0", "'\\0'"):
             self.add(cursor, "return", "return {};", form="before")
 
     def statement(self, cursor):

@@ -134,6 +134,20 @@ bool anewResize(zeerr::Status* status, std::uint32_t size) {
     return resized;
 }
 
+TEST(ErrorTextGrowthTest, TextThatAnotherReplacedWhileItGrewIsRefused) {
+    HostStatus status(&anewResize, R"({"a":1})", 10);
+    EXPECT_EQ(Resizer(status).insert(status.json + 7, 20), nullptr);
+    EXPECT_STREQ(status.json, "{}");
+}
+
+TEST(ErrorTextGrowthTest, OctetBehindTheCapacityStays) {
+    char text[] = {'{', '}', '\0', 'x', 'x', 'x', 'x', 'x', '!'};
+    zeerr::Status status{0, 8, nullptr, text};
+    EXPECT_EQ(Resizer(status).insert(text + 1, 5), text + 1);
+    EXPECT_STREQ(text + 6, "}");
+    EXPECT_EQ(text[8], '!');
+}
+
 struct Operation {
     const char* name;
     zeerr_Resize resize;

@@ -79,7 +79,8 @@ TEST(JsonScannerTest, WhatIsNotWellFormedDoesNotScan) {
           R"(["a" "b"])", R"([[]1])",    R"({"a":1;})",  R"({'a':1})",     R"({"a":"b'})",
           R"([1:2])",     R"({"a":{]})", R"([[1})",      R"({null:1})",    R"([}])",
           R"([/**/])",    R"({[]:1})",   R"({"a","b"})", R"([1,,2])",      R"([")",
-          R"([1})",       R"({"a":1])",  R"([})",        R"({])"}) {
+          R"([1})",       R"({"a":1])",  R"([})",        R"({])",
+          R"({:1})"}) {
         EXPECT_EQ(closingIn(text), none) << text;
     }
 }
@@ -120,7 +121,7 @@ TEST(JsonScannerTest, BracketsAndSeparatorsInStringsDoNotCount) {
 
 TEST(JsonScannerTest, StringThatDoesNotEndDoesNotScan) {
     for (const char* const text : {R"({"a)", R"({"a":"b})", R"({"a":"b\"})", R"(["\)", R"(["\")",
-                                   R"(["\\\"])", R"(["a\\\"])"}) {
+                                   R"(["\\\"])", R"(["a\\\"])", R"(["])"}) {
         EXPECT_EQ(closingIn(text), none) << text;
     }
 }
@@ -134,7 +135,7 @@ TEST(JsonScannerTest, ZerosBelongToStringsOnly) {
 }
 
 TEST(JsonScannerTest, NumbersScan) {
-    for (const std::string number : {"0", "-0", "1", "-1", "12345678901234567890", "0.5", "-12.75",
+    for (const std::string number : {"0", "9", "-0", "1", "-1", "12345678901234567890", "0.5", "-12.75",
                                      "1e5", "1E5", "1e+5", "1.5E-300", "-2147483648"}) {
         EXPECT_EQ(closingIn("[" + number + "]"), endOf("[" + number + "]")) << number;
         EXPECT_EQ(closingIn("{\"a\":" + number + "}"), endOf("{\"a\":" + number + "}")) << number;

@@ -179,9 +179,23 @@ TEST(ResizeTest, TextStaysTerminatedWhateverTheNewMemoryHolds) {
 }
 
 TEST(ResizeTest, MemoryTooSmallForAnObjectBecomesAnEmptyText) {
-    HostStatus status(&countingResize);
-    EXPECT_TRUE(zeerr::resize(status, 2));
-    EXPECT_STREQ(status.json, "");
+    for (const auto& [size, text] : {std::pair(2U, ""), {3U, "{}"}}) {
+        HostStatus status(&countingResize);
+        EXPECT_TRUE(zeerr::resize(status, size));
+        EXPECT_STREQ(status.json, text);
+    }
+}
+
+TEST(ResizeTest, OperationThatThrowsAlsoForLessFails) {
+    HostStatus status(&throwingResize, "{}", 8);
+    EXPECT_FALSE(zeerr::resize(status, 4));
+    EXPECT_STREQ(status.json, "{}");
+}
+
+TEST(SetCodeTest, CapacityWithoutATextIsNotWritten) {
+    zeerr::Status status{0, 8, nullptr, nullptr};
+    EXPECT_TRUE(zeerr::setCode(status, -7));
+    EXPECT_EQ(status.json, nullptr);
 }
 
 TEST(TextLengthTest, NeverGoesBeyondTheCapacity) {
