@@ -59,8 +59,7 @@ std::string format(const std::string& value) {
         position, "message", "Error parsing: expected data type does not match the parsed value.",
         resizer);
     position = zeerr::addString(position, "JSON", configText, resizer);
-    position = zeerr::addString(position, "key", key, resizer);
-    zeerr::leaveObject(position);
+    zeerr::addString(position, "key", key, resizer);
     throw zeerr::Exception(status);
 }
 

@@ -89,9 +89,6 @@ bool tPtp4lProcess::hasDied() {
 }
 
 void tPtp4lProcess::terminate() {
-    if (pid_ == -1) {
-        return;
-    }
     if (!hasDied()) {
         kill(pid_, SIGTERM);
     }

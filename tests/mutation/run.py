@@ -22,13 +22,10 @@ import sys
 import tempfile
 import time
 
-# What is quick comes first. How many run at once for each processor: what these do most of the time is wait.
-STAGES = [
-    (["unit_tests", "memory_tests", "allocation_tests", "process_tests", "system_calls_tests"], 4),
-    (["contract_tests", "session_tests", "fault_tests"], 8),
-]
-PROGRAMS = [program for programs, _ in STAGES for program in programs]
-# Of these, the tests that reach a mutant share one process, but for those that take longer, in seconds.
+# The labels of tests, what is quick first, and how many run at once for each processor: most of the time they wait.
+STAGES = [({"unit"}, 4), ({"contract", "session", "faults"}, 8)]
+LABELS = set().union(*(labels for labels, _ in STAGES))
+# Of these programs, the tests that reach a mutant share one process, but for those that take longer, in seconds.
 SHARING = {"unit_tests"}
 LONG = 0.5
 
@@ -36,7 +33,7 @@ LONG = 0.5
 @dataclasses.dataclass
 class Test:
     name: str
-    program: str
+    label: str
     command: list
     folder: str
     environment: dict
@@ -49,12 +46,12 @@ def find_tests(build):
     shown = subprocess.run(["ctest", "--test-dir", build, "--show-only=json-v1"], capture_output=True, check=True)
     tests = []
     for test in json.loads(shown.stdout)["tests"]:
-        program = pathlib.Path(test.get("command", [""])[0]).name
-        if program not in PROGRAMS:
-            continue
         properties = {one["name"]: one["value"] for one in test.get("properties", [])}
+        labels = LABELS.intersection(properties.get("LABELS", []))
+        if not labels:
+            continue
         environment = dict(one.split("=", 1) for one in properties.get("ENVIRONMENT", []))
-        tests.append(Test(test["name"], program, test["command"], properties["WORKING_DIRECTORY"], environment))
+        tests.append(Test(test["name"], labels.pop(), test["command"], properties["WORKING_DIRECTORY"], environment))
     return tests
 
 
@@ -109,14 +106,14 @@ def find_all_reached(tests, kept, jobs):
 
 def batches(tests):
     """What to run, in order: each a test, or those of a program that share a process, and the command."""
-    for program in PROGRAMS:
-        own = sorted((test for test in tests if test.program == program), key=lambda test: test.seconds)
-        shared = [test for test in own if program in SHARING and test.seconds < LONG]
-        if shared:
-            names = ":".join(test.name for test in shared)
-            command = [shared[0].command[0], "--gtest_fail_fast", f"--gtest_filter={names}"]
-            yield shared[0], command, 10 + 5 * sum(test.seconds for test in shared)
-        for test in own[len(shared):]:
+    ordered = sorted(tests, key=lambda test: test.seconds)
+    shared = [test for test in ordered if pathlib.Path(test.command[0]).name in SHARING and test.seconds < LONG]
+    if shared:
+        names = ":".join(test.name for test in shared)
+        command = [shared[0].command[0], "--gtest_fail_fast", f"--gtest_filter={names}"]
+        yield shared[0], command, 10 + 5 * sum(test.seconds for test in shared)
+    for test in ordered:
+        if test not in shared:
             yield test, test.command, 10 + 5 * test.seconds
 
 
@@ -125,7 +122,7 @@ def outcome(mutant, tests):
     reaching = [test for test in tests if mutant["number"] in test.reached]
     for test, command, timeout in batches(reaching):
         if not run(test, command, timeout, VANTEL_MUTANT=str(mutant["number"])):
-            return test.program
+            return test.label
     return "lived" if reaching else "unreached"
 
 
@@ -172,8 +169,8 @@ def main():
     if todo:
         tests = find_all_reached(find_tests(given.build), given.results.with_name("reached.json"), jobs)
         with given.results.open("a") as results:
-            for programs, each in STAGES:
-                stage = [test for test in tests if test.program in programs]
+            for labels, each in STAGES:
+                stage = [test for test in tests if test.label in labels]
                 run_stage(todo, stage, jobs * each, known, results)
                 todo = [mutant for mutant in todo if known[mutant["key"]] in ("lived", "unreached")]
     sys.exit(report(chosen, known, judged_by(given.judged)))

@@ -40,6 +40,15 @@ DescriptorLimit::~DescriptorLimit() {
     setrlimit(RLIMIT_NOFILE, &before_);
 }
 
+FreeDescriptorZero::FreeDescriptorZero() : before_(dup(STDIN_FILENO)) {
+    close(STDIN_FILENO);
+}
+
+FreeDescriptorZero::~FreeDescriptorZero() {
+    dup2(before_, STDIN_FILENO);
+    close(before_);
+}
+
 OccupiedDescriptors::OccupiedDescriptors(int below) : limit_(static_cast<rlim_t>(below) + 16) {
     for (int last = 0; last < below;) {
         last = fcntl(STDERR_FILENO, F_DUPFD_CLOEXEC, 0);

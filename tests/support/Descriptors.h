@@ -25,6 +25,18 @@ private:
     rlimit before_{};
 };
 
+/// Leaves descriptor 0 free, which the next that is opened gets, while this object lives.
+class FreeDescriptorZero {
+public:
+    FreeDescriptorZero();
+    ~FreeDescriptorZero();
+    FreeDescriptorZero(const FreeDescriptorZero&) = delete;
+    FreeDescriptorZero& operator=(const FreeDescriptorZero&) = delete;
+
+private:
+    int before_;
+};
+
 /// Holds every descriptor below a number, while this object lives.
 class OccupiedDescriptors {
 public:

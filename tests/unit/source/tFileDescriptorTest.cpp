@@ -9,6 +9,8 @@
 
 #include <gtest/gtest.h>
 
+#include "support/Descriptors.h"
+
 using zekelVantel::tFileDescriptor;
 
 namespace {
@@ -38,15 +40,12 @@ TEST(FileDescriptorTest, TakingNoneKeepsWhyThereIsNone) {
 }
 
 TEST(FileDescriptorTest, NumberZeroIsADescriptorToo) {
-    const tFileDescriptor before(dup(0));
-    ASSERT_TRUE(before.isOpen());
-    close(0);
+    const FreeDescriptorZero free;
     tFileDescriptor descriptor(openNull());
     EXPECT_EQ(descriptor.get(), 0);
     EXPECT_TRUE(descriptor.isOpen());
     EXPECT_EQ(descriptor.close(), 0);
     EXPECT_FALSE(isOpenInTheProcess(0));
-    dup2(before.get(), 0);
 }
 
 TEST(FileDescriptorTest, TakenOverDescriptorIsNotInherited) {

@@ -273,6 +273,47 @@ TEST_F(SharedFifoFailuresTest, FailingCloseIsTracedOnlyAndLeavesTheFifoClosed) {
     EXPECT_EQ(status.code, 0);
 }
 
+TEST_F(SharedFifoFailuresTest, EndOfAnOpenFifoTracesThatClosingFails) {
+    ASSERT_EQ(mkfifo("fifo", 0600), 0);
+    const int descriptor = dup(STDERR_FILENO);
+    ::close(descriptor);
+    {
+        tSharedFifo fifo("./fifo", false, status);
+        fifo.open(status);
+        ASSERT_EQ(::close(descriptor), 0) << "the lowest free descriptor is that of the FIFO";
+    }
+    EXPECT_THAT(traced, EndsWith("] Failed closing shared FIFO: ./fifo, errno: 9 "
+                                 "(Bad file descriptor)\n"));
+}
+
+TEST_F(SharedFifoFailuresTest, AreTracedUpToTheirLevel) {
+    for (const std::uint32_t threshold : {0x2000U, 0x2001U}) {
+        traced.clear();
+        zesdbg::settings.threshold = threshold;
+        {
+            tSharedFifo fifo("./fifo", true, status);
+            fifo.open(status);
+            unlink("fifo");
+        }
+        EXPECT_EQ(traced.empty(), threshold > 0x2000) << traced;
+    }
+}
+
+TEST_F(SharedFifoFailuresTest, ClosingIsTracedUpToItsLevel) {
+    ASSERT_EQ(mkfifo("fifo", 0600), 0);
+    const int descriptor = dup(STDERR_FILENO);
+    ::close(descriptor);
+    for (const std::uint32_t threshold : {0x2000U, 0x2001U}) {
+        traced.clear();
+        zesdbg::settings.threshold = threshold;
+        tSharedFifo fifo("./fifo", false, status);
+        fifo.open(status);
+        ASSERT_EQ(::close(descriptor), 0) << "the lowest free descriptor is that of the FIFO";
+        fifo.close();
+        EXPECT_EQ(traced.empty(), threshold > 0x2000) << traced;
+    }
+}
+
 TEST_F(SharedFifoFailuresTest, SuccessTracesNothing) {
     {
         tSharedFifo fifo("./fifo", true, status);

@@ -8,6 +8,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "support/Descriptors.h"
 #include "support/ErrorText.h"
 #include "support/TemporaryFolder.h"
 #include "tFileDescriptor.h"
@@ -235,6 +236,31 @@ TEST_F(SharedFifoTest, FirstWriteOpensAndAWriteAfterCloseOpensAgain) {
     EXPECT_TRUE(fifo.isOpen());
     EXPECT_EQ(read(fifo), "12");
     EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(SharedFifoTest, WriteGoesWhereTheFirstOneWent) {
+    tSharedFifo fifo(path, true, status);
+    EXPECT_EQ(fifo.write("1", 1, status), 1);
+    ASSERT_EQ(rename(path, "elsewhere"), 0);
+    EXPECT_EQ(fifo.write("2", 1, status), 1);
+    EXPECT_EQ(read(fifo), "12");
+    EXPECT_EQ(status.code, 0);
+    ASSERT_EQ(rename("elsewhere", path), 0);
+}
+
+TEST_F(SharedFifoTest, WriteOfNothingSucceeds) {
+    tSharedFifo fifo(path, true, status);
+    EXPECT_EQ(fifo.write("", 0, status), 0);
+    EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(SharedFifoTest, DescriptorZeroIsAsGoodAsOthers) {
+    tSharedFifo fifo(path, true, status);
+    const FreeDescriptorZero free;
+    fifo.open(status);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(descriptorOf(path), 0);
+    fifo.close();
 }
 
 TEST_F(SharedFifoTest, WriteTakesWhatThereIsRoomFor) {

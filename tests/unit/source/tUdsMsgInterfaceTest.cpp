@@ -49,6 +49,14 @@ TEST_F(UdsMsgInterfaceTest, OpeningBindsTheLocalPath) {
     EXPECT_GE(descriptorBoundTo(local), 0);
 }
 
+TEST_F(UdsMsgInterfaceTest, DescriptorZeroIsAsGoodAsOthers) {
+    const FreeDescriptorZero free;
+    interface.open(local, status);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(descriptorBoundTo(local), 0);
+    EXPECT_EQ(interface.close(), 0);
+}
+
 TEST_F(UdsMsgInterfaceTest, OpeningTwiceIsBusyAndChangesNothing) {
     interface.open(local, status);
     interface.open("other", status);
