@@ -10,15 +10,6 @@ packages=$build/tests/packaging/packages
 scratch=$(mktemp -d)
 trap 'rm -rf "$scratch"' EXIT
 
-for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
-  if ! command -v "$tool" >/dev/null; then
-    skip "$tool is missing; run scripts/setup.sh packages"
-  fi
-done
-if [[ ! -e $build/CPackConfig.cmake ]]; then
-  skip "dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
-fi
-
 fail() {
   echo "FAILED: $*" >&2
   exit 1
@@ -28,6 +19,15 @@ skip() {
   echo "SKIPPED: $*"
   exit 77
 }
+
+for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
+  if ! command -v "$tool" >/dev/null; then
+    skip "$tool is missing; run scripts/setup.sh packages"
+  fi
+done
+if [[ ! -e $build/CPackConfig.cmake ]]; then
+  skip "dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
+fi
 
 make_packages() { # folder
   rm -rf "$1"
