@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Builds the Debian packages into build/packages/ and checks them with lintian. The same sources give the
 # same octets.
-# usage: scripts/package.sh [amd64|armhf]   (default: this machine's architecture)
+# usage: scripts/package.sh [amd64|arm64|armhf]   (default: this machine's architecture)
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -10,12 +10,12 @@ native=$(dpkg --print-architecture)
 architecture=${1:-$native}
 case $architecture in
   "$native") preset=package ;;
-  armhf)
-    preset=package-armhf
-    scripts/setup.sh armhf
+  arm64 | armhf)
+    preset=package-$architecture
+    scripts/setup.sh "$architecture"
     ;;
   *)
-    echo "usage: $0 [$native|armhf]" >&2
+    echo "usage: $0 [$native|arm64|armhf]" >&2
     exit 2
     ;;
 esac

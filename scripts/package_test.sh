@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Builds the packages and installs them with apt in a clean root, runs what they hold, and purges them.
 # Packages of another architecture are unpacked there with what they depend on, and run under emulation.
-# usage: scripts/package_test.sh [amd64|armhf]   (default: this machine's architecture)
+# usage: scripts/package_test.sh [amd64|arm64|armhf]   (default: this machine's architecture)
 set -euo pipefail
 cd "$(dirname "$0")/.."
 . scripts/clean_root.sh

@@ -3,7 +3,8 @@
 #   tests     build the library and its tools, run the tests
 #   demo      build, and run the plug-in with the real daemon
 #   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd, prometheus
-#   armhf     what tests needs, for 32-bit ARM under emulation
+#   armhf, arm64     what tests needs, for that architecture under emulation
+#   riscv64, s390x   the same, for the library alone
 #   bench     what tests needs, and counters for scripts/bench.sh
 #   packages  build Debian packages, check and install them
 #   mutants   what tests needs, and what finds what can be changed: scripts/mutants.sh
@@ -24,29 +25,36 @@ checks=(clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
 if [[ $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release) == bookworm ]]; then
   checks+=(clang-format-14 clang-tidy-14)
 fi
-# Of prometheus-cpp the libraries alone: what it is developed with would bring curl's, and with that the C
-# library's. Its headers are those of any architecture.
-armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstdc++6:armhf
-  libcjson-dev:armhf libsystemd-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
-  libbenchmark-dev:armhf libprometheus-cpp-core1.0:armhf libprometheus-cpp-pull1.0:armhf)
+# Of another architecture, for the library, and for all else. Of prometheus-cpp the libraries alone: what it
+# is developed with would bring curl's, and with that the C library's. Its headers are those of any architecture.
+library=(libc6 libstdc++6 libcjson-dev libgtest-dev libgmock-dev)
+all_else=(libsystemd-dev libfmt-dev libbenchmark-dev libprometheus-cpp-core1.0 libprometheus-cpp-pull1.0)
 bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
 mutants=("${tests[@]}" clang python3-clang)
 loop=("${daemon[@]}" chrony e2fsprogs gcc gnuplot-nox mmdebstrap qemu-system-x86)
 
 packages=()
+architectures=() # that are not this machine's
+add_foreign() { # architecture, triplet, its packages...
+  architectures+=("$1")
+  packages+=("${tests[@]}" qemu-user-static "g++-$2" "${@:3}")
+}
+
 for group in "${@:-tests}"; do
   case $group in
     tests) packages+=("${tests[@]}") ;;
     demo) packages+=("${build[@]}" "${daemon[@]}") ;;
     checks) packages+=("${checks[@]}") ;;
-    armhf) packages+=("${armhf[@]}") ;;
+    armhf) add_foreign armhf arm-linux-gnueabihf "${library[@]/%/:armhf}" "${all_else[@]/%/:armhf}" ;;
+    arm64) add_foreign arm64 aarch64-linux-gnu "${library[@]/%/:arm64}" "${all_else[@]/%/:arm64}" ;;
+    riscv64 | s390x) add_foreign "$group" "$group-linux-gnu" "${library[@]/%/:$group}" ;;
     bench) packages+=("${bench[@]}") ;;
     packages) packages+=("${debs[@]}") ;;
     mutants) packages+=("${mutants[@]}") ;;
     loop) packages+=("${loop[@]}") ;;
     *)
-      echo "usage: $0 [tests|demo|checks|armhf|bench|packages|mutants|loop]..." >&2
+      echo "usage: $0 [tests|demo|checks|armhf|arm64|riscv64|s390x|bench|packages|mutants|loop]..." >&2
       exit 2
       ;;
   esac
@@ -76,18 +84,20 @@ if [[ ${#missing[@]} -eq 0 ]]; then
   exit 0
 fi
 
-foreign=no
-if [[ "${missing[*]}" == *:armhf* ]] && ! dpkg --print-foreign-architectures | grep -qx armhf; then
-  foreign=yes
-fi
+unknown=() # architectures to dpkg
+for architecture in "${architectures[@]}"; do
+  if ! dpkg --print-foreign-architectures | grep -qx "$architecture"; then
+    unknown+=("$architecture")
+  fi
+done
 
 as_root=(env)
 if [[ $(id -u) -ne 0 ]]; then
   if ! sudo -n true 2>/dev/null; then
     echo "setup: packages are missing and this user may not install them. As root, run:" >&2
-    if [[ $foreign == yes ]]; then
-      echo "  dpkg --add-architecture armhf" >&2
-    fi
+    for architecture in "${unknown[@]}"; do
+      echo "  dpkg --add-architecture $architecture" >&2
+    done
     echo "  apt-get update" >&2
     echo "  apt-get install --no-install-recommends ${missing[*]}" >&2
     exit 1
@@ -101,19 +111,26 @@ apt() {
 }
 
 echo "setup: installing ${missing[*]}"
-if [[ $foreign == yes ]]; then
-  "${as_root[@]}" dpkg --add-architecture armhf
-fi
+for architecture in "${unknown[@]}"; do
+  "${as_root[@]}" dpkg --add-architecture "$architecture"
+done
 apt update || echo "setup: warning: some package lists could not be fetched" >&2
-# libsystemd's own library must have the same version for both, and the lists of an architecture lag behind at times.
-if [[ "${missing[*]}" == *libsystemd-dev:armhf* ]]; then
-  version=$(apt-cache policy liblzma5:armhf | sed -n 's/^ *Candidate: //p')
-  missing+=("liblzma5=$version" "liblzma5:armhf=$version")
+# libsystemd's own library must have the same version for all architectures that have it, and the lists of some
+# lag behind at times.
+mapfile -t lzma < <(printf '%s\n' "${missing[@]}" | sed -n 's/^libsystemd-dev:/liblzma5:/p')
+if [[ ${#lzma[@]} -gt 0 ]]; then
+  mapfile -t -O "${#lzma[@]}" lzma < <(dpkg-query -W -f '${Package}:${Architecture}\n' liblzma5)
+  version=$(apt-cache policy "${lzma[@]}" | sed -n 's/^ *Candidate: //p' | sort -V | head -n 1)
+  missing+=("${lzma[@]/%/=$version}")
 fi
 apt install -y --no-install-recommends "${missing[@]}" || true
 
 find_missing
 if [[ ${#missing[@]} -gt 0 ]]; then
+  # One that this release of Debian does not have would stay in apt's way.
+  for architecture in "${unknown[@]}"; do
+    "${as_root[@]}" dpkg --remove-architecture "$architecture" 2>/dev/null || true
+  done
   echo "setup: still missing: ${missing[*]}. Look at apt-get's messages above, then run" \
     "'apt-get install --no-install-recommends ${missing[*]}'" >&2
   exit 1

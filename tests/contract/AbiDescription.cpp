@@ -21,7 +21,7 @@ namespace {
 /// Which of them there are depends on compiler and machine: the loader, the mathematics of the C
 /// library, and what sanitizers add.
 bool isOfTheToolchain(const std::string& name) {
-    static const std::regex pattern("(ld-linux.*|libm|lib[a-z]+san)\\.so\\..*");
+    static const std::regex pattern("(ld-linux.*|ld64|libm|lib[a-z]+san)\\.so\\..*");
     return std::regex_match(name, pattern);
 }
 

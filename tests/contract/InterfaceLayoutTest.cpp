@@ -1,4 +1,4 @@
-// What passes between host and plug-in has the same size and octets with 32-bit and with 64-bit
+// What passes between host and plug-in has the same size and bits with 32-bit and with 64-bit
 // pointers. The functions and the status, with the types of their members, are in AbiTest.
 
 #include <array>
@@ -12,27 +12,24 @@
 
 namespace {
 
-using testing::ElementsAreArray;
+using testing::ElementsAre;
 
 using Quality = std::array<double, ZEKEL_QUALITY_LENGTH>;
-using Octets = std::array<std::uint8_t, sizeof(Quality)>;
+using Bits = std::array<std::uint64_t, ZEKEL_QUALITY_LENGTH>;
 
-Octets octetsOf(const Quality& quality) {
-    Octets octets;
-    std::memcpy(octets.data(), quality.data(), sizeof(quality));
-    return octets;
+Bits bitsOf(const Quality& quality) {
+    static_assert(sizeof(Bits) == sizeof(Quality));
+    Bits bits;
+    std::memcpy(bits.data(), quality.data(), sizeof(quality));
+    return bits;
 }
 
 TEST(InterfaceLayoutTest, QualityIsThreeIeee754DoublesOf64Bits) {
     static_assert(std::numeric_limits<double>::is_iec559);
-    EXPECT_THAT(octetsOf(ZEKEL_QUALITY_USABLE),
-                ElementsAreArray({0x48, 0xAF, 0xBC, 0x9A, 0xF2, 0xD7, 0x5A, 0x3E, //
-                                  0x8D, 0xED, 0xB5, 0xA0, 0xF7, 0xC6, 0xB0, 0x3E, //
-                                  0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF0, 0xBF}));
-    EXPECT_THAT(octetsOf(ZEKEL_QUALITY_UNUSABLE),
-                ElementsAreArray({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xC0, //
-                                  0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xC0, //
-                                  0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF0, 0xBF}));
+    EXPECT_THAT(bitsOf(ZEKEL_QUALITY_USABLE),
+                ElementsAre(0x3E5AD7F29ABCAF48, 0x3EB0C6F7A0B5ED8D, 0xBFF0000000000000));
+    EXPECT_THAT(bitsOf(ZEKEL_QUALITY_UNUSABLE),
+                ElementsAre(0xC000000000000000, 0xC000000000000000, 0xBFF0000000000000));
 }
 
 } // namespace

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Checks the packages in a clean root, which mmdebstrap has made: it calls this as a hook. A native root
 # gets the packages by apt, and loses them again; a foreign one was made with them unpacked.
-# usage: tests/packaging/installed_test.sh ROOT native|armhf PACKAGE.deb...
+# usage: tests/packaging/installed_test.sh ROOT native|arm64|armhf PACKAGE.deb...
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
 # shellcheck source=scripts/clean_root.sh
@@ -20,11 +20,13 @@ in_root() { # command...
 }
 compiler=cc
 if [[ $kind != native ]]; then
-  compiler=arm-linux-gnueabihf-gcc
+  # It warns of the native compiler.
+  compiler=$(dpkg-architecture -a"$kind" -f -q DEB_HOST_GNU_TYPE 2>/dev/null)-gcc
+  emulator=qemu-$(dpkg-architecture -a"$kind" -f -q DEB_HOST_GNU_CPU 2>/dev/null)-static
   in_root() { # program, arguments...
     local program=$1
     shift
-    LD_LIBRARY_PATH='' qemu-arm-static -L "$root" "$root$program" "$@"
+    LD_LIBRARY_PATH='' "$emulator" -L "$root" "$root$program" "$@"
   }
 fi
 

@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # Checks the Debian packages that cpack makes of a build folder. Each check is a test of ctest.
-# usage: tests/packaging/packages_test.sh BUILD_FOLDER native|armhf CHECK
+# usage: tests/packaging/packages_test.sh BUILD_FOLDER native|arm64|armhf CHECK
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
 build=$1
@@ -9,15 +9,6 @@ check=$3
 packages=$build/tests/packaging/packages
 scratch=$(mktemp -d)
 trap 'rm -rf "$scratch"' EXIT
-
-for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
-  if ! command -v "$tool" >/dev/null; then
-    skip "$tool is missing; run scripts/setup.sh packages"
-  fi
-done
-if [[ ! -e $build/CPackConfig.cmake ]]; then
-  skip "dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
-fi
 
 fail() {
   echo "FAILED: $*" >&2
@@ -28,6 +19,15 @@ skip() {
   echo "SKIPPED: $*"
   exit 77
 }
+
+for tool in lintian dpkg-gensymbols dpkg-shlibdeps; do
+  if ! command -v "$tool" >/dev/null; then
+    skip "$tool is missing; run scripts/setup.sh packages"
+  fi
+done
+if [[ ! -e $build/CPackConfig.cmake ]]; then
+  skip "dpkg-dev was missing when the build was configured; run scripts/setup.sh packages"
+fi
 
 make_packages() { # folder
   rm -rf "$1"
@@ -54,7 +54,7 @@ expect_field() { # package, field, value
 # The files of a package, with links as "name -> target", sorted; the triplet stands as TRIPLET.
 files() { # package
   dpkg-deb --fsys-tarfile "$(deb "$1")" | tar -t -v |
-    sed -nE '/^d/d; s/^([^ ]+ +){5}\.\///; s/(x86_64|arm)-linux-gnu(eabihf)?/TRIPLET/; p' |
+    sed -nE '/^d/d; s/^([^ ]+ +){5}\.\///; s/(x86_64|aarch64|arm)-linux-gnu(eabihf)?/TRIPLET/; p' |
     LC_ALL=C sort
 }
 

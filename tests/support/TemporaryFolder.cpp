@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
-#include <iterator>
+#include <sstream>
 #include <stdexcept>
 
 TemporaryFolder::TemporaryFolder() : previous_(std::filesystem::current_path()) {
@@ -22,8 +22,9 @@ TemporaryFolder::~TemporaryFolder() {
 }
 
 std::string readFile(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+    std::ostringstream content;
+    content << std::ifstream(path, std::ios::binary).rdbuf();
+    return content.str();
 }
 
 void writeFile(const std::string& path, const std::string& content) {
