@@ -2,7 +2,7 @@
 # Installs the Debian packages of the named groups (default: tests), if any is missing.
 #   tests     build the library and its tools, run the tests
 #   demo      build, and run the plug-in with the real daemon
-#   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd, prometheus
+#   checks    what CI has besides: clang, abidiff, format and tidy checks, valgrind, chronyd, prometheus
 #   armhf     what tests needs, for 32-bit ARM under emulation
 #   bench     what tests needs, and counters for scripts/bench.sh
 #   packages  build Debian packages, check and install them
@@ -17,7 +17,7 @@ tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev b
   gnuplot-nox libxml2-utils mandoc groff-base)
 # chrony would take the place of another time daemon, and prometheus serves at once: nobody gets them who only
 # wants to build.
-checks=(clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
+checks=(abigail-tools clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
 # Another version formats and finds otherwise. Debian 12 alone has this one; elsewhere scripts/format.sh and
 # scripts/tidy.sh say SKIPPED.
 if [[ $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release) == bookworm ]]; then
