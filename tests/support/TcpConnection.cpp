@@ -1,5 +1,6 @@
 #include "support/TcpConnection.h"
 
+#include <cstdint>
 #include <stdexcept>
 
 #include <netinet/in.h>
