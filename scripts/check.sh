@@ -24,6 +24,7 @@ case $preset in
     ;;
   armhf) groups=(armhf) ;;
   clang | fuzz) groups=(tests checks) ;;
+  hardened) groups=(tests packages) ;;
   *) groups=(tests) ;;
 esac
 jobs=$(nproc)

@@ -29,7 +29,7 @@ armhf=("${tests[@]}" g++-arm-linux-gnueabihf qemu-user-static libc6:armhf libstd
   libcjson-dev:armhf libsystemd-dev:armhf libgtest-dev:armhf libgmock-dev:armhf libfmt-dev:armhf
   libbenchmark-dev:armhf libprometheus-cpp-core1.0:armhf libprometheus-cpp-pull1.0:armhf)
 bench=("${tests[@]}" valgrind)
-debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
+debs=("${build[@]}" devscripts dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
 loop=("${daemon[@]}" chrony e2fsprogs gcc gnuplot-nox mmdebstrap qemu-system-x86)
 
 packages=()
