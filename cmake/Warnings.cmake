@@ -1,13 +1,14 @@
 # The project's warning set, for every target of its own. The presets make them errors.
 add_library(vantel_warnings INTERFACE)
 # What is local to a file is no longer alone in a unit of several.
-set(alone $<IF:$<BOOL:$<TARGET_PROPERTY:UNITY_BUILD>>,-Wno-subobject-linkage,-Wshadow>)
+set(united $<BOOL:$<TARGET_PROPERTY:UNITY_BUILD>>)
 target_compile_options(
   vantel_warnings
   INTERFACE -Wall
             -Wextra
             -Wpedantic
-            ${alone}
+            $<$<NOT:${united}>:-Wshadow>
+            $<$<AND:${united},$<CXX_COMPILER_ID:GNU>>:-Wno-subobject-linkage>
             -Wconversion
             -Wsign-conversion
             -Wcast-align

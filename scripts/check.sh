@@ -33,6 +33,7 @@ case $preset in
     fi
     ;;
   clang | fuzz) groups=(tests checks) ;;
+  hardened) groups=(tests packages) ;;
   *) groups=(tests) ;;
 esac
 jobs=$(nproc)

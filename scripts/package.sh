@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# Builds the Debian packages into build/packages/ and checks them with lintian. The same sources give the
-# same octets.
+# Builds the Debian packages into build/packages/ and checks them with lintian and hardening-check. The same
+# sources give the same octets.
 # usage: scripts/package.sh [amd64|arm64|armhf]   (default: this machine's architecture)
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -31,3 +31,4 @@ cmake --fresh --preset "$preset" >/dev/null
 cmake --build --preset "$preset" -j "$(nproc)"
 cpack --preset "$preset"
 tests/packaging/lintian.sh build/packages/*_"$architecture".deb
+tests/packaging/hardening.sh build/packages/*_"$architecture".deb

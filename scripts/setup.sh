@@ -2,7 +2,7 @@
 # Installs the Debian packages of the named groups (default: tests), if any is missing.
 #   tests     build the library and its tools, run the tests
 #   demo      build, and run the plug-in with the real daemon
-#   checks    what CI has besides: clang, format and tidy checks, valgrind, chronyd, prometheus
+#   checks    what CI has besides: clang, abidiff, format and tidy checks, valgrind, chronyd, prometheus
 #   armhf, arm64     what tests needs, for that architecture under emulation
 #   riscv64, s390x   the same, for the library alone
 #   bench     what tests needs, and counters for scripts/bench.sh
@@ -19,7 +19,7 @@ tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev b
   gnuplot-nox libxml2-utils mandoc groff-base)
 # chrony would take the place of another time daemon, and prometheus serves at once: nobody gets them who only
 # wants to build.
-checks=(clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
+checks=(abigail-tools clang libclang-rt-dev gcovr shellcheck valgrind chrony prometheus)
 # Another version formats and finds otherwise. Debian 12 alone has this one; elsewhere scripts/format.sh and
 # scripts/tidy.sh say SKIPPED.
 if [[ $(sed -n 's/^VERSION_CODENAME=//p' /etc/os-release) == bookworm ]]; then
@@ -30,7 +30,7 @@ fi
 library=(libc6 libstdc++6 libcjson-dev libgtest-dev libgmock-dev)
 all_else=(libsystemd-dev libfmt-dev libbenchmark-dev libprometheus-cpp-core1.0 libprometheus-cpp-pull1.0)
 bench=("${tests[@]}" valgrind)
-debs=("${build[@]}" dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
+debs=("${build[@]}" devscripts dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
 mutants=("${tests[@]}" clang python3-clang)
 loop=("${daemon[@]}" chrony e2fsprogs gcc gnuplot-nox mmdebstrap qemu-system-x86)
 

@@ -14,7 +14,6 @@
 
 #include <array>
 #include <cstdint>
-#include <cstring>
 #include <type_traits>
 #include <utility>
 
@@ -46,6 +45,9 @@ Integer swappedIfLittleEndian(Integer octets) {
     }
 }
 
+// Fields are not copied by std::memcpy: the C library may check it, and the checks look large
+// enough to GCC to keep from being inlined what copies one octet. There is room for each.
+
 /// Reads fields of which every octet is there.
 class tWholeReader {
 public:
@@ -74,7 +76,7 @@ private:
     template <typename Field>
     void field(Field& value) const {
         if constexpr (std::is_integral_v<Field>) {
-            std::memcpy(&value, octets_, sizeof(value));
+            __builtin_memcpy(&value, octets_, sizeof(value));
             value = swappedIfLittleEndian(value);
             octets_ += sizeof(value);
         } else {
@@ -84,7 +86,7 @@ private:
 
     template <std::size_t size>
     void field(std::array<std::uint8_t, size>& value) const {
-        std::memcpy(value.data(), octets_, size);
+        __builtin_memcpy(value.data(), octets_, size);
         octets_ += size;
     }
 
@@ -109,7 +111,7 @@ public:
     void lowNibble(std::uint8_t low) const { field(low); }
 
     void reserved(unsigned octets) const {
-        std::memset(octets_, 0, octets);
+        __builtin_memset(octets_, 0, octets);
         octets_ += octets;
     }
 
@@ -118,7 +120,7 @@ private:
     void field(const Field& value) const {
         if constexpr (std::is_integral_v<Field>) {
             const Field octets = swappedIfLittleEndian(value);
-            std::memcpy(octets_, &octets, sizeof(octets));
+            __builtin_memcpy(octets_, &octets, sizeof(octets));
             octets_ += sizeof(octets);
         } else {
             Field::visitFields(value, *this);
@@ -127,7 +129,7 @@ private:
 
     template <std::size_t size>
     void field(const std::array<std::uint8_t, size>& value) const {
-        std::memcpy(octets_, value.data(), size);
+        __builtin_memcpy(octets_, value.data(), size);
         octets_ += size;
     }
 

@@ -259,6 +259,10 @@ SymbolsFileNamesWhatIsExported() {
     -v19.0.0 -Proot -I"$here/../../packaging/libvantel-bc19/symbols" -e"$library" -O/dev/null
 }
 
+LibraryAndProgramsAreHardened() {
+  "$here/hardening.sh" "$packages"/*.deb
+}
+
 LintianFindsNothing() {
   "$here/lintian.sh" "$packages"/*.deb
 }

@@ -2,8 +2,10 @@
 // test takes a scene of its own, with a grandmaster that is 5 ms ahead.
 
 #include <algorithm>
+#include <cctype>
 #include <chrono>
 #include <csignal>
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>

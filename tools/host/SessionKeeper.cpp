@@ -4,6 +4,7 @@
 #include <array>
 #include <chrono>
 #include <exception>
+#include <system_error>
 #include <utility>
 
 #include <fmt/format.h>

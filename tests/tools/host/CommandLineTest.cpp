@@ -1,5 +1,6 @@
 #include "CommandLine.h"
 
+#include <memory>
 #include <optional>
 
 #include <CLI/CLI.hpp>

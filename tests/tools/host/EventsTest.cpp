@@ -2,6 +2,7 @@
 
 #include <array>
 #include <cerrno>
+#include <limits>
 #include <map>
 
 #include <fcntl.h>

@@ -1,6 +1,7 @@
 // Runs on a PTP clock: the program is linked with a stand-in for its device.
 
 #include <algorithm>
+#include <cmath>
 #include <csignal>
 #include <cstdlib>
 #include <sstream>

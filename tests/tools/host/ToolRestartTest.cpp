@@ -1,5 +1,6 @@
 // Sessions that fail: what --restart makes of them, and what systemd hears.
 
+#include <algorithm>
 #include <array>
 #include <csignal>
 #include <cstring>

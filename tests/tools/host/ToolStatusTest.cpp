@@ -1,5 +1,6 @@
 // "vantel-host status" and the socket that it asks.
 
+#include <cerrno>
 #include <csignal>
 #include <cstring>
 #include <filesystem>

@@ -1,6 +1,8 @@
 #include "Client.h"
 #include "Daemon.h"
 
+#include <memory>
+
 #include <gtest/gtest.h>
 
 #include "support/Processes.h"

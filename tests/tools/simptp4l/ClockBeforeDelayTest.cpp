@@ -1,5 +1,6 @@
 #include "Clock.h"
 
+#include <cstdint>
 #include <limits>
 
 #include <gtest/gtest.h>

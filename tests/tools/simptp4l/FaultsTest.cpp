@@ -2,6 +2,8 @@
 #include "Daemon.h"
 
 #include <chrono>
+#include <memory>
+
 #include <gtest/gtest.h>
 
 #include "support/Processes.h"

@@ -1,8 +1,10 @@
 #include "Clock.h"
 
+#include <cstdint>
+#include <system_error>
+
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <system_error>
 #include <unistd.h>
 
 #include "support/TemporaryFolder.h"

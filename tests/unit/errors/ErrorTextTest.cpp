@@ -1,6 +1,7 @@
 #include "errors/ErrorText.h"
 
 #include <array>
+#include <cerrno>
 #include <climits>
 #include <cstdlib>
 #include <string>

@@ -9,6 +9,7 @@
 
 #include <cinttypes>
 #include <csignal>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>

@@ -1,6 +1,7 @@
 #include "sleepLength.h"
 
 #include <ostream>
+#include <string>
 
 #include <gtest/gtest.h>
 

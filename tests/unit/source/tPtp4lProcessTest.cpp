@@ -1,6 +1,7 @@
 #include "tPtp4lProcess.h"
 
 #include <atomic>
+#include <cerrno>
 #include <cstdlib>
 #include <filesystem>
 #include <thread>

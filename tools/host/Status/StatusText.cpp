@@ -1,6 +1,7 @@
 #include "Status/StatusText.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstdlib>
 
 #include <fmt/format.h>

@@ -1,5 +1,6 @@
 #include "Report/RecordFiles.h"
 
+#include <cstdint>
 #include <filesystem>
 
 #include <gmock/gmock.h>
