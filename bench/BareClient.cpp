@@ -1,9 +1,11 @@
 #include "BareClient.h"
 
 #include <stdexcept>
+#include <string>
 
 #include <sys/select.h>
 #include <sys/socket.h>
+#include <unistd.h>
 
 #include "tPtp4lDefaultDataSetMgmtTlv.h"
 #include "tPtp4lParentDataSetMgmtTlv.h"
@@ -26,7 +28,9 @@ void check(bool holds) {
 } // namespace
 
 BareClient::BareClient(const std::string& daemon, std::uint16_t ports)
-    : Client("bare client"), daemon_(daemon) {
+    : Client("bare client"),
+      socket_("./bareClientId." + std::to_string(getpid())),
+      daemon_(daemon) {
     prepare<tPtp4lTimeStatusMgmtTlv>(1);
     prepare<tPtp4lParentDataSetMgmtTlv>(1);
     prepare<tPtp4lDefaultDataSetMgmtTlv>(1);

@@ -27,7 +27,8 @@ private:
 
     void receive() const;
 
-    DatagramSocket socket_{"bare"};
+    /// Its path is as long as the fetch's: the daemon looks it up for each answer.
+    DatagramSocket socket_;
     zekelVantel::tUdsMsgAddress daemon_;
     std::vector<Request> requests_;
 };

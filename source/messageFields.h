@@ -277,6 +277,18 @@ std::uint32_t sizeOfFields(const Fields& fields) {
     return octets;
 }
 
+/// Reads the fields of an object that the end cuts. Kept out of the way of those that are whole.
+template <typename Fields>
+[[gnu::cold]] void readUpToEnd(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
+    Fields::visitFields(fields, tFieldReader(buffer, status));
+}
+
+/// Writes the fields of an object that the capacity cuts.
+template <typename Fields>
+[[gnu::cold]] void writeUpToEnd(const Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
+    Fields::visitFields(fields, tFieldWriter(buffer, status));
+}
+
 /// Reads all fields, if they are there to the last octet.
 template <typename Fields>
 bool readAtOnce(Fields& fields, tMsgBuffer& buffer, const zeerr::Status& status) {
@@ -293,7 +305,7 @@ bool readAtOnce(Fields& fields, tMsgBuffer& buffer, const zeerr::Status& status)
 template <typename Fields>
 void readEachField(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status) {
     if (!readAtOnce(fields, buffer, status)) {
-        Fields::visitFields(fields, tFieldReader(buffer, status));
+        readUpToEnd(fields, buffer, status);
     }
 }
 
@@ -304,7 +316,11 @@ void readAllOrNothing(Fields& fields, tMsgBuffer& buffer, zeerr::Status& status)
         return;
     }
     Fields whole;
-    Fields::visitFields(whole, tFieldReader(buffer, status));
+    if constexpr (isVariable<Fields>) {
+        Fields::visitFields(whole, tFieldReader(buffer, status));
+    } else {
+        readUpToEnd(whole, buffer, status);
+    }
     if (!zeerr::isError(status)) {
         fields = std::move(whole);
     }
@@ -315,10 +331,12 @@ void writeFields(const Fields& fields, tMsgBuffer& buffer, zeerr::Status& status
     if constexpr (!isVariable<Fields>) {
         if (std::uint8_t* octets = buffer.append(sizeOfFields(fields), status)) {
             Fields::visitFields(fields, tWholeWriter(octets));
-            return;
+        } else {
+            writeUpToEnd(fields, buffer, status);
         }
+    } else {
+        Fields::visitFields(fields, tFieldWriter(buffer, status));
     }
-    Fields::visitFields(fields, tFieldWriter(buffer, status));
 }
 
 } // namespace zekelVantel

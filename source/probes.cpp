@@ -15,7 +15,9 @@
 #endif
 #define VANTEL_EVENT(name, format, ...)                                                            \
     VANTEL_PROBE_POINT(name, __VA_ARGS__);                                                         \
-    zesdbg::trace(levelEvent, {"probes", __LINE__, "\n"}, format, __VA_ARGS__)
+    if (zesdbg::isTraced(levelEvent)) {                                                            \
+        zesdbg::trace(levelEvent, {"probes", __LINE__, "\n"}, format, __VA_ARGS__);                \
+    }
 
 namespace zekelVantel {
 

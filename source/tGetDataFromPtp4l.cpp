@@ -18,7 +18,9 @@ std::int32_t tGetDataFromPtp4l::fetch(tTimeStatus& timeStatus, tPtp4lMetaData& m
     try {
         openOnDemand();
         timeStatus = tTimeStatus();
-        timeStatus = getSingle<tPtp4lTimeStatusMgmtTlv>();
+        tPtp4lTimeStatusMgmtTlv answer;
+        getSingle(answer);
+        timeStatus = answer.data();
         fetchMetaData(metaData);
         return 0;
     } catch (...) {
@@ -41,25 +43,24 @@ void tGetDataFromPtp4l::openOnDemand() {
 }
 
 void tGetDataFromPtp4l::fetchMetaData(tPtp4lMetaData& metaData) {
-    const tParentDataSet parent = getSingle<tPtp4lParentDataSetMgmtTlv>();
-    const tDefaultDataSet local = getSingle<tPtp4lDefaultDataSetMgmtTlv>();
-    const auto portDataSets = getFromPorts<tPtp4lPortDataSetMgmtTlv>(local.numberPorts);
-    const auto portDataSetsNp = getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(local.numberPorts);
-    const auto portProperties = getPortProperties(local.numberPorts);
+    tPtp4lParentDataSetMgmtTlv parent;
+    tPtp4lDefaultDataSetMgmtTlv local;
+    getSingle(parent);
+    getSingle(local);
+    const auto portDataSets = getFromPorts<tPtp4lPortDataSetMgmtTlv>(local.numberPorts());
+    const auto portDataSetsNp = getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(local.numberPorts());
+    const auto portProperties = getPortProperties(local.numberPorts());
     zeerr::LocalStatus status;
-    metaData.takeGrandmaster(parent);
-    metaData.takeLocalClock(local);
+    metaData.takeGrandmaster(parent.data());
+    metaData.takeLocalClock(local.data());
     metaData.takePorts(portDataSets, portDataSetsNp, portProperties, status);
     zeerr::throwIfError(status);
 }
 
-template <typename Tlv>
-typename Tlv::Data tGetDataFromPtp4l::getSingle() {
+void tGetDataFromPtp4l::getSingle(tPtpMgmtTlv& answer) {
     zeerr::LocalStatus status;
-    Tlv tlv;
-    node_.getSingle(interface_, remoteAddress_, tlv, status);
+    node_.getSingle(interface_, remoteAddress_, answer, status);
     zeerr::throwIfError(status);
-    return tlv.data();
 }
 
 template <typename Tlv>

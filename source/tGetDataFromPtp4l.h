@@ -31,8 +31,7 @@ private:
     void openOnDemand();
     void fetchMetaData(tPtp4lMetaData& metaData);
 
-    template <typename Tlv>
-    typename Tlv::Data getSingle();
+    void getSingle(tPtpMgmtTlv& answer);
 
     template <typename Tlv>
     std::vector<typename Tlv::Data> getFromPorts(std::uint16_t numberPorts);

@@ -79,9 +79,9 @@ private:
     template <typename Integer>
     bool writeAtOnce(Integer octets, const zeerr::Status& status);
 
-    static void reportTooLong(zeerr::Status& status);
-    static void reportReadPastEnd(zeerr::Status& status);
-    static void reportWritePastEnd(zeerr::Status& status);
+    [[gnu::cold]] static void reportTooLong(zeerr::Status& status);
+    [[gnu::cold]] static void reportReadPastEnd(zeerr::Status& status);
+    [[gnu::cold]] static void reportWritePastEnd(zeerr::Status& status);
 
     std::array<std::uint8_t, maximumLength> data_{};
     std::uint32_t length_ = 0;

@@ -1,7 +1,9 @@
 #include "tPtp4lMetaData.h"
 
+#include <algorithm>
 #include <array>
 #include <initializer_list>
+#include <map>
 #include <tuple>
 #include <utility>
 
@@ -151,16 +153,36 @@ void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
         zeerr::setError(status, zeerr::site::portListsDiffer);
         return;
     }
+    ports_.reserve(portDataSets.size());
     for (std::size_t i = 0; i < portDataSets.size(); ++i) {
         const tPortDataSet& dataSet = portDataSets[i];
-        ports_.insert_or_assign(ports_.end(), dataSet.portIdentity.portNumber(),
-                                tPortMetaData{portStateName(dataSet.portState),
-                                              portDataSetsNp[i].asCapable != 0 ? "true" : "false",
-                                              dataSet.logAnnounceInterval, dataSet.logSyncInterval,
-                                              dataSet.logMinPdelayReqInterval,
-                                              portDataSetsNp[i].neighborPropDelayThresh,
-                                              portProperties[i].interface.text()});
+        const tPortDataSetNp& dataSetNp = portDataSetsNp[i];
+        tPortMetaData& port =
+            ports_.emplace_back(dataSet.portIdentity.portNumber(), tPortMetaData()).second;
+        port.portState = portStateName(dataSet.portState);
+        port.asCapable = dataSetNp.asCapable != 0 ? std::string_view("true") : "false";
+        port.logAnnounceInterval = dataSet.logAnnounceInterval;
+        port.logSyncInterval = dataSet.logSyncInterval;
+        port.logPdelayInterval = dataSet.logMinPdelayReqInterval;
+        port.neighborPropDelayThreshold = dataSetNp.neighborPropDelayThresh;
+        port.interface = portProperties[i].interface.text();
     }
+    sortPorts();
+}
+
+void tPtp4lMetaData::sortPorts() {
+    const auto areOutOfOrder = [](const tNumberedPort& left, const tNumberedPort& right) {
+        return left.first >= right.first;
+    };
+    // ptp4l answers in this order: mostly there is nothing to do.
+    if (std::adjacent_find(ports_.begin(), ports_.end(), areOutOfOrder) == ports_.end()) {
+        return;
+    }
+    std::map<std::uint16_t, tPortMetaData> sorted;
+    for (auto& [number, port] : ports_) {
+        sorted.insert_or_assign(number, std::move(port));
+    }
+    ports_.assign(sorted.begin(), sorted.end());
 }
 
 bool tPtp4lMetaData::operator==(const tPtp4lMetaData& other) const {

@@ -2,9 +2,9 @@
 #pragma once
 
 #include <cstdint>
-#include <map>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "errors/Status.h"
@@ -57,6 +57,10 @@ public:
     std::string toJson() const;
 
 private:
+    using tNumberedPort = std::pair<std::uint16_t, tPortMetaData>;
+
+    void sortPorts();
+
     tPtpClockIdentity gmClockId_;
     std::uint8_t gmClockClass_ = 0;
     std::string_view gmClockAccuracy_ = "ACCURACY_UNKNOWN";
@@ -70,7 +74,7 @@ private:
     std::uint8_t priority1_ = 0;
     std::uint8_t priority2_ = 0;
     std::uint8_t domainNumber_ = 0;
-    std::map<std::uint16_t, tPortMetaData> ports_; ///< by portNumber
+    std::vector<tNumberedPort> ports_; ///< by portNumber, each once
 };
 
 } // namespace zekelVantel

@@ -9,17 +9,15 @@ tPtpMgmtMsg::tPtpMgmtMsg() {
 }
 
 void tPtpMgmtMsg::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
-    tPtpMsgHeader::deserialize(buffer, status);
-    readEachField(body_, buffer, status);
+    readEachField(*this, buffer, status);
 }
 
 void tPtpMgmtMsg::serialize(tMsgBuffer& buffer, zeerr::Status& status) const {
-    tPtpMsgHeader::serialize(buffer, status);
-    writeFields(body_, buffer, status);
+    writeFields(*this, buffer, status);
 }
 
 std::uint32_t tPtpMgmtMsg::size() const {
-    return tPtpMsgHeader::size() + sizeOfFields(body_);
+    return sizeOfFields(*this);
 }
 
 } // namespace zekelVantel

@@ -19,32 +19,30 @@ public:
     void serialize(tMsgBuffer& buffer, zeerr::Status& status) const override;
     std::uint32_t size() const override;
 
-    const tPtpPortIdentity& targetPortIdentity() const { return body_.targetPortIdentity; }
-    std::uint8_t startingBoundaryHops() const { return body_.startingBoundaryHops; }
-    std::uint8_t boundaryHops() const { return body_.boundaryHops; }
-    std::uint8_t actionField() const { return body_.actionField; }
+    const tPtpPortIdentity& targetPortIdentity() const { return targetPortIdentity_; }
+    std::uint8_t startingBoundaryHops() const { return startingBoundaryHops_; }
+    std::uint8_t boundaryHops() const { return boundaryHops_; }
+    std::uint8_t actionField() const { return actionField_; }
 
-    void setTargetPortIdentity(const tPtpPortIdentity& value) { body_.targetPortIdentity = value; }
-    void setStartingBoundaryHops(std::uint8_t value) { body_.startingBoundaryHops = value; }
-    void setBoundaryHops(std::uint8_t value) { body_.boundaryHops = value; }
+    void setTargetPortIdentity(const tPtpPortIdentity& value) { targetPortIdentity_ = value; }
+    void setStartingBoundaryHops(std::uint8_t value) { startingBoundaryHops_ = value; }
+    void setBoundaryHops(std::uint8_t value) { boundaryHops_ = value; }
     /// The whole octet is kept and written.
-    void setActionField(std::uint8_t value) { body_.actionField = value; }
+    void setActionField(std::uint8_t value) { actionField_ = value; }
+
+    template <typename Self, typename Visitor>
+    static void visitFields(Self& self, Visitor visit) {
+        tPtpMsgHeader::visitFields(self, visit);
+        visit(self.targetPortIdentity_, self.startingBoundaryHops_, self.boundaryHops_,
+              self.actionField_);
+        visit.reserved(1);
+    }
 
 private:
-    struct Body {
-        tPtpPortIdentity targetPortIdentity;
-        std::uint8_t startingBoundaryHops = 0;
-        std::uint8_t boundaryHops = 0;
-        std::uint8_t actionField = actionGet;
-
-        template <typename Self, typename Visitor>
-        static void visitFields(Self& self, Visitor visit) {
-            visit(self.targetPortIdentity, self.startingBoundaryHops, self.boundaryHops,
-                  self.actionField);
-            visit.reserved(1);
-        }
-    };
-    Body body_;
+    tPtpPortIdentity targetPortIdentity_;
+    std::uint8_t startingBoundaryHops_ = 0;
+    std::uint8_t boundaryHops_ = 0;
+    std::uint8_t actionField_ = actionGet;
 };
 
 } // namespace zekelVantel

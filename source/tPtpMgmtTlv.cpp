@@ -5,22 +5,20 @@
 namespace zekelVantel {
 
 tPtpMgmtTlv::tPtpMgmtTlv(tManagementId managementId, std::uint32_t dataSize)
-    : head_{static_cast<std::uint16_t>(managementId)} {
+    : managementId_(static_cast<std::uint16_t>(managementId)) {
     setLengthField(tPtpMgmtTlv::size() - uncounted + dataSize);
 }
 
 void tPtpMgmtTlv::deserialize(tMsgBuffer& buffer, zeerr::Status& status) {
-    tPtpTlv::deserialize(buffer, status);
-    readEachField(head_, buffer, status);
+    readEachField(*this, buffer, status);
 }
 
 void tPtpMgmtTlv::serialize(tMsgBuffer& buffer, zeerr::Status& status) const {
-    tPtpTlv::serialize(buffer, status);
-    writeFields(head_, buffer, status);
+    writeFields(*this, buffer, status);
 }
 
 std::uint32_t tPtpMgmtTlv::size() const {
-    return tPtpTlv::size() + sizeOfFields(head_);
+    return sizeOfFields(*this);
 }
 
 } // namespace zekelVantel

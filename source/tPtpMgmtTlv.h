@@ -29,22 +29,20 @@ public:
     void serialize(tMsgBuffer& buffer, zeerr::Status& status) const override;
     std::uint32_t size() const override;
 
-    std::uint16_t managementId() const { return head_.managementId; }
+    std::uint16_t managementId() const { return managementId_; }
+
+    template <typename Self, typename Visitor>
+    static void visitFields(Self& self, Visitor visit) {
+        tPtpTlv::visitFields(self, visit);
+        visit(self.managementId_);
+    }
 
 protected:
     /// @param dataSize octets of the data field, which the lengthField counts.
     tPtpMgmtTlv(tManagementId managementId, std::uint32_t dataSize);
 
 private:
-    struct Head {
-        std::uint16_t managementId = 0;
-
-        template <typename Self, typename Visitor>
-        static void visitFields(Self& self, Visitor visit) {
-            visit(self.managementId);
-        }
-    };
-    Head head_;
+    std::uint16_t managementId_ = 0;
 };
 
 } // namespace zekelVantel

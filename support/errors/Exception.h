@@ -44,11 +44,12 @@ public:
 
 /// Records an error in a status that has none yet: code, constant, source location, component and,
 /// if given, "additionalInfo". A status that holds an error stays as it is.
-void setError(Status& status, const ErrorSite& site, const char* additionalInfo = nullptr);
+[[gnu::cold]] void setError(Status& status, const ErrorSite& site,
+                            const char* additionalInfo = nullptr);
 
 /// As setError, with an "additionalInfo" formatted printf-style.
-[[gnu::format(printf, 3, 4)]] void setErrorWithInfo(Status& status, const ErrorSite& site,
-                                                    const char* format, ...);
+[[gnu::cold, gnu::format(printf, 3, 4)]] void
+setErrorWithInfo(Status& status, const ErrorSite& site, const char* format, ...);
 
 /// Throws a zeerr::Exception with the error.
 [[noreturn]] void throwError(const ErrorSite& site);

@@ -56,7 +56,12 @@ std::uint32_t textLength(const Status& status);
 class LocalStatus : public Status {
 public:
     LocalStatus() : Status(Status{0, 0, &defaultResize, nullptr}) {}
-    ~LocalStatus() { release(*this); }
+    ~LocalStatus() {
+        // Mostly there is no text, and no host put an operation of its own here.
+        if (json != nullptr || resize != &defaultResize) {
+            release(*this);
+        }
+    }
     LocalStatus(const LocalStatus&) = delete;
     LocalStatus& operator=(const LocalStatus&) = delete;
 };

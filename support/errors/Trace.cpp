@@ -41,7 +41,7 @@ void writeToStandardError(const char* line) {
 Settings settings{0x1000, 10, 32, 4, defaultPrefix, &appendFormatted, &writeToStandardError};
 
 void trace(std::uint32_t level, const Source& source, const char* format, ...) {
-    if (level < settings.threshold) {
+    if (!isTraced(level)) {
         return;
     }
     zesdbg_VarLineToBuffer line;

@@ -36,6 +36,11 @@ struct Settings {
 };
 extern Settings settings;
 
+/// Whether lines of that level are written.
+inline bool isTraced(std::uint32_t level) {
+    return level >= settings.threshold;
+}
+
 /// Writes one line: "[component|file|line] ", the message, the source's suffix.
 [[gnu::format(printf, 3, 4)]] void trace(std::uint32_t level, const Source& source,
                                          const char* format, ...);
