@@ -244,4 +244,13 @@ TEST(LocalStatusTest, ReleasesItsTextWithItsOwnOperation) {
     EXPECT_EQ(requestedSizes, (std::vector<std::uint32_t>{8, 0}));
 }
 
+TEST(LocalStatusTest, AsksTheOperationOfAHostThoughThereIsNoText) {
+    requestedSizes.clear();
+    {
+        zeerr::LocalStatus status;
+        status.resize = &countingResize;
+    }
+    EXPECT_EQ(requestedSizes, std::vector<std::uint32_t>{0});
+}
+
 } // namespace
