@@ -15,7 +15,7 @@ set -euo pipefail
 build=(cmake ninja-build g++ make pkg-config libcjson-dev libsystemd-dev libboost-dev nlohmann-json3-dev
   libcli11-dev libfmt-dev prometheus-cpp-dev systemtap-sdt-dev)
 daemon=(linuxptp iproute2 mount util-linux procps)
-tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev binutils locales
+tests=("${build[@]}" "${daemon[@]}" libgtest-dev libgmock-dev libbenchmark-dev librapidcheck-dev binutils locales
   gnuplot-nox libxml2-utils mandoc groff-base)
 # chrony would take the place of another time daemon, and prometheus serves at once: nobody gets them who only
 # wants to build.
@@ -28,7 +28,8 @@ fi
 # Of another architecture, for the library, and for all else. Of prometheus-cpp the libraries alone: what it
 # is developed with would bring curl's, and with that the C library's. Its headers are those of any architecture.
 library=(libc6 libstdc++6 libcjson-dev libgtest-dev libgmock-dev)
-all_else=(libsystemd-dev libfmt-dev libbenchmark-dev libprometheus-cpp-core1.0 libprometheus-cpp-pull1.0)
+all_else=(libsystemd-dev libfmt-dev libbenchmark-dev librapidcheck-dev libprometheus-cpp-core1.0
+  libprometheus-cpp-pull1.0)
 bench=("${tests[@]}" valgrind)
 debs=("${build[@]}" devscripts dpkg-dev gzip lintian mmdebstrap systemd-container uidmap)
 mutants=("${tests[@]}" clang python3-clang)

@@ -16,13 +16,8 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
-#include "support/NextFunction.h"
+#include "support/NextThreadCreation.h"
 #include "support/OwnAllocations.h"
-
-// A sanitizer's, when there is one: it must know of every thread.
-extern "C" [[gnu::weak]] int __interceptor_pthread_create(pthread_t* thread,
-                                                          const pthread_attr_t* attributes,
-                                                          void* (*start)(void*), void* argument);
 
 namespace {
 
@@ -112,13 +107,6 @@ int sleepBriefly(const timespec* duration, nanoseconds end, timespec* rest) {
     return result;
 }
 
-using CreateThread = int(pthread_t*, const pthread_attr_t*, void* (*)(void*), void*);
-
-CreateThread* nextCreateThread() {
-    return __interceptor_pthread_create != nullptr ? &__interceptor_pthread_create
-                                                   : nextFunction<CreateThread>("pthread_create");
-}
-
 } // namespace
 
 extern "C" {
@@ -156,7 +144,7 @@ extern "C" {
     if (threadsAllowed != unlimited && threadsAllowed-- <= 0) {
         return EAGAIN;
     }
-    return nextCreateThread()(thread, attributes, start, argument);
+    return nextThreadCreation()(thread, attributes, start, argument);
 }
 
 } // extern "C"
