@@ -1,5 +1,6 @@
-// Which mutant is on: the environment's VANTEL_MUTANT is its number. The file that VANTEL_MUTANTS_REACHED names has an
-// octet for each, which becomes 1 when one is reached. No function is called that a test stands in for.
+// Which mutant is on: the environment's VANTEL_MUTANT is its number. The file that
+// VANTEL_MUTANTS_REACHED names has an octet for each, which becomes 1 when one is reached. No
+// function is called that a test stands in for.
 #pragma once
 
 #include <sys/syscall.h>
@@ -17,7 +18,8 @@ struct VantelMutants {
         if (const char* const path = getenv("VANTEL_MUTANTS_REACHED")) {
             // Read and written, closed on exec; mapped, shared, the same.
             const long file = syscall(SYS_openat, -100L, path, 02000002);
-            reached = reinterpret_cast<char*>(syscall(SYS_mmap, nullptr, 1L << 20, 3L, 1L, file, 0L));
+            reached =
+                reinterpret_cast<char*>(syscall(SYS_mmap, nullptr, 1L << 20, 3L, 1L, file, 0L));
             syscall(SYS_close, file);
         }
     }

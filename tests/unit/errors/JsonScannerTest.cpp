@@ -79,8 +79,7 @@ TEST(JsonScannerTest, WhatIsNotWellFormedDoesNotScan) {
           R"(["a" "b"])", R"([[]1])",    R"({"a":1;})",  R"({'a':1})",     R"({"a":"b'})",
           R"([1:2])",     R"({"a":{]})", R"([[1})",      R"({null:1})",    R"([}])",
           R"([/**/])",    R"({[]:1})",   R"({"a","b"})", R"([1,,2])",      R"([")",
-          R"([1})",       R"({"a":1])",  R"([})",        R"({])",
-          R"({:1})"}) {
+          R"([1})",       R"({"a":1])",  R"([})",        R"({])",          R"({:1})"}) {
         EXPECT_EQ(closingIn(text), none) << text;
     }
 }
@@ -135,8 +134,8 @@ TEST(JsonScannerTest, ZerosBelongToStringsOnly) {
 }
 
 TEST(JsonScannerTest, NumbersScan) {
-    for (const std::string number : {"0", "9", "-0", "1", "-1", "12345678901234567890", "0.5", "-12.75",
-                                     "1e5", "1E5", "1e+5", "1.5E-300", "-2147483648"}) {
+    for (const std::string number : {"0", "9", "-0", "1", "-1", "12345678901234567890", "0.5",
+                                     "-12.75", "1e5", "1E5", "1e+5", "1.5E-300", "-2147483648"}) {
         EXPECT_EQ(closingIn("[" + number + "]"), endOf("[" + number + "]")) << number;
         EXPECT_EQ(closingIn("{\"a\":" + number + "}"), endOf("{\"a\":" + number + "}")) << number;
     }

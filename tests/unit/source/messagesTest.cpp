@@ -86,7 +86,8 @@ TEST_P(MessageTest, WritesTheOctetsThatHaveRoomUntilEndOfData) {
         message->serialize(buffer, status);
         EXPECT_EQ(status.code, endOfData);
         EXPECT_EQ(buffer.getLength(), 1500U);
-        EXPECT_EQ(Octets(buffer.data() + 1500 - room, buffer.data() + 1500), first(room, next)) << room;
+        EXPECT_EQ(Octets(buffer.data() + 1500 - room, buffer.data() + 1500), first(room, next))
+            << room;
     }
 }
 
