@@ -97,7 +97,7 @@ TEST_F(ProtocolConfigSystemCallsTest, WriteThatTakesNothingIsTheLast) {
 }
 
 TEST_F(ProtocolConfigSystemCallsTest, WithoutMemoryForALocaleTheHostsStays) {
-    const locale_t ofThread = newlocale(LC_ALL_MASK, "C.UTF-8", nullptr);
+    const locale_t ofThread = duplocale(LC_GLOBAL_LOCALE);
     ASSERT_NE(ofThread, nullptr);
     uselocale(ofThread);
     isLocaleRefused = true;
