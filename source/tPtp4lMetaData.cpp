@@ -171,7 +171,7 @@ void tPtp4lMetaData::takePorts(const std::vector<tPortDataSet>& portDataSets,
 }
 
 void tPtp4lMetaData::sortPorts() {
-    const auto areOutOfOrder = [](const tNumberedPort& left, const tNumberedPort& right) {
+    const auto areOutOfOrder = [](const NumberedPort& left, const NumberedPort& right) {
         return left.first >= right.first;
     };
     // ptp4l answers in this order: mostly there is nothing to do.

@@ -57,7 +57,7 @@ public:
     std::string toJson() const;
 
 private:
-    using tNumberedPort = std::pair<std::uint16_t, tPortMetaData>;
+    using NumberedPort = std::pair<std::uint16_t, tPortMetaData>;
 
     void sortPorts();
 
@@ -74,7 +74,7 @@ private:
     std::uint8_t priority1_ = 0;
     std::uint8_t priority2_ = 0;
     std::uint8_t domainNumber_ = 0;
-    std::vector<tNumberedPort> ports_; ///< by portNumber, each once
+    std::vector<NumberedPort> ports_; ///< by portNumber, each once
 };
 
 } // namespace zekelVantel
