@@ -50,5 +50,5 @@ list_left() { # what, option of gcovr...
 list_left lines
 list_left branches --branches
 echo
-gcovr --add-tracefile "$report/coverage.json" --txt /dev/null --print-summary --fail-under-line 100 \
+gcovr --add-tracefile "$report/coverage.json" --txt "$report/summary.txt" --print-summary --fail-under-line 100 \
   --fail-under-branch 100
