@@ -176,6 +176,7 @@ void LiveHost::startWithoutThread(const Model& model, int allowed) {
     Session session;
     session.fifoWasThere = model.hasFifo;
     session.fifoWasMissing = !model.hasFifo;
+    session.ownPathWasTaken = model.ownPathIsTaken;
     expectThreadsCalls(host_.takeOthers(), session);
 }
 
