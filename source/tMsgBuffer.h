@@ -221,7 +221,7 @@ inline void tMsgBuffer::writeU16(std::uint16_t value, zeerr::Status& status) {
         return;
     }
     writeU8(static_cast<std::uint8_t>(value >> 8), status);
-    writeU8(static_cast<std::uint8_t>(value & 0xff), status);
+    writeU8(static_cast<std::uint8_t>(value), status);
 }
 
 inline void tMsgBuffer::writeU32(std::uint32_t value, zeerr::Status& status) {
@@ -229,7 +229,7 @@ inline void tMsgBuffer::writeU32(std::uint32_t value, zeerr::Status& status) {
         return;
     }
     writeU16(static_cast<std::uint16_t>(value >> 16), status);
-    writeU16(static_cast<std::uint16_t>(value & 0xffff), status);
+    writeU16(static_cast<std::uint16_t>(value), status);
 }
 
 inline void tMsgBuffer::writeU64(std::uint64_t value, zeerr::Status& status) {
@@ -237,7 +237,7 @@ inline void tMsgBuffer::writeU64(std::uint64_t value, zeerr::Status& status) {
         return;
     }
     writeU32(static_cast<std::uint32_t>(value >> 32), status);
-    writeU32(static_cast<std::uint32_t>(value & 0xffffffff), status);
+    writeU32(static_cast<std::uint32_t>(value), status);
 }
 
 } // namespace zekelVantel

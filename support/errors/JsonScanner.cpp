@@ -14,7 +14,6 @@ public:
     /// @return false when the text does not go on with an object or array that scans. The rest then
     ///         begins anywhere, otherwise behind the closing bracket.
     bool container(int depth) {
-        skipBlanks();
         if (depth > deepest) {
             return false;
         }

@@ -124,14 +124,16 @@ TEST(DefaultResizeTest, SizeWithTheTopBitFails) {
     }
 }
 
-TEST(DefaultResizeTest, SmallerSizeChangesNothing) {
+TEST(DefaultResizeTest, SizeThatThereIsChangesNothing) {
     zeerr::LocalStatus status;
     ASSERT_TRUE(zeerr::defaultResize(&status, 2000));
     std::strcpy(status.json, "{\"a\":1}");
     const char* const text = status.json;
-    EXPECT_TRUE(zeerr::defaultResize(&status, 1));
-    EXPECT_EQ(status.json, text);
-    EXPECT_EQ(status.capacity, 2048U);
+    for (const std::uint32_t size : {1U, 2048U}) {
+        EXPECT_TRUE(zeerr::defaultResize(&status, size));
+        EXPECT_EQ(status.json, text);
+        EXPECT_EQ(status.capacity, 2048U);
+    }
     EXPECT_STREQ(status.json, "{\"a\":1}");
 }
 
@@ -160,6 +162,16 @@ TEST(ResizeTest, OperationThatDoesNotGrowFailsOnAnExistingText) {
     EXPECT_TRUE(zeerr::resize(status, 8));
     EXPECT_FALSE(zeerr::resize(status, 9));
     EXPECT_STREQ(status.json, "{}");
+}
+
+bool claimingResize(zeerr::Status* status, std::uint32_t size) {
+    status->capacity = size;
+    return true;
+}
+
+TEST(ResizeTest, OperationThatOnlyClaimsToGiveMemoryFails) {
+    zeerr::Status status{0, 0, &claimingResize, nullptr};
+    EXPECT_FALSE(zeerr::resize(status, 8));
 }
 
 TEST(ResizeTest, UnsetMemoryBecomesAnEmptyObject) {
