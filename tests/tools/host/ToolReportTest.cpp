@@ -105,7 +105,7 @@ protected:
         Words command{HOST_TOOL, "report"};
         command.insert(command.end(), words.begin(), words.end());
         Child child(command, environment);
-        const int status = child.wait();
+        const int status = child.wait(std::chrono::minutes(1));
         return {status, child.output(), child.errors()};
     }
 
