@@ -95,7 +95,7 @@ protected:
     std::function<void()> onPoll = [] {};
 
     SteeredClock clock;
-    int pairs = 0;                 ///< that were followed
+    int pairs = 0;                 ///< that were followed in that time
     nanoseconds greatestChange{0}; ///< of the offset, from one of them to the next
 
 private:
@@ -125,7 +125,8 @@ private:
         }
         clock.steer(servo_.take(offset, last_ ? local - last_->local : nanoseconds(0)));
         last_ = {local, offset};
-        ++pairs;
+        // Polls go on until the plug-in is stopped.
+        pairs += hasEnded_ ? 0 : 1;
     }
 
     struct Pair {
