@@ -14,13 +14,9 @@ public:
     /// @return false when the text does not go on with an object or array that scans. The rest then
     ///         begins anywhere, otherwise behind the closing bracket.
     bool container(int depth) {
-        if (depth > deepest) {
-            return false;
-        }
-        if (take('{')) {
-            return elements('}', depth, true);
-        }
-        return take('[') && elements(']', depth, false);
+        const bool named = take('{');
+        return (named || take('[')) && depth <= deepest &&
+               elements(named ? '}' : ']', depth, named);
     }
 
 private:

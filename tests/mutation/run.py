@@ -164,7 +164,9 @@ def main():
     chosen = [mutant for index, mutant in enumerate(mutants) if index % parts == part - 1]
     if given.files:
         chosen = [mutant for mutant in chosen if mutant["file"] in given.files]
-    todo = [mutant for mutant in chosen if known.get(mutant["key"], "lived") in ("lived", "unreached")]
+    judged = judged_by(given.judged)
+    todo = [mutant for mutant in chosen
+            if known.get(mutant["key"], "lived") in ("lived", "unreached") and shown(mutant) not in judged]
 
     if todo:
         tests = find_all_reached(find_tests(given.build), given.results.with_name("reached.json"), jobs)
@@ -173,7 +175,7 @@ def main():
                 stage = [test for test in tests if test.label in labels]
                 run_stage(todo, stage, jobs * each, known, results)
                 todo = [mutant for mutant in todo if known[mutant["key"]] in ("lived", "unreached")]
-    sys.exit(report(chosen, known, judged_by(given.judged)))
+    sys.exit(report(chosen, known, judged))
 
 
 def run_stage(mutants, tests, jobs, known, results):
@@ -198,7 +200,7 @@ def report(mutants, known, judged):
     counts = collections.defaultdict(collections.Counter)
     status = 0
     for mutant in mutants:
-        result = known[mutant["key"]]
+        result = known.get(mutant["key"], "lived")
         if result in ("lived", "unreached") and shown(mutant) in judged:
             result = "judged"
         if result in ("lived", "unreached"):

@@ -13,24 +13,25 @@
 
 namespace {
 
-/// The environment variable LOCPATH while it lives.
-class LocalePath {
+/// The value of an environment variable while it lives.
+class Environment {
 public:
-    explicit LocalePath(const std::string& path) {
-        if (const char* const former = std::getenv("LOCPATH")) {
+    Environment(const char* name, const std::string& value) : name_(name) {
+        if (const char* const former = std::getenv(name)) {
             former_ = former;
         }
-        setenv("LOCPATH", path.c_str(), 1);
+        setenv(name, value.c_str(), 1);
     }
-    ~LocalePath() { former_ ? setenv("LOCPATH", former_->c_str(), 1) : unsetenv("LOCPATH"); }
-    LocalePath(const LocalePath&) = delete;
-    LocalePath& operator=(const LocalePath&) = delete;
+    ~Environment() { former_ ? setenv(name_, former_->c_str(), 1) : unsetenv(name_); }
+    Environment(const Environment&) = delete;
+    Environment& operator=(const Environment&) = delete;
 
 private:
+    const char* name_;
     std::optional<std::string> former_;
 };
 
-/// The locale of a host: of its process, and then of the thread as well.
+/// The locale of a host: of its environment and process, and then of the thread as well.
 class ProtocolConfigLocaleTest : public ProtocolConfigFixture {
 protected:
     ~ProtocolConfigLocaleTest() override {
@@ -55,12 +56,13 @@ protected:
             if (std::system(command.c_str()) != 0) {
                 return false;
             }
-            const LocalePath path(folder.path());
+            const Environment path("LOCPATH", folder.path());
             if (std::setlocale(LC_ALL, name.c_str()) == nullptr) {
                 return false;
             }
         }
         ofThread = duplocale(LC_GLOBAL_LOCALE);
+        language_.emplace("LC_ALL", name);
         return true;
     }
 
@@ -70,6 +72,9 @@ protected:
     }
 
     locale_t ofThread = nullptr;
+
+private:
+    std::optional<Environment> language_;
 };
 
 constexpr char noLocaledef[] = "the locale is not installed, and localedef cannot make it";

@@ -116,6 +116,17 @@ TEST_F(PtpMetaDataPortsTest, LaterOfTwoAnswersWithTheSamePortNumberStays) {
     EXPECT_EQ(metaDataOf(situation), metaDataOf(expected));
 }
 
+TEST_F(PtpMetaDataPortsTest, LaterOfTwoAnswersInARowStays) {
+    PtpSituation situation;
+    addPort(situation, 1, "first");
+    addPort(situation, 1, "later");
+    addPort(situation, 2, "other");
+    PtpSituation expected;
+    addPort(expected, 1, "later");
+    addPort(expected, 2, "other");
+    EXPECT_EQ(metaDataOf(situation), metaDataOf(expected));
+}
+
 TEST_F(PtpMetaDataPortsTest, StateOfThePortPropertiesIsNotUsed) {
     PtpSituation situation;
     addPort(situation, 1);

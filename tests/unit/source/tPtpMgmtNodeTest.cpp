@@ -19,8 +19,8 @@ using namespace zekelVantel;
 
 namespace {
 
-constexpr char local[] = "local";
-constexpr char remote[] = "remote";
+constexpr char nodePath[] = "local";
+constexpr char daemonPath[] = "remote";
 
 /// A request up to its TLV.
 Octets head(const std::string& length, const std::string& sequence,
@@ -35,7 +35,7 @@ Octets head(const std::string& length, const std::string& sequence,
 class PtpMgmtNodeTest : public testing::Test {
 protected:
     void SetUp() override {
-        interface.open(local, status);
+        interface.open(nodePath, status);
         ASSERT_EQ(status.code, 0);
     }
 
@@ -53,8 +53,8 @@ protected:
     }
 
     TemporaryFolder folder;
-    DatagramSocket daemon{remote};
-    const tUdsMsgAddress remoteAddress{remote};
+    DatagramSocket daemon{daemonPath};
+    const tUdsMsgAddress remoteAddress{daemonPath};
     tUdsMsgInterface interface;
     tPtpMgmtNode node{tPtpPortIdentity(tPtpClockIdentity(), 1), 0};
     zeerr::LocalStatus status;
@@ -119,7 +119,8 @@ TEST_F(PtpMgmtNodeTest, CountingThePadOctetChangesNoRequestWithoutOne) {
 
 TEST_F(PtpMgmtNodeTest, SingleAnswerExchangeSendsTheSameRequest) {
     tPtp4lTimeStatusMgmtTlv tlv;
-    ASSERT_TRUE(daemon.sendTo(local, head("0068", "0000") + octets("0001 0034 C000") + Octets(50)));
+    ASSERT_TRUE(
+        daemon.sendTo(nodePath, head("0068", "0000") + octets("0001 0034 C000") + Octets(50)));
     node.getSingle(interface, remoteAddress, tlv, status);
     EXPECT_EQ(status.code, 0);
     EXPECT_EQ(request(), head("0068", "0000") + octets("0001 0034 C000") + Octets(50));
@@ -129,7 +130,7 @@ TEST_F(PtpMgmtNodeTest, OneRequestIsSentForAllPorts) {
     std::vector<tPortDataSetNp> answers;
     for (int port = 0; port < 3; ++port) {
         ASSERT_TRUE(
-            daemon.sendTo(local, head("003E", "0000") + octets("0001 000A C002") + Octets(8)));
+            daemon.sendTo(nodePath, head("003E", "0000") + octets("0001 000A C002") + Octets(8)));
     }
     node.getFromPorts<tPtp4lPortDataSetNpMgmtTlv>(interface, remoteAddress, 3, answers, status);
     EXPECT_EQ(request().size(), 62U);
@@ -221,7 +222,7 @@ TEST_F(PtpMgmtNodeTest, SendingStartsWithAClearBuffer) {
 TEST_F(PtpMgmtNodeTest, ReceivingStartsWithAClearBuffer) {
     tMsgBuffer buffer = received(Octets(1500, 0xEE));
     buffer.readU64(status);
-    ASSERT_TRUE(daemon.sendTo(local, head("0036", "ABCD") + octets("0001 0002 C0DE")));
+    ASSERT_TRUE(daemon.sendTo(nodePath, head("0036", "ABCD") + octets("0001 0002 C0DE")));
     tPtpMgmtMsg message;
     tPtpMgmtTlv tlv;
     tPtpMgmtNode::receiveResponse(interface, 1000, buffer, message, tlv, status);
@@ -240,7 +241,7 @@ TEST_F(PtpMgmtNodeTest, AskingOnAClosedInterfaceIsNotInitialized) {
 }
 
 TEST_F(PtpMgmtNodeTest, AskingWithAnErrorSendsAndReceivesNothing) {
-    ASSERT_TRUE(daemon.sendTo(local, octets("01")));
+    ASSERT_TRUE(daemon.sendTo(nodePath, octets("01")));
     status.code = -1;
     tPtp4lTimeStatusMgmtTlv tlv;
     std::vector<tPortDataSetNp> answers;
