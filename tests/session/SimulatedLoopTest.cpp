@@ -28,8 +28,8 @@ using std::chrono::seconds;
 /// Of each measurement.
 constexpr nanoseconds jitter{50};
 
-/// ThreadSanitizer takes a minute and more for an hour.
-#ifdef __SANITIZE_THREAD__
+/// With a sanitizer, an hour takes a minute and more.
+#if defined(__SANITIZE_THREAD__) || defined(__SANITIZE_ADDRESS__)
 constexpr minutes longTime{10};
 #else
 constexpr minutes longTime{60};
