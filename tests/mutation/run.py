@@ -130,11 +130,14 @@ def key(mutant, seen):
     """The same as long as its line is, wherever that is."""
     parts = tuple(mutant[part] for part in ("file", "text", "kind", "was", "becomes"))
     seen[parts] += 1
+    mutant["of alike"] = seen[parts]
     return json.dumps(parts + (seen[parts],))
 
 
 def shown(mutant, place=""):
-    return f"{mutant['file']}{place}: {mutant['text']} | {mutant['was']} -> {mutant['becomes'] or 'nothing'}"
+    """Those of equal lines of a file are told apart by their number."""
+    number = f" ({mutant['of alike']})" if mutant["of alike"] > 1 else ""
+    return f"{mutant['file']}{place}: {mutant['text']} | {mutant['was']} -> {mutant['becomes'] or 'nothing'}{number}"
 
 
 def judged_by(path):
