@@ -33,6 +33,14 @@ protected:
         return fifo.read(text, sizeof(text), status);
     }
 
+    /// Opens a FIFO, and closes its descriptor behind its back.
+    void openAndLose(tSharedFifo& fifo) {
+        const int lowestFree = dup(STDERR_FILENO);
+        ::close(lowestFree);
+        fifo.open(status);
+        ASSERT_EQ(::close(lowestFree), 0) << "that of the FIFO";
+    }
+
     void expectError(std::int32_t code, const std::string& constant, int line,
                      const std::string& info) {
         EXPECT_EQ(status.code, code);
@@ -260,11 +268,8 @@ TEST_F(SharedFifoFailuresTest, FailingUnlinkIsTracedOnly) {
 
 TEST_F(SharedFifoFailuresTest, FailingCloseIsTracedOnlyAndLeavesTheFifoClosed) {
     ASSERT_EQ(mkfifo("fifo", 0600), 0);
-    const int descriptor = dup(STDERR_FILENO);
-    ::close(descriptor);
     tSharedFifo fifo("./fifo", false, status);
-    fifo.open(status);
-    ASSERT_EQ(::close(descriptor), 0) << "the lowest free descriptor is that of the FIFO";
+    openAndLose(fifo);
     fifo.close();
     EXPECT_THAT(traced, StartsWith("[ vantel_bc|                     tSharedFifo|"));
     EXPECT_THAT(traced, EndsWith("] Failed closing shared FIFO: ./fifo, errno: 9 "
@@ -275,12 +280,9 @@ TEST_F(SharedFifoFailuresTest, FailingCloseIsTracedOnlyAndLeavesTheFifoClosed) {
 
 TEST_F(SharedFifoFailuresTest, EndOfAnOpenFifoTracesThatClosingFails) {
     ASSERT_EQ(mkfifo("fifo", 0600), 0);
-    const int descriptor = dup(STDERR_FILENO);
-    ::close(descriptor);
     {
         tSharedFifo fifo("./fifo", false, status);
-        fifo.open(status);
-        ASSERT_EQ(::close(descriptor), 0) << "the lowest free descriptor is that of the FIFO";
+        openAndLose(fifo);
     }
     EXPECT_THAT(traced, EndsWith("] Failed closing shared FIFO: ./fifo, errno: 9 "
                                  "(Bad file descriptor)\n"));
@@ -301,14 +303,11 @@ TEST_F(SharedFifoFailuresTest, AreTracedUpToTheirLevel) {
 
 TEST_F(SharedFifoFailuresTest, ClosingIsTracedUpToItsLevel) {
     ASSERT_EQ(mkfifo("fifo", 0600), 0);
-    const int descriptor = dup(STDERR_FILENO);
-    ::close(descriptor);
     for (const std::uint32_t threshold : {0x2000U, 0x2001U}) {
         traced.clear();
         zesdbg::settings.threshold = threshold;
         tSharedFifo fifo("./fifo", false, status);
-        fifo.open(status);
-        ASSERT_EQ(::close(descriptor), 0) << "the lowest free descriptor is that of the FIFO";
+        openAndLose(fifo);
         fifo.close();
         EXPECT_EQ(traced.empty(), threshold > 0x2000) << traced;
     }
