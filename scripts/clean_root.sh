@@ -53,3 +53,11 @@ in_clean_root() { # release, log, options of mmdebstrap and further mirrors...
   fi
   return "$status"
 }
+
+# Makes such a root with what is committed in its /project, where one hook does the work.
+project_in_clean_root() { # release, log, hook
+  local tar=$PWD/${2%.log}.tar
+  mkdir -p "${tar%/*}"
+  git archive --prefix project/ --output "$tar" HEAD
+  in_clean_root "$1" "$2" --variant=minbase --customize-hook="tar-in '$tar' /" --customize-hook="$3"
+}

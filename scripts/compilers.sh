@@ -83,14 +83,7 @@ case ${1-} in
 esac
 
 log=build/compilers-$1.log
-folder=$(mktemp -d)
-trap 'rm -rf "$folder"' EXIT
-chmod 755 "$folder"
-git archive --prefix project/ --output "$folder/project.tar" HEAD
-
-in_clean_root "$1" "$log" --variant=minbase \
-  --customize-hook="tar-in $folder/project.tar /" \
-  --customize-hook="$PWD/scripts/compilers.sh --hook \"\$1\" ${*:2}"
+project_in_clean_root "$1" "$log" "$PWD/scripts/compilers.sh --hook \"\$1\" ${*:2}"
 printf '\n'
 grep -E '^(passed|FAILED) ' "$log"
 if grep -q '^FAILED ' "$log"; then

@@ -30,14 +30,7 @@ esac
 shift
 
 log=build/release-test-$release${1:+-$1}.log
-folder=$(mktemp -d)
-trap 'rm -rf "$folder"' EXIT
-chmod 755 "$folder"
-git archive --prefix project/ --output "$folder/project.tar" HEAD
-
-in_clean_root "$release" "$log" --variant=minbase \
-  --customize-hook="tar-in $folder/project.tar /" \
-  --customize-hook="$PWD/scripts/release_test.sh --inside \"\$1\" ${*@Q}"
+project_in_clean_root "$release" "$log" "$PWD/scripts/release_test.sh --inside \"\$1\" ${*@Q}"
 if grep -E '^CMake .*Warning|: warning: ' "$log" | grep -v '^update-alternatives: '; then
   echo "release_test: these are warnings" >&2
   exit 1
