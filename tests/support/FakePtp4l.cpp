@@ -101,6 +101,23 @@ Writer perPort(const FakePtp4l::Request& request, unsigned number) {
     }
 }
 
+template <typename Take>
+void forEachAnswer(const FakePtp4l::Request& request, unsigned ports, const Take& take) {
+    switch (request.managementId()) {
+    case FakePtp4l::timeStatusNp:
+        return take(response(request, 0, timeStatus()));
+    case FakePtp4l::parentDataSet:
+        return take(response(request, 0, parent()));
+    case FakePtp4l::defaultDataSet:
+        return take(response(request, 0, defaults(ports)));
+    default:
+        break;
+    }
+    for (unsigned number = 1; number <= ports; ++number) {
+        take(response(request, number, perPort(request, number)));
+    }
+}
+
 /// Fills the data of an answer: octets, and zeros behind them.
 void setData(Octets& answer, const Writer& data) {
     const std::size_t size = answer.size();
@@ -173,20 +190,8 @@ void FakePtp4l::settle() const {
 }
 
 FakePtp4l::Answers FakePtp4l::answersTo(const Request& request, std::uint16_t ports) {
-    switch (request.managementId()) {
-    case timeStatusNp:
-        return {response(request, 0, timeStatus())};
-    case parentDataSet:
-        return {response(request, 0, parent())};
-    case defaultDataSet:
-        return {response(request, 0, defaults(ports))};
-    default:
-        break;
-    }
     Answers answers;
-    for (unsigned number = 1; number <= ports; ++number) {
-        answers.push_back(response(request, number, perPort(request, number)));
-    }
+    forEachAnswer(request, ports, [&](const Octets& answer) { answers.push_back(answer); });
     return answers;
 }
 
@@ -215,11 +220,13 @@ void FakePtp4l::answer(const Request& request) {
         script = script_;
         ports = ports_;
     }
+    const auto send = [&](const Octets& answer) { socket_.sendTo(request.source, answer); };
+    if (!script) {
+        // One by one, as a daemon does: nobody waits until ten thousand are made.
+        forEachAnswer(request, ports, send);
+        return;
+    }
     Answers answers = answersTo(request, ports);
-    if (script) {
-        script(request, answers);
-    }
-    for (const auto& octets : answers) {
-        socket_.sendTo(request.source, octets);
-    }
+    script(request, answers);
+    std::for_each(answers.begin(), answers.end(), send);
 }
