@@ -25,7 +25,7 @@ protected:
         ASSERT_TRUE(waitUntil([this] { return !deaths().empty(); }));
         expectOwnThreads(1);
         EXPECT_THAT(deaths(), SizeIs(1));
-        ASSERT_TRUE(waitForLog(failureLine(-52024)));
+        ASSERT_TRUE(waitForLog(failureLine(-52024), 2)); // The first is reported by then.
         EXPECT_THAT(qualities(), Contains(unreachable));
         EXPECT_EQ(metaData().back(), defaultMetaData);
     }

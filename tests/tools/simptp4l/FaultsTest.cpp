@@ -146,7 +146,7 @@ TEST_F(Simptp4lFault, FloodSendsEachAnswerManyTimes) {
 }
 
 TEST_F(Simptp4lFault, FloodOfAClientThatDoesNotReadIsDroppedAndLogged) {
-    start("on TIME_STATUS_NP times 1 do flood 10000\n");
+    start("on TIME_STATUS_NP times 1 do flood 2000\n");
     ASSERT_TRUE(client->send(requests::timeStatus()));
     const Client other(daemon->folder.path("other"), daemon->socketPath());
     EXPECT_EQ(other.ask(requests::parentDataSet()).size(), 2 * 86U);
