@@ -86,8 +86,8 @@ bool succeeded(Reader& reader, const Event& call, const char* failureLine) {
 }
 
 /// The log line, and the call with the same text.
-const Event& readMetaData(Reader& reader, const std::string& expected = "") {
-    const Event& log = reader.expect(What::log, line::metaData + expected);
+const Event& readMetaData(Reader& reader, const char* expected = "") {
+    const Event& log = reader.expect(What::log, std::string(line::metaData) + expected);
     reader.check(log.priority == LOG_INFO, "another priority");
     const Event& call = reader.expect(What::updateMetaData, expected);
     reader.check(line::metaData + call.text == log.text, "other metadata than was logged");

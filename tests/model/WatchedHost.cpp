@@ -1,19 +1,16 @@
 #include "WatchedHost.h"
 
 #include <algorithm>
-#include <cstdarg>
-#include <cstdio>
 #include <cstring>
 #include <ctime>
 #include <new>
 #include <stdexcept>
 #include <utility>
 
-#include <syslog.h>
-
 #include "FastWaits.h"
 #include "Questions.h"
 #include "Reasons.h"
+#include "support/LogFunctions.h"
 
 namespace {
 
@@ -32,9 +29,7 @@ bool isRecord(const double* quality, const double (&record)[ZEKEL_QUALITY_LENGTH
     return std::equal(quality, quality + ZEKEL_QUALITY_LENGTH, record);
 }
 
-[[gnu::format(printf, 2, 0)]] void log(int priority, const char* format, va_list arguments) {
-    char line[8192];
-    std::vsnprintf(line, sizeof(line), format, arguments);
+void log(int priority, const char* line) {
     host().logged(priority, line);
 }
 
@@ -53,8 +48,7 @@ private:
 
 } // namespace
 
-// Called by the plug-in; the log's stand before the C library's own. The checked one is what
-// _FORTIFY_SOURCE calls.
+// Called by the plug-in.
 extern "C" {
 
 void zekel_getTime(void** context, std::uint64_t* time, zeerr_Status* status) {
@@ -90,23 +84,6 @@ void zekel_updateMetaData(void** context, const char* metadataJson, zeerr_Status
     event.what = Event::What::updateMetaData;
     event.text = metadataJson;
     host().called(event, context, *status);
-}
-
-[[gnu::format(printf, 2, 3)]] void syslog(int priority, const char* format, ...) {
-    std::va_list arguments;
-    va_start(arguments, format);
-    log(priority, format, arguments);
-    va_end(arguments);
-}
-
-void __syslog_chk(int priority, int flag, const char* format, ...);
-
-[[gnu::format(printf, 3, 4)]] void __syslog_chk(int priority, int /*flag*/, const char* format,
-                                                ...) {
-    std::va_list arguments;
-    va_start(arguments, format);
-    log(priority, format, arguments);
-    va_end(arguments);
 }
 
 } // extern "C"
@@ -175,9 +152,11 @@ std::ostream& operator<<(std::ostream& out, const Event& event) {
 
 WatchedHost::WatchedHost(const Plugin& plugin) : plugin_(plugin) {
     current = this;
+    setLogTaker(log);
 }
 
 WatchedHost::~WatchedHost() {
+    setLogTaker(nullptr);
     current = nullptr;
 }
 

@@ -2,15 +2,12 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdarg>
-#include <cstdio>
 #include <cstring>
 #include <stdexcept>
 #include <thread>
 
-#include <syslog.h>
-
 #include "HostStatus.h"
+#include "support/LogFunctions.h"
 
 namespace {
 
@@ -35,10 +32,7 @@ void fail(zeerr_Status& status, int code) {
     vantelhost::fail(status, code, "soak", "as planned");
 }
 
-[[gnu::format(printf, 2, 0)]] void count(int priority, const char* format, va_list arguments) {
-    // Formatted, so that a bad format is found; not kept.
-    char text[8192];
-    std::vsnprintf(text, sizeof(text), format, arguments);
+void count(int priority, const char* /*line*/) {
     if (SoakHost* const host = current.load()) {
         host->logged(priority);
     }
@@ -46,8 +40,7 @@ void fail(zeerr_Status& status, int code) {
 
 } // namespace
 
-// Called by the plug-in; the log's stand before the C library's own. The checked one is what
-// _FORTIFY_SOURCE calls.
+// Called by the plug-in.
 extern "C" {
 
 void zekel_getTime(void** context, std::uint64_t* time, zeerr_Status* status) {
@@ -68,27 +61,11 @@ void zekel_updateMetaData(void** context, const char* metadataJson, zeerr_Status
     current.load()->updateMetaData(context, metadataJson, *status);
 }
 
-[[gnu::format(printf, 2, 3)]] void syslog(int priority, const char* format, ...) {
-    std::va_list arguments;
-    va_start(arguments, format);
-    count(priority, format, arguments);
-    va_end(arguments);
-}
-
-void __syslog_chk(int priority, int flag, const char* format, ...);
-
-[[gnu::format(printf, 3, 4)]] void __syslog_chk(int priority, int /*flag*/, const char* format,
-                                                ...) {
-    std::va_list arguments;
-    va_start(arguments, format);
-    count(priority, format, arguments);
-    va_end(arguments);
-}
-
 } // extern "C"
 
 SoakHost::SoakHost() : lastPoll_(Clock::now()) {
     current = this;
+    setLogTaker(count);
 }
 
 SoakHost::~SoakHost() {

@@ -2,59 +2,29 @@
 
 #include <algorithm>
 #include <atomic>
-#include <cstdarg>
-#include <cstdio>
 #include <ostream>
 #include <stdexcept>
 
-#include <syslog.h>
-
-#include "support/OwnAllocations.h"
+#include "support/LogFunctions.h"
 
 namespace {
 
 std::atomic<SyslogCapture*> currentLog{nullptr};
 
-[[gnu::format(printf, 2, 0)]] void capture(int priority, const char* format, va_list arguments) {
-    const OwnAllocations own;
-    char text[8192];
-    std::vsnprintf(text, sizeof(text), format, arguments);
+void addToCurrent(int priority, const char* line) {
     if (SyslogCapture* const log = currentLog.load()) {
-        log->add(priority, text);
+        log->add(priority, line);
     }
 }
 
 } // namespace
-
-// These stand before the C library's own; the checked one is what _FORTIFY_SOURCE calls.
-extern "C" {
-
-[[gnu::visibility("default"), gnu::format(printf, 2, 3)]] void syslog(int pri, const char* fmt,
-                                                                      ...) {
-    std::va_list arguments;
-    va_start(arguments, fmt);
-    capture(pri, fmt, arguments);
-    va_end(arguments);
-}
-
-// NOLINTNEXTLINE: a name of the C library
-void __syslog_chk(int pri, int flag, const char* fmt, ...);
-
-[[gnu::visibility("default"), gnu::format(printf, 3, 4)]] void __syslog_chk(int pri, int /*flag*/,
-                                                                            const char* fmt, ...) {
-    std::va_list arguments;
-    va_start(arguments, fmt);
-    capture(pri, fmt, arguments);
-    va_end(arguments);
-}
-
-} // extern "C"
 
 SyslogCapture::SyslogCapture() {
     SyslogCapture* none = nullptr;
     if (!currentLog.compare_exchange_strong(none, this)) {
         throw std::logic_error("the system log is captured already");
     }
+    setLogTaker(addToCurrent);
 }
 
 SyslogCapture::~SyslogCapture() {
