@@ -16,11 +16,11 @@ if [[ ${2-} == --target ]]; then
 fi
 case $preset in
   --help)
-    sed -n '2,/^set /s/^# \{0,1\}//p' "$0"
+    sed -n '2,/^set /s/^# \{0,1\}//p' "scripts/${0##*/}"
     exit 0
     ;;
   -*)
-    sed -n 's/^#   /usage: /p' "$0" >&2
+    sed -n 's/^#   /usage: /p' "scripts/${0##*/}" >&2
     exit 2
     ;;
   armhf | arm64 | s390x) groups=("$preset") ;;

@@ -18,7 +18,7 @@ for option in "$@"; do
     --again) again=yes ;;
     --quick) part=3 ;;
     *)
-      sed -n 's/^# usage: /usage: /p' "$0" >&2
+      sed -n 's/^# usage: /usage: /p' "scripts/${0##*/}" >&2
       exit 2
       ;;
   esac

@@ -7,7 +7,7 @@ set -euo pipefail
 cd "$(dirname "$0")/.."
 
 if [[ $# -gt 0 ]]; then
-  sed -n 's/^#   /usage: /p' "$0" >&2
+  sed -n 's/^#   /usage: /p' "scripts/${0##*/}" >&2
   exit 2
 fi
 build=build/coverage

@@ -18,7 +18,7 @@ fi
 seconds=${1:-60}
 targets=("${@:2}")
 if ! [[ $seconds =~ ^(0|[1-9][0-9]*)$ ]] || [[ $seconds == 0 && $minimise == no ]]; then
-  sed -n 's/^#   /usage: /p' "$0" >&2
+  sed -n 's/^#   /usage: /p' "scripts/${0##*/}" >&2
   exit 2
 fi
 if [[ ${#targets[@]} -eq 0 ]]; then

@@ -12,7 +12,7 @@ cd "$(dirname "$0")/.."
 case ${1-} in
   --share) ;;
   -*)
-    sed -n 's/^# usage: /usage: /p' "$0" >&2
+    sed -n 's/^# usage: /usage: /p' "scripts/${0##*/}" >&2
     exit 2
     ;;
 esac

@@ -30,7 +30,7 @@ esac
 shift
 
 log=build/release-test-$release${1:+-$1}.log
-project_in_clean_root "$release" "$log" "$PWD/scripts/release_test.sh --inside \"\$1\" ${*@Q}"
+project_in_clean_root "$release" "$log" "${PWD@Q}/scripts/release_test.sh --inside \"\$1\" ${*@Q}"
 if grep -E '^CMake .*Warning|: warning: ' "$log" | grep -v '^update-alternatives: '; then
   echo "release_test: these are warnings" >&2
   exit 1

@@ -28,7 +28,7 @@ for checker in "$@"; do
     asan | tsan) scripts/check.sh "$checker" || status=$? ;;
     memcheck) memcheck || status=$? ;;
     *)
-      sed -n 's/^# usage: /usage: /p' "$0" >&2
+      sed -n 's/^# usage: /usage: /p' "scripts/${0##*/}" >&2
       exit 2
       ;;
   esac

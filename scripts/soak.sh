@@ -12,7 +12,7 @@ set -euo pipefail
 cd "$(dirname "$0")/.."
 
 usage() {
-  sed -n 's/^#   /usage: /p' "$0" >&2
+  sed -n 's/^#   /usage: /p' "scripts/${0##*/}" >&2
   exit 2
 }
 
