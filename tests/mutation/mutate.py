@@ -363,11 +363,13 @@ def closing(text, opening):
     return len(text)
 
 
-def numbers_at(line, column):
-    """The mutants to blame for an error: the innermost one around it, else all of the line."""
+def numbers_at(line, column, mutants):
+    """The mutants to blame for an error: the innermost one around it, else the statements of the line, else all."""
     found = [(match.start() - 1, int(match[1])) for match in re.finditer(r"vantelMutant\((\d+)\)", line)]
     around = [number for begin, number in found if begin < column <= closing(line, max(begin, 0)) + 1]
-    return around[-1:] or [number for _, number in found]
+    numbers = [number for _, number in found]
+    statements = [number for number in numbers if any(edit.form != "expression" for _, edit in mutants[number])]
+    return around[-1:] or statements or numbers
 
 
 def drop_refused(files, commands):
@@ -384,7 +386,7 @@ def drop_refused(files, commands):
             if path not in files:
                 sys.exit(f"{name}:{line}: an error outside of what is mutated")
             lines = files[path].path.read_text().splitlines()
-            for number in numbers_at(lines[line - 1], column):
+            for number in numbers_at(lines[line - 1], column, mutants):
                 dropped |= {(str(file.path), edit) for file, edit in mutants[number]}
         if len(dropped) == before:
             sys.exit(f"errors that no mutant explains: {sorted(refused)}")
