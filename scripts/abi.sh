@@ -20,9 +20,10 @@ describe_release() { # preset, processor
 }
 
 if [[ ${1-} == --release ]]; then
-  scripts/setup.sh tests checks armhf
+  scripts/setup.sh tests checks armhf arm64
   describe_release release "$(uname -m)"
   describe_release armhf arm
+  describe_release arm64 aarch64
   exit
 fi
 
