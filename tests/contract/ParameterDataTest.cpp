@@ -19,6 +19,15 @@ char* countingReallocate(char* buffer, std::size_t size) {
     return static_cast<char*>(std::realloc(buffer, size));
 }
 
+constexpr char behindTheText = '\xa5';
+
+/// Gives one octet more than it is asked for.
+char* generousReallocate(char* buffer, std::size_t size) {
+    char* const text = countingReallocate(buffer, size + 1);
+    text[size] = behindTheText;
+    return text;
+}
+
 char* refusingReallocate(char* buffer, std::size_t size) {
     requests.emplace_back(buffer, size);
     std::free(buffer);
@@ -68,6 +77,14 @@ TEST_F(ParameterDataTest, ExistingBufferIsHandedToTheReallocator) {
     ASSERT_EQ(requests.size(), 1U);
     EXPECT_EQ(requests[0].first, former);
     EXPECT_EQ(std::strlen(buffer), 1881U);
+}
+
+TEST_F(ParameterDataTest, NothingIsWrittenBehindTheText) {
+    HostStatus status;
+    fetch(status, &generousReallocate);
+    ASSERT_NE(buffer, nullptr);
+    EXPECT_EQ(std::strlen(buffer), 1881U);
+    EXPECT_EQ(buffer[1882], behindTheText);
 }
 
 TEST_F(ParameterDataTest, RefusalLeavesANullBufferAndMemoryFull) {

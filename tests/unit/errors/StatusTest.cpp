@@ -174,6 +174,16 @@ TEST(ResizeTest, OperationThatOnlyClaimsToGiveMemoryFails) {
     EXPECT_FALSE(zeerr::resize(status, 8));
 }
 
+TEST(ResizeTest, MemoryBehindTheCapacityIsNotWritten) {
+    for (const std::uint32_t size : {8U, 4U}) {
+        char text[] = "{\"a\":12}host";
+        zeerr::Status status{0, 8, &claimingResize, text};
+        EXPECT_TRUE(zeerr::resize(status, size));
+        EXPECT_EQ(status.capacity, size);
+        EXPECT_STREQ(text, "{\"a\":12}host") << size;
+    }
+}
+
 TEST(ResizeTest, UnsetMemoryBecomesAnEmptyObject) {
     for (const zeerr_Resize operation : {&countingResize, &garbageResize, &zeroingResize}) {
         HostStatus status(operation);

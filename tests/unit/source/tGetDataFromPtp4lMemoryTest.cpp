@@ -3,6 +3,7 @@
 #include "tGetDataFromPtp4l.h"
 
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <memory>
 #include <new>
@@ -147,5 +148,31 @@ std::string nameOf(const testing::TestParamInfo<Shortage>& kind) {
 
 INSTANTIATE_TEST_SUITE_P(Memory, PtpFetchMemoryTest,
                          testing::Values(Shortage::once, Shortage::fromThenOn), nameOf);
+
+bool resizeWithoutMemory(zeerr::Status& status, std::uint32_t size) {
+    allocationsBefore = 0;
+    shortage = Shortage::fromThenOn;
+    const bool hasSucceeded = zeerr::defaultResize(&status, size);
+    shortage = Shortage::none;
+    return hasSucceeded;
+}
+
+TEST(DefaultResizeMemoryTest, WithoutMemoryAFreshStatusStaysSo) {
+    zeerr::LocalStatus status;
+    EXPECT_FALSE(resizeWithoutMemory(status, 1));
+    EXPECT_EQ(status.json, nullptr);
+    EXPECT_EQ(status.capacity, 0U);
+}
+
+TEST(DefaultResizeMemoryTest, WithoutMemoryTheTextStays) {
+    zeerr::LocalStatus status;
+    ASSERT_TRUE(zeerr::defaultResize(&status, 512));
+    std::strcpy(status.json, "{\"a\":1}");
+    const char* const text = status.json;
+    EXPECT_FALSE(resizeWithoutMemory(status, 513));
+    EXPECT_EQ(status.json, text);
+    EXPECT_EQ(status.capacity, 512U);
+    EXPECT_STREQ(status.json, "{\"a\":1}");
+}
 
 } // namespace
