@@ -1,16 +1,20 @@
-// A program of its own: vfork and kill are those below, which fail, or signal the child, or write
-// down what they do.
+// A program of its own: vfork, kill, waitpid and nanosleep are those below, which fail, or signal
+// the child, or write down what they do, or do nothing else.
 
 #include "tPtp4lProcess.h"
 
 #include <cerrno>
+#include <chrono>
 #include <csignal>
 #include <cstdio>
+#include <ctime>
 #include <utility>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <sys/mman.h>
 #include <sys/syscall.h>
+#include <sys/wait.h>
 #include <syslog.h>
 #include <unistd.h>
 
@@ -19,6 +23,8 @@
 #include "support/SyslogCapture.h"
 #include "support/TemporaryFolder.h"
 
+using std::chrono::nanoseconds;
+using testing::Each;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Pair;
@@ -29,6 +35,9 @@ namespace {
 int vforkError = 0;
 int signalToTheChild = 0;
 std::vector<std::pair<pid_t, int>> kills;
+std::vector<pid_t> waits;
+bool sleepsPassAtOnce = false;
+std::vector<nanoseconds> passedSleeps;
 
 } // namespace
 
@@ -48,7 +57,26 @@ pid_t vfork() noexcept {
 
 int kill(pid_t pid, int signal) noexcept {
     kills.emplace_back(pid, signal);
+    // A mistake must not end those who run the tests: these are whole groups, or all there are.
+    if (pid <= 0) {
+        errno = ESRCH;
+        return -1;
+    }
     return static_cast<int>(syscall(SYS_kill, pid, signal));
+}
+
+pid_t waitpid(pid_t pid, int* status, int options) {
+    waits.push_back(pid);
+    return static_cast<pid_t>(syscall(SYS_wait4, pid, status, options, nullptr));
+}
+
+int nanosleep(const timespec* duration, timespec* rest) {
+    if (sleepsPassAtOnce) {
+        passedSleeps.push_back(std::chrono::seconds(duration->tv_sec) +
+                               nanoseconds(duration->tv_nsec));
+        return 0;
+    }
+    return static_cast<int>(syscall(SYS_nanosleep, duration, rest));
 }
 
 } // extern "C"
@@ -61,6 +89,9 @@ protected:
         vforkError = 0;
         signalToTheChild = 0;
         kills.clear();
+        waits.clear();
+        sleepsPassAtOnce = false;
+        passedSleeps.clear();
     }
     ~PtpProcessSystemCallsTest() override { endChild(pid); }
 
@@ -68,6 +99,32 @@ protected:
         writeFile("child.cfg", config + "\nreport child.txt");
         process.spawn(VANTEL_CHILD_PROGRAM, "./child.cfg", {});
         pid = ChildReport("child.txt").pid();
+    }
+
+    /// A child that ends at once, and is seen to have done so.
+    void spawnAndSeeTheDeath() {
+        writeFile("child.cfg", "exit 0");
+        process.spawn(VANTEL_CHILD_PROGRAM, "./child.cfg", {});
+        EXPECT_TRUE(waitUntil([&] { return process.hasDied(); }));
+    }
+
+    /// Terminates a child that ignores SIGTERM, without the time that it takes.
+    void spawnAndKill() {
+        spawn("ignore " + std::to_string(SIGTERM));
+        sleepsPassAtOnce = true;
+        process.terminate();
+        sleepsPassAtOnce = false;
+    }
+
+    /// Expects that there is no child, which is known without a look at anybody's number.
+    void expectNoChild() {
+        waits.clear();
+        kills.clear();
+        EXPECT_TRUE(process.hasDied());
+        process.terminate();
+        EXPECT_TRUE(process.hasDied());
+        EXPECT_THAT(waits, IsEmpty());
+        EXPECT_THAT(kills, IsEmpty());
     }
 
     const TemporaryFolder folder;
@@ -95,9 +152,7 @@ TEST_F(PtpProcessSystemCallsTest, FailingVforkIsLoggedAndThrown) {
 TEST_F(PtpProcessSystemCallsTest, FailingVforkLeavesNoChildToTerminate) {
     vforkError = ENOMEM;
     EXPECT_THROW(process.spawn(VANTEL_CHILD_PROGRAM, "./child.cfg", {}), zeerr::Exception);
-    EXPECT_TRUE(process.hasDied());
-    process.terminate();
-    EXPECT_THAT(kills, IsEmpty());
+    expectNoChild();
     EXPECT_EQ(log.count("Unable to fork subprocess in vantel, got errno: Cannot allocate memory"),
               1);
 }
@@ -185,10 +240,29 @@ TEST_F(PtpProcessSystemCallsTest, TerminateSendsOneSigtermAndTheSecondTimeNothin
     EXPECT_THAT(log.lines(), IsEmpty());
 }
 
+TEST_F(PtpProcessSystemCallsTest, WithoutASpawnNobodyIsWaitedForOrSignalled) {
+    expectNoChild();
+}
+
+TEST_F(PtpProcessSystemCallsTest, TerminatedChildIsNotWaitedForOrSignalledAgain) {
+    spawn("");
+    process.terminate();
+    expectNoChild();
+}
+
+// Its number may be somebody else's by then.
+TEST_F(PtpProcessSystemCallsTest, ReapedChildIsNotWaitedForOrSignalledAgain) {
+    spawnAndSeeTheDeath();
+    expectNoChild();
+}
+
+TEST_F(PtpProcessSystemCallsTest, KilledChildIsNotWaitedForOrSignalledAgain) {
+    spawnAndKill();
+    expectNoChild();
+}
+
 TEST_F(PtpProcessSystemCallsTest, ReapedChildIsNeverSignalled) {
-    writeFile("child.cfg", "exit 0");
-    process.spawn(VANTEL_CHILD_PROGRAM, "./child.cfg", {});
-    EXPECT_TRUE(waitUntil([&] { return process.hasDied(); }));
+    spawnAndSeeTheDeath();
     process.terminate();
     EXPECT_THAT(kills, IsEmpty());
     EXPECT_THAT(log.lines(), IsEmpty());
@@ -218,6 +292,14 @@ TEST_F(PtpProcessSystemCallsTest, ChildThatIgnoresSigtermIsKilledAfterTenSeconds
     int status = 0;
     ASSERT_EQ(waitpid(pid, &status, 0), pid) << "it was not waited for";
     EXPECT_EQ(WTERMSIG(status), SIGKILL);
+}
+
+TEST_F(PtpProcessSystemCallsTest,
+       ChildThatIgnoresSigtermIsKilledAfterAThousandSleepsOfTenMilliseconds) {
+    spawnAndKill();
+    EXPECT_EQ(passedSleeps.size(), 1000U);
+    EXPECT_THAT(passedSleeps, Each(std::chrono::milliseconds(10)));
+    EXPECT_THAT(kills, ElementsAre(Pair(pid, SIGTERM), Pair(pid, SIGKILL)));
 }
 
 } // namespace
