@@ -107,9 +107,7 @@ milliseconds FaultTest::UnderWay::second() const {
     return seconds(watchdog ? 1 : 0);
 }
 
-FaultTest::FaultTest() : promised_(boundInTheTable()) {
-    forgetWorkerSleeps();
-}
+FaultTest::FaultTest() : promised_(boundInTheTable()) {}
 
 void FaultTest::TearDown() {
     EXPECT_TRUE(hasMeasured_ || IsSkipped()) << "no stop was measured";

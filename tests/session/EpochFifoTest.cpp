@@ -120,6 +120,18 @@ TEST_F(EpochFifoTest, FullPipeIsReadToItsEnd) {
     EXPECT_EQ(epochs().at(0), 8192);
 }
 
+TEST_F(EpochFifoTest, WhatIsBehindAPipeFullIsLeftToTheNextMeasurement) {
+    // A file can hold more than a pipe.
+    std::vector<std::int64_t> values(8193);
+    std::iota(values.begin(), values.end(), 1);
+    writeFile(EpochFifo::path,
+              {reinterpret_cast<const char*>(values.data()), values.size() * sizeof(values[0])});
+    beginMeasuring();
+    ASSERT_TRUE(waitForCalls(Function::adjustTime, 2));
+    EXPECT_EQ(epochs().at(0), 8192);
+    EXPECT_EQ(epochs().at(1), 8193);
+}
+
 TEST_F(EpochFifoTest, InitialiseDoesNotTouchThePath) {
     session.initialise();
     EXPECT_FALSE(std::filesystem::exists(EpochFifo::path));

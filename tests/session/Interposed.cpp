@@ -58,9 +58,25 @@ Hold& hold() {
 std::atomic<int> sleepsAreShort{0};
 static_assert(sizeof(sleepsAreShort) == sizeof(int) && std::atomic<int>::is_always_lock_free);
 
-std::atomic<int> workerSleepCount{0};
-std::atomic<nanoseconds> shortestWorkerSleep{nanoseconds::max()};
-std::atomic<nanoseconds> longestWorkerSleep{nanoseconds::min()};
+/// What a thread has asked for.
+struct Sleeps {
+    std::atomic<int> count{0};
+    std::atomic<nanoseconds> shortest{nanoseconds::max()};
+    std::atomic<nanoseconds> longest{nanoseconds::min()};
+
+    void add(nanoseconds duration) {
+        shortest = std::min(shortest.load(), duration);
+        longest = std::max(longest.load(), duration);
+        ++count;
+    }
+    void forget() {
+        shortest = nanoseconds::max();
+        longest = nanoseconds::min();
+    }
+};
+
+Sleeps sleepsOfWorker;
+Sleeps sleepsOfWatchdog;
 
 /// Empty: they are slept.
 std::function<void(nanoseconds)>& sleepTeller() {
@@ -73,10 +89,12 @@ bool isWorkers(nanoseconds duration) {
     return duration < std::chrono::seconds(1) && gettid() != getpid();
 }
 
-void countWorkersSleep(nanoseconds duration) {
-    shortestWorkerSleep = std::min(shortestWorkerSleep.load(), duration);
-    longestWorkerSleep = std::max(longestWorkerSleep.load(), duration);
-    ++workerSleepCount;
+void countSleep(nanoseconds duration) {
+    if (isWorkers(duration)) {
+        sleepsOfWorker.add(duration);
+    } else if (gettid() != getpid()) {
+        sleepsOfWatchdog.add(duration);
+    }
 }
 
 timespec toTimespec(nanoseconds duration) {
@@ -122,9 +140,7 @@ extern "C" {
 
 [[gnu::visibility("default")]] int nanosleep(const timespec* duration, timespec* rest) {
     const auto asked = std::chrono::seconds(duration->tv_sec) + nanoseconds(duration->tv_nsec);
-    if (isWorkers(asked)) {
-        countWorkersSleep(asked);
-    }
+    countSleep(asked);
     if (asked == beforeFirstPoll) {
         std::unique_lock<std::mutex> lock(hold().mutex);
         hold().changed.wait(lock, [] { return !hold().isOn; });
@@ -168,20 +184,32 @@ nanoseconds overslept() {
 }
 
 int workerSleeps() {
-    return workerSleepCount;
+    return sleepsOfWorker.count;
 }
 
 nanoseconds shortestSleepOfWorker() {
-    return shortestWorkerSleep;
+    return sleepsOfWorker.shortest;
 }
 
 nanoseconds longestSleepOfWorker() {
-    return longestWorkerSleep;
+    return sleepsOfWorker.longest;
 }
 
-void forgetWorkerSleeps() {
-    shortestWorkerSleep = nanoseconds::max();
-    longestWorkerSleep = nanoseconds::min();
+int watchdogSleeps() {
+    return sleepsOfWatchdog.count;
+}
+
+nanoseconds shortestSleepOfWatchdog() {
+    return sleepsOfWatchdog.shortest;
+}
+
+nanoseconds longestSleepOfWatchdog() {
+    return sleepsOfWatchdog.longest;
+}
+
+void forgetSleeps() {
+    sleepsOfWorker.forget();
+    sleepsOfWatchdog.forget();
 }
 
 ThreadLimit::ThreadLimit(int allowed) {

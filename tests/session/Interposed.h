@@ -34,7 +34,14 @@ std::chrono::nanoseconds overslept();
 int workerSleeps();
 std::chrono::nanoseconds shortestSleepOfWorker();
 std::chrono::nanoseconds longestSleepOfWorker();
-void forgetWorkerSleeps();
+
+/// The same of the sleeps of a second and more: the watchdog's, one before each look at the daemon.
+int watchdogSleeps();
+std::chrono::nanoseconds shortestSleepOfWatchdog();
+std::chrono::nanoseconds longestSleepOfWatchdog();
+
+/// Of both, the shortest and the longest.
+void forgetSleeps();
 
 /// Lets thread creation fail while this object lives.
 class ThreadLimit {

@@ -3,6 +3,7 @@
 
 #include <gmock/gmock.h>
 
+#include "Interposed.h"
 #include "SessionFixture.h"
 
 namespace {
@@ -34,6 +35,14 @@ protected:
     milliseconds shortest(Function function, std::size_t skipped = 0) const {
         const auto all = intervals(function, skipped);
         return *std::min_element(all.begin(), all.end());
+    }
+
+    /// Expects eight polls with the long sleep, to the microsecond, before each.
+    void expectLongSleeps() {
+        ASSERT_TRUE(waitForCalls(Function::getTime, 8));
+        EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+        EXPECT_EQ(shortestSleepOfWorker(), milliseconds(125));
+        EXPECT_EQ(longestSleepOfWorker(), milliseconds(125));
     }
 };
 
@@ -124,15 +133,13 @@ TEST_F(PacingTest, HostErrorBringsTheLongSleep) {
         }
     });
     beginAt(112000);
-    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
-    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+    expectLongSleeps();
 }
 
 TEST_F(PacingTest, FailureOfTheFifoBringsTheLongSleep) {
     fifo.reset();
     beginAt(112000);
-    ASSERT_TRUE(waitForCalls(Function::getTime, 8));
-    EXPECT_GE(shortest(Function::getTime), milliseconds(125));
+    expectLongSleeps();
 }
 
 } // namespace

@@ -84,6 +84,7 @@ void PrintTo(const QualityReport& report, std::ostream* out) {
 
 SessionTest::SessionTest() : daemon(simulatorProgram) {
     forgetSentSignals();
+    forgetSleeps();
     fifo.emplace();
 }
 

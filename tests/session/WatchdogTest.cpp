@@ -80,6 +80,14 @@ TEST_F(WatchdogTest, SaysNothingWhileTheDaemonRuns) {
     expectOwnThreads(2);
 }
 
+TEST_F(WatchdogTest, SleepsASecondBeforeEachLook) {
+    const int before = watchdogSleeps();
+    begin("gm present\n");
+    ASSERT_TRUE(waitUntil([=] { return watchdogSleeps() >= before + 2; }));
+    EXPECT_EQ(shortestSleepOfWatchdog(), std::chrono::seconds(1));
+    EXPECT_EQ(longestSleepOfWatchdog(), std::chrono::seconds(1));
+}
+
 TEST_F(WatchdogTest, ReportsFromAThreadOfItsOwn) {
     begin("on TIME_STATUS_NP after 2 times 1 do exit 1\n");
     ASSERT_TRUE(waitForDeaths(1));
