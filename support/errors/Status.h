@@ -24,8 +24,8 @@ bool defaultResize(Status* status, std::uint32_t size);
 
 /// Calls the resize operation that the status carries.
 /// @return false when there is none, when it refuses, or when it reports success without room for
-///         `size` octets. Otherwise the text is zero-terminated within its capacity, whatever the
-///         resize operation left in the new memory.
+///         `size` octets. Otherwise a text shorter than the capacity is zero-terminated, whatever
+///         the resize operation left in the new memory.
 bool resize(Status& status, std::uint32_t size);
 
 /// Releases the text. The code stays.
