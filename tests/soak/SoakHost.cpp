@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <thread>
 
+#include <syslog.h>
+
 #include "HostStatus.h"
 #include "support/LogFunctions.h"
 
