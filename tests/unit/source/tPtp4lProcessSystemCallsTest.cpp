@@ -76,7 +76,8 @@ int nanosleep(const timespec* duration, timespec* rest) {
                                nanoseconds(duration->tv_nsec));
         return 0;
     }
-    return static_cast<int>(syscall(SYS_nanosleep, duration, rest));
+    errno = clock_nanosleep(CLOCK_MONOTONIC, 0, duration, rest);
+    return errno == 0 ? 0 : -1;
 }
 
 } // extern "C"
