@@ -259,7 +259,7 @@ SymbolsFileNamesWhatIsExported() {
     -v19.0.0 -Proot -I"$here/../../packaging/libvantel-bc19/symbols" -e"$library" -O/dev/null
 }
 
-LibraryAndProgramsAreHardened() {
+ProgramsAndLibraryAreHardened() {
   "$here/hardening.sh" "$packages"/*.deb
 }
 
