@@ -28,8 +28,8 @@ protected:
 
     /// Expects that each sleep was of 16 to 125 ms.
     static void expectSleepsWithinBounds() {
-        EXPECT_GE(shortestSleepOfWorker(), milliseconds(16));
-        EXPECT_EQ(longestSleepOfWorker(), milliseconds(125));
+        EXPECT_GE(sleepsOfWorker().shortest, milliseconds(16));
+        EXPECT_EQ(sleepsOfWorker().longest, milliseconds(125));
     }
 };
 

@@ -196,9 +196,9 @@ void FaultTest::expectStopWithin(const UnderWay& underWay, const std::function<v
     int sleeps = 0;
     int polls = 0;
     do { // until no poll begins while polls are counted
-        sleeps = workerSleeps();
+        sleeps = sleepsOfWorker().count;
         polls = endedPolls();
-    } while (sleeps != workerSleeps());
+    } while (sleeps != sleepsOfWorker().count);
     const auto begun = steady_clock::now();
     stop();
     const auto took = std::chrono::duration_cast<milliseconds>(steady_clock::now() - begun);

@@ -58,8 +58,7 @@ Hold& hold() {
 std::atomic<int> sleepsAreShort{0};
 static_assert(sizeof(sleepsAreShort) == sizeof(int) && std::atomic<int>::is_always_lock_free);
 
-/// What a thread has asked for.
-struct Sleeps {
+struct SleepCounts {
     std::atomic<int> count{0};
     std::atomic<nanoseconds> shortest{nanoseconds::max()};
     std::atomic<nanoseconds> longest{nanoseconds::min()};
@@ -73,10 +72,11 @@ struct Sleeps {
         shortest = nanoseconds::max();
         longest = nanoseconds::min();
     }
+    Sleeps soFar() const { return {count, shortest, longest}; }
 };
 
-Sleeps sleepsOfWorker;
-Sleeps sleepsOfWatchdog;
+SleepCounts countsOfWorker;
+SleepCounts countsOfWatchdog;
 
 /// Empty: they are slept.
 std::function<void(nanoseconds)>& sleepTeller() {
@@ -91,9 +91,9 @@ bool isWorkers(nanoseconds duration) {
 
 void countSleep(nanoseconds duration) {
     if (isWorkers(duration)) {
-        sleepsOfWorker.add(duration);
+        countsOfWorker.add(duration);
     } else if (gettid() != getpid()) {
-        sleepsOfWatchdog.add(duration);
+        countsOfWatchdog.add(duration);
     }
 }
 
@@ -183,33 +183,17 @@ nanoseconds overslept() {
     return oversleptByThisThread;
 }
 
-int workerSleeps() {
-    return sleepsOfWorker.count;
+Sleeps sleepsOfWorker() {
+    return countsOfWorker.soFar();
 }
 
-nanoseconds shortestSleepOfWorker() {
-    return sleepsOfWorker.shortest;
-}
-
-nanoseconds longestSleepOfWorker() {
-    return sleepsOfWorker.longest;
-}
-
-int watchdogSleeps() {
-    return sleepsOfWatchdog.count;
-}
-
-nanoseconds shortestSleepOfWatchdog() {
-    return sleepsOfWatchdog.shortest;
-}
-
-nanoseconds longestSleepOfWatchdog() {
-    return sleepsOfWatchdog.longest;
+Sleeps sleepsOfWatchdog() {
+    return countsOfWatchdog.soFar();
 }
 
 void forgetSleeps() {
-    sleepsOfWorker.forget();
-    sleepsOfWatchdog.forget();
+    countsOfWorker.forget();
+    countsOfWatchdog.forget();
 }
 
 ThreadLimit::ThreadLimit(int allowed) {

@@ -28,17 +28,20 @@ void forgetSentSignals();
 /// a busy machine wakes up late.
 std::chrono::nanoseconds overslept();
 
+/// What a thread has asked for: how often so far, and the shortest and the longest so far, or since
+/// they were last forgotten.
+struct Sleeps {
+    int count;
+    std::chrono::nanoseconds shortest;
+    std::chrono::nanoseconds longest;
+};
+
 /// The sleeps below a second of all threads but the first: the worker's, one before each poll, when
-/// no thread of the test uses nanosleep. How many there have been so far, and the shortest and the
-/// longest so far, or since they were last forgotten.
-int workerSleeps();
-std::chrono::nanoseconds shortestSleepOfWorker();
-std::chrono::nanoseconds longestSleepOfWorker();
+/// no thread of the test uses nanosleep.
+Sleeps sleepsOfWorker();
 
 /// The same of the sleeps of a second and more: the watchdog's, one before each look at the daemon.
-int watchdogSleeps();
-std::chrono::nanoseconds shortestSleepOfWatchdog();
-std::chrono::nanoseconds longestSleepOfWatchdog();
+Sleeps sleepsOfWatchdog();
 
 /// Of both, the shortest and the longest.
 void forgetSleeps();

@@ -41,8 +41,8 @@ protected:
     void expectLongSleeps() {
         ASSERT_TRUE(waitForCalls(Function::getTime, 8));
         EXPECT_GE(shortest(Function::getTime), milliseconds(125));
-        EXPECT_EQ(shortestSleepOfWorker(), milliseconds(125));
-        EXPECT_EQ(longestSleepOfWorker(), milliseconds(125));
+        EXPECT_EQ(sleepsOfWorker().shortest, milliseconds(125));
+        EXPECT_EQ(sleepsOfWorker().longest, milliseconds(125));
     }
 };
 

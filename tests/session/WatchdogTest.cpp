@@ -81,11 +81,11 @@ TEST_F(WatchdogTest, SaysNothingWhileTheDaemonRuns) {
 }
 
 TEST_F(WatchdogTest, SleepsASecondBeforeEachLook) {
-    const int before = watchdogSleeps();
+    const int before = sleepsOfWatchdog().count;
     begin("gm present\n");
-    ASSERT_TRUE(waitUntil([=] { return watchdogSleeps() >= before + 2; }));
-    EXPECT_EQ(shortestSleepOfWatchdog(), std::chrono::seconds(1));
-    EXPECT_EQ(longestSleepOfWatchdog(), std::chrono::seconds(1));
+    ASSERT_TRUE(waitUntil([=] { return sleepsOfWatchdog().count >= before + 2; }));
+    EXPECT_EQ(sleepsOfWatchdog().shortest, std::chrono::seconds(1));
+    EXPECT_EQ(sleepsOfWatchdog().longest, std::chrono::seconds(1));
 }
 
 TEST_F(WatchdogTest, ReportsFromAThreadOfItsOwn) {
